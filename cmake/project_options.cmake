@@ -1,0 +1,13 @@
+# What holds when this project is built for itself: never for those who use it as a dependency.
+
+if(NOT CMAKE_BUILD_TYPE AND NOT CMAKE_CONFIGURATION_TYPES)
+    set(CMAKE_BUILD_TYPE Release CACHE STRING "Debug, Release, RelWithDebInfo or MinSizeRel" FORCE)
+endif()
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+
+add_library(tarn_warnings INTERFACE)
+if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
+    target_compile_options(tarn_warnings INTERFACE
+        -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+endif()
