@@ -1,0 +1,55 @@
+// Engine/Base/media.h: the names of input kinds, and the file extensions of media.
+//
+//     ImageFormat format = imageFormatForExtension("JPEG");        // ImageFormat::JPEG
+//     std::string extension = extensionForImageFormat(format);    // "jpg"
+
+#ifndef TARN_ENGINE_BASE_MEDIA_H
+#define TARN_ENGINE_BASE_MEDIA_H
+
+#include <Engine/Base/export.h>
+
+#include <string>
+#include <vector>
+
+namespace tarn::engine {
+
+/// Deliberate: 1 is not used, and has no extension.
+enum class ImageFormat : unsigned char {
+    Unknown = 0,
+    JPEG = 2,
+    PNG = 3,
+};
+
+enum class MediaContainer : unsigned char {
+    Unknown = 0,
+    MOV = 1,
+    MP4 = 2,
+    AIFF = 3,
+    MP3 = 4,
+    WAV = 5,
+    M4A = 6,
+};
+
+/// The twelve kinds of on-screen keyboard, "Default" first. One list that lives to program exit.
+TARN_ENGINE_BASE_EXPORT std::vector<std::string> const& keyboardTypes();
+
+/// "Front-Facing" and "Rear-Facing", in a new list at every call.
+TARN_ENGINE_BASE_EXPORT std::vector<std::string> cameraTypeNames();
+
+/// The format of files with this extension, in any case, without a dot: "jpg", "jpeg" or "png".
+/// `Unknown` for everything else.
+TARN_ENGINE_BASE_EXPORT ImageFormat imageFormatForExtension(std::string extension);
+
+/// The extension in lower case without a dot; empty for everything but the named formats.
+TARN_ENGINE_BASE_EXPORT std::string extensionForImageFormat(ImageFormat format);
+
+/// The container of files with this extension, in any case, without a dot: "mov", "mp4", "aiff",
+/// "mp3", "wav" or "m4a". `Unknown` for everything else.
+TARN_ENGINE_BASE_EXPORT MediaContainer mediaContainerForExtension(std::string extension);
+
+/// The extension in lower case without a dot; empty for everything but the named containers.
+TARN_ENGINE_BASE_EXPORT std::string extensionForMediaContainer(MediaContainer container);
+
+}  // namespace tarn::engine
+
+#endif

@@ -1,0 +1,173 @@
+#include <Engine/Base/layers.h>
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <iomanip>
+#include <limits>
+#include <sstream>
+
+using namespace tarn::engine;
+
+namespace {
+
+template <class T>
+std::string written(T const& what) {
+    std::ostringstream stream;
+    stream << what;
+    return stream.str();
+}
+
+RenderLayerHierarchy hierarchy(unsigned long long id,
+                               std::vector<RenderLayerHierarchy> leading = {},
+                               std::vector<RenderLayerHierarchy> children = {}) {
+    return {{0, id}, std::move(leading), std::move(children)};
+}
+
+// Counts how often a stream is flushed.
+struct FlushCounter : std::stringbuf {
+    int flushes = 0;
+    int sync() override {
+        ++flushes;
+        return 0;
+    }
+};
+
+}  // namespace
+
+TEST(ModelLayer, EqualsDeeplyInOrder) {
+    ModelLayer const base{1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}};
+    struct Row {
+        char const* what;
+        ModelLayer other;
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"same", {1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, true},
+             Row{"id", {9, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, false},
+             Row{"order", {1, {{3, {}, {}}, {2, {}, {}}}, {{4, {}, {}}}}, false},
+             Row{"fewer children", {1, {{2, {}, {}}}, {{4, {}, {}}}}, false},
+             Row{"grandchild", {1, {{2, {{5, {}, {}}}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, false},
+             Row{"additional layer", {1, {{2, {}, {}}, {3, {}, {}}}, {{5, {}, {}}}}, false},
+             Row{"no additional layer", {1, {{2, {}, {}}, {3, {}, {}}}, {}}, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(base == row.other, row.equal);
+        EXPECT_EQ(base != row.other, !row.equal);
+    }
+}
+
+TEST(ModelLayer, WritesItsTreeWithoutAdditionalLayers) {
+    EXPECT_EQ(written(ModelLayer{7, {}, {}}), "7\n");
+    ModelLayer const tree{1, {{2, {{3, {}, {}}}, {{8, {}, {}}}}, {4, {}, {}}}, {{9, {}, {}}}};
+    EXPECT_EQ(written(tree), "1\n-2\n--3\n-4\n");
+}
+
+TEST(RenderLayer, WritesItsIdAlone) {
+    EXPECT_EQ(written(RenderLayer{3, 12}), "12");
+    EXPECT_EQ(RenderLayer(), (RenderLayer{0, 0}));
+    EXPECT_NE((RenderLayer{0, 1}), (RenderLayer{0, 2}));
+    EXPECT_NE((RenderLayer{1, 1}), (RenderLayer{2, 1}));
+}
+
+TEST(RenderLayerHierarchy, WritesLeadingLayersMarkedAndChildrenDeeper) {
+    struct Row {
+        char const* what;
+        RenderLayerHierarchy tree;
+        char const* text;
+    };
+    for (Row const& row : {
+             Row{"alone", hierarchy(1), "-1\n"},
+             Row{"one of each", hierarchy(1, {hierarchy(2)}, {hierarchy(3)}), "-v2\n-1\n--3\n"},
+             Row{"leading with a child", hierarchy(1, {hierarchy(2, {}, {hierarchy(3)})}),
+                 "-v2\n--v3\n-1\n"},
+             Row{"child with a leading",
+                 hierarchy(1, {}, {hierarchy(2, {hierarchy(3, {}, {hierarchy(4)})})}),
+                 "-1\n--v3\n---v4\n--2\n"},
+             Row{"leading of a leading", hierarchy(1, {hierarchy(2, {hierarchy(3)})}),
+                 "-v3\n-v2\n-1\n"},
+             Row{"several, deep",
+                 hierarchy(1, {hierarchy(2), hierarchy(3)},
+                           {hierarchy(4, {}, {hierarchy(5)}), hierarchy(6)}),
+                 "-v2\n-v3\n-1\n--4\n---5\n--6\n"},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(written(row.tree), row.text);
+    }
+}
+
+TEST(RenderLayerHierarchy, HelperTakesAPrefixAndAMark) {
+    std::ostringstream stream;
+    _helper(stream, hierarchy(1, {hierarchy(2)}, {hierarchy(3)}), "--", true);
+    EXPECT_EQ(stream.str(), "---v2\n---v1\n----v3\n");
+}
+
+TEST(RenderLayerHierarchy, EqualsDeeplyInOrder) {
+    auto const base = [] { return hierarchy(1, {hierarchy(2)}, {hierarchy(3)}); };
+    EXPECT_EQ(base(), base());
+    EXPECT_NE(base(), hierarchy(9, {hierarchy(2)}, {hierarchy(3)}));
+    EXPECT_NE(base(), hierarchy(1, {hierarchy(9)}, {hierarchy(3)}));
+    EXPECT_NE(base(), hierarchy(1, {hierarchy(2)}, {hierarchy(9)}));
+    EXPECT_NE(base(), hierarchy(1, {hierarchy(2)}));
+}
+
+TEST(LayerTexts, FollowTheStreamsFlagsAndFlushEachLine) {
+    FlushCounter buffer;
+    std::ostream stream(&buffer);
+    stream << std::hex << ModelLayer{255, {{16, {}, {}}}, {}};
+    EXPECT_EQ(buffer.str(), "ff\n-10\n");
+    EXPECT_EQ(buffer.flushes, 2);
+    stream << hierarchy(255, {hierarchy(1)}, {hierarchy(2)});
+    EXPECT_EQ(buffer.str(), "ff\n-10\n-v1\n-ff\n--2\n");
+    EXPECT_EQ(buffer.flushes, 5);
+    EXPECT_EQ(&(stream << RenderLayer{0, 1}), &stream);
+}
+
+TEST(StrokeSettings, IsVisibleByItsThresholds) {
+    double const epsilon = std::numeric_limits<double>::epsilon();
+    struct Row {
+        char const* what;
+        double width, opacity, start, end;
+        bool forced, visible;
+    };
+    for (Row const& row : {
+             Row{"whole", 1, 1, 0, 1, false, true},
+             Row{"no length", 1, 1, 0, 0, false, false},
+             Row{"no length, forced", 1, 1, 0, 0, true, true},
+             Row{"opacity at the threshold", 1, 0.0001, 0, 1, true, false},
+             Row{"opacity above it", 1, std::nextafter(0.0001, 1.0), 0, 1, false, true},
+             Row{"no opacity", 1, 0, 0, 1, true, false},
+             Row{"negative opacity", 1, -1, 0, 1, true, false},
+             Row{"width at the threshold", 0.01, 1, 0, 1, true, false},
+             Row{"width above it", std::nextafter(0.01, 1.0), 1, 0, 1, false, true},
+             Row{"negative width", -5, 1, 0, 1, true, false},
+             Row{"NaN opacity", 1, NAN, 0, 1, false, true},
+             Row{"NaN width", NAN, 1, 0, 1, false, true},
+             Row{"NaN start", 1, 1, NAN, 1, false, true},
+             Row{"NaN end", 1, 1, 0, NAN, false, true},
+             Row{"both infinite", 1, 1, INFINITY, INFINITY, false, true},
+             Row{"length epsilon", 1, 1, 0, epsilon, false, true},
+             Row{"length below epsilon", 1, 1, 0, std::nextafter(epsilon, 0.0), false, false},
+             Row{"reversed", 1, 1, 1, 0, false, true},
+             Row{"reversed below epsilon", 1, 1, epsilon / 2, 0, false, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        StrokeSettings const settings{3,           4,         5,       row.width,
+                                      row.opacity, row.start, row.end, row.forced};
+        EXPECT_EQ(settings.isVisible(), row.visible);
+    }
+    EXPECT_FALSE(StrokeSettings().isVisible());
+}
+
+TEST(StrokeSettings, EqualsFieldByField) {
+    StrokeSettings const base{1, 2, 3, 4, 5, 6, 7, true};
+    EXPECT_EQ(base, (StrokeSettings{1, 2, 3, 4, 5, 6, 7, true}));
+    for (StrokeSettings const& other :
+         {StrokeSettings{9, 2, 3, 4, 5, 6, 7, true}, StrokeSettings{1, 9, 3, 4, 5, 6, 7, true},
+          StrokeSettings{1, 2, 9, 4, 5, 6, 7, true}, StrokeSettings{1, 2, 3, 9, 5, 6, 7, true},
+          StrokeSettings{1, 2, 3, 4, 9, 6, 7, true}, StrokeSettings{1, 2, 3, 4, 5, 9, 7, true},
+          StrokeSettings{1, 2, 3, 4, 5, 6, 9, true}, StrokeSettings{1, 2, 3, 4, 5, 6, 7, false}}) {
+        EXPECT_NE(base, other);
+        EXPECT_FALSE(base == other);
+    }
+}
