@@ -1,0 +1,26 @@
+// Engine/Base/truncate.h: from doubles to integers without undefined behaviour. Not installed.
+//
+//     long long i = truncate<long long>(-2.9);  // -2
+
+#ifndef TARN_ENGINE_BASE_TRUNCATE_H
+#define TARN_ENGINE_BASE_TRUNCATE_H
+
+#include <cmath>
+#include <limits>
+
+namespace tarn::engine {
+
+/// `d` towards zero; the nearest integer of the type where it does not fit, and 0 for a NaN.
+template <class Integer>
+Integer truncate(double d) {
+    using Limits = std::numeric_limits<Integer>;
+    if (std::isnan(d)) return 0;
+    // The conversion rounds the maximum up, to the power of two just out of range.
+    if (d >= static_cast<double>(Limits::max())) return Limits::max();
+    if (d <= static_cast<double>(Limits::min())) return Limits::min();
+    return static_cast<Integer>(d);
+}
+
+}  // namespace tarn::engine
+
+#endif

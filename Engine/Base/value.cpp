@@ -1,0 +1,546 @@
+#include <Engine/Base/value.h>
+
+#include <Engine/Base/path.h>
+#include <Engine/Base/truncate.h>
+#include <Engine/Base/unstructured.h>
+
+#include <boost/variant/apply_visitor.hpp>
+#include <boost/variant/get.hpp>
+#include <boost/variant/static_visitor.hpp>
+
+#include <array>
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <iostream>
+#include <locale>
+#include <string_view>
+#include <utility>
+
+namespace tarn::engine {
+
+namespace {
+
+constexpr char kModule[] = "Engine/Base/value";
+
+// Known to those who search logs for it; kept wherever the check moves.
+constexpr int kResourceTypeLine = 161;
+
+constexpr FloatMat4 FloatMat4Identity{{1, 0, 0, 0,  //
+                                       0, 1, 0, 0,  //
+                                       0, 0, 1, 0,  //
+                                       0, 0, 0, 1}};
+
+// What `indexLoopCasting` takes from an empty loop.
+Value const& nullValue() {
+    static Value const value;
+    return value;
+}
+
+// The types and their names, at the enumerator's position.
+constexpr std::array<std::string_view, 14> kTypeNames{
+    "float", "vec2",  "vec3",  "vec4", "mat4",   "boolean", "int",
+    "image", "video", "sound", "path", "string", "model",   "unstructured"};
+static_assert(kTypeNames.size() == std::size_t(Type::Unstructured) + 1);
+
+// A set of types as bits; a byte that is no enumerator is in no set.
+constexpr unsigned kResourceTypes = 0x1380;
+constexpr unsigned kCopiedTypes = 0xBFF;
+
+bool contains(unsigned types, Type type) {
+    return std::size_t(type) < kTypeNames.size() && (types >> unsigned(type) & 1u) != 0;
+}
+
+bool hasElements(std::shared_ptr<Path const> const& path) {
+    return path && !path->elements.empty();
+}
+
+// The number that the whole text is, else whether there is any text.
+double numberFromString(std::shared_ptr<std::string const> const& text) {
+    if (!text) return 0.0;
+    char* parsedTo = nullptr;
+    double const number = std::strtod(text->c_str(), &parsedTo);
+    if (parsedTo == text->c_str() + text->size()) return number;
+    return text->empty() ? 0.0 : 1.0;
+}
+
+struct TypeOf : boost::static_visitor<Type> {
+    Type operator()(long long) const { return Type::Int; }
+    Type operator()(double) const { return Type::Float; }
+    Type operator()(FloatVec2 const&) const { return Type::Vec2; }
+    Type operator()(FloatVec3 const&) const { return Type::Vec3; }
+    Type operator()(FloatVec4 const&) const { return Type::Vec4; }
+    Type operator()(std::shared_ptr<FloatMat4 const> const&) const { return Type::Mat4; }
+    Type operator()(bool) const { return Type::Boolean; }
+    Type operator()(Value::ImageID) const { return Type::Image; }
+    Type operator()(Value::VideoID) const { return Type::Video; }
+    Type operator()(Value::SoundID) const { return Type::Sound; }
+    Type operator()(Value::ModelID) const { return Type::Model; }
+    Type operator()(std::shared_ptr<Path const> const&) const { return Type::Path; }
+    Type operator()(std::shared_ptr<Unstructured const> const&) const { return Type::Unstructured; }
+    Type operator()(std::shared_ptr<std::string const> const&) const { return Type::String; }
+    template <class T>
+    Type operator()(T const&) const = delete;
+};
+
+struct AsInteger : boost::static_visitor<long long> {
+    long long operator()(long long i) const { return i; }
+    long long operator()(double d) const { return truncate<long long>(d); }
+    long long operator()(FloatVec2 const& v) const { return truncate<long long>(v.x); }
+    long long operator()(FloatVec3 const& v) const { return truncate<long long>(v.x); }
+    long long operator()(FloatVec4 const& v) const { return truncate<long long>(v.x); }
+    long long operator()(std::shared_ptr<FloatMat4 const> const&) const { return 0; }
+    long long operator()(bool b) const { return b ? 1 : 0; }
+    template <Type resource>
+    long long operator()(Value::ResourceID<resource> resourceId) const {
+        return resourceId.id != 0 ? 1 : 0;
+    }
+    long long operator()(std::shared_ptr<Path const> const& p) const {
+        return hasElements(p) ? 1 : 0;
+    }
+    long long operator()(std::shared_ptr<Unstructured const> const& u) const {
+        return u ? u->asInteger() : 0;
+    }
+    long long operator()(std::shared_ptr<std::string const> const& s) const {
+        return truncate<long long>(numberFromString(s));
+    }
+    template <class T>
+    long long operator()(T const&) const = delete;
+};
+
+struct AsDouble : boost::static_visitor<double> {
+    double operator()(long long i) const { return static_cast<double>(i); }
+    double operator()(double d) const { return d; }
+    double operator()(FloatVec2 const& v) const { return v.x; }
+    double operator()(FloatVec3 const& v) const { return v.x; }
+    double operator()(FloatVec4 const& v) const { return v.x; }
+    double operator()(std::shared_ptr<FloatMat4 const> const&) const { return 0.0; }
+    double operator()(bool b) const { return b ? 1.0 : 0.0; }
+    template <Type resource>
+    double operator()(Value::ResourceID<resource> resourceId) const {
+        return resourceId.id != 0 ? 1.0 : 0.0;
+    }
+    double operator()(std::shared_ptr<Path const> const& p) const {
+        return hasElements(p) ? 1.0 : 0.0;
+    }
+    double operator()(std::shared_ptr<Unstructured const> const& u) const {
+        return u ? u->asFloat() : 0.0;
+    }
+    double operator()(std::shared_ptr<std::string const> const& s) const {
+        return numberFromString(s);
+    }
+    template <class T>
+    double operator()(T const&) const = delete;
+};
+
+struct IsTrue : boost::static_visitor<bool> {
+    bool operator()(long long i) const { return i != 0; }
+    bool operator()(double d) const { return d != 0.0; }  // A NaN is true.
+    bool operator()(FloatVec2 const& v) const { return v.x != 0.0 || v.y != 0.0; }
+    bool operator()(FloatVec3 const& v) const { return v.x != 0.0 || v.y != 0.0 || v.z != 0.0; }
+    bool operator()(FloatVec4 const& v) const {
+        return v.x != 0.0 || v.y != 0.0 || v.z != 0.0 || v.w != 0.0;
+    }
+    bool operator()(std::shared_ptr<FloatMat4 const> const&) const { return false; }
+    bool operator()(bool b) const { return b; }
+    template <Type resource>
+    bool operator()(Value::ResourceID<resource> resourceId) const {
+        return resourceId.id != 0;
+    }
+    bool operator()(std::shared_ptr<Path const> const& p) const { return hasElements(p); }
+    bool operator()(std::shared_ptr<Unstructured const> const& u) const { return u && u->asBool(); }
+    bool operator()(std::shared_ptr<std::string const> const& s) const { return s && !s->empty(); }
+    template <class T>
+    bool operator()(T const&) const = delete;
+};
+
+struct AsId : boost::static_visitor<unsigned long long> {
+    unsigned long long operator()(long long) const { return 0; }
+    unsigned long long operator()(double) const { return 0; }
+    unsigned long long operator()(FloatVec2 const&) const { return 0; }
+    unsigned long long operator()(FloatVec3 const&) const { return 0; }
+    unsigned long long operator()(FloatVec4 const&) const { return 0; }
+    unsigned long long operator()(std::shared_ptr<FloatMat4 const> const&) const { return 0; }
+    unsigned long long operator()(bool) const { return 0; }
+    template <Type resource>
+    unsigned long long operator()(Value::ResourceID<resource> resourceId) const {
+        return resourceId.id;
+    }
+    unsigned long long operator()(std::shared_ptr<Path const> const&) const { return 0; }
+    unsigned long long operator()(std::shared_ptr<Unstructured const> const& u) const {
+        return u ? u->asId() : 0;
+    }
+    unsigned long long operator()(std::shared_ptr<std::string const> const&) const { return 0; }
+    template <class T>
+    unsigned long long operator()(T const&) const = delete;
+};
+
+FloatVec2 spread(double d, FloatVec2) { return {d, d}; }
+FloatVec3 spread(double d, FloatVec3) { return {d, d, d}; }
+FloatVec4 spread(double d, FloatVec4) { return {d, d, d, d}; }
+
+FloatVec2 resize(FloatVec4 const& v, FloatVec2) { return {v.x, v.y}; }
+FloatVec3 resize(FloatVec4 const& v, FloatVec3) { return {v.x, v.y, v.z}; }
+FloatVec4 resize(FloatVec4 const& v, FloatVec4) { return v; }
+
+template <class Vector>
+struct AsVector : boost::static_visitor<Vector> {
+    Vector operator()(long long i) const { return spread(static_cast<double>(i), Vector()); }
+    Vector operator()(double d) const { return spread(d, Vector()); }
+    Vector operator()(FloatVec2 const& v) const { return resize({v.x, v.y, 0, 0}, Vector()); }
+    Vector operator()(FloatVec3 const& v) const { return resize({v.x, v.y, v.z, 0}, Vector()); }
+    Vector operator()(FloatVec4 const& v) const { return resize(v, Vector()); }
+    Vector operator()(std::shared_ptr<FloatMat4 const> const&) const { return {}; }
+    Vector operator()(bool b) const { return spread(b ? 1.0 : 0.0, Vector()); }
+    template <Type resource>
+    Vector operator()(Value::ResourceID<resource>) const {
+        return {};
+    }
+    Vector operator()(std::shared_ptr<Path const> const&) const { return {}; }
+    Vector operator()(std::shared_ptr<Unstructured const> const& u) const {
+        return u ? u->operator Vector() : Vector();
+    }
+    Vector operator()(std::shared_ptr<std::string const> const&) const { return {}; }
+    template <class T>
+    Vector operator()(T const&) const = delete;
+};
+
+struct AsUnstructured : boost::static_visitor<Unstructured> {
+    Unstructured operator()(long long i) const { return i; }
+    Unstructured operator()(double d) const { return d; }
+    Unstructured operator()(FloatVec2 const& v) const {
+        return Unstructured::Map{{"X", v.x}, {"Y", v.y}};
+    }
+    Unstructured operator()(FloatVec3 const& v) const {
+        return Unstructured::Map{{"X", v.x}, {"Y", v.y}, {"Z", v.z}};
+    }
+    Unstructured operator()(FloatVec4 const& v) const {
+        return Unstructured::Map{{"X", v.x}, {"Y", v.y}, {"Z", v.z}, {"W", v.w}};
+    }
+    Unstructured operator()(std::shared_ptr<FloatMat4 const> const&) const { return {}; }
+    Unstructured operator()(bool b) const { return b ? 1LL : 0LL; }
+    template <Type resource>
+    Unstructured operator()(Value::ResourceID<resource>) const {
+        return {};
+    }
+    Unstructured operator()(std::shared_ptr<Path const> const&) const { return {}; }
+    Unstructured operator()(std::shared_ptr<Unstructured const> const& u) const {
+        return u ? *u : Unstructured();
+    }
+    Unstructured operator()(std::shared_ptr<std::string const> const& s) const {
+        return s ? *s : std::string();
+    }
+    template <class T>
+    Unstructured operator()(T const&) const = delete;
+};
+
+// The text that "%.f" gives for negative zero.
+std::string const& negativeZero() {
+    static std::string const text = [] {
+        char buffer[8];
+        std::snprintf(buffer, sizeof buffer, "%.f", -0.0);
+        return std::string(buffer);
+    }();
+    return text;
+}
+
+struct ToStringVisitor : boost::static_visitor<std::string> {
+    std::string operator()(long long i) const { return std::to_string(i); }
+
+    std::string operator()(double d) const {
+        char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
+        std::snprintf(buffer, sizeof buffer, std::abs(d) >= 1000.0 ? "%.1f" : "%.2f", d);
+        std::string text = buffer;
+        char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
+        if (std::size_t const position = text.find(point); position != std::string::npos) {
+            while (text.size() > position + 1 && text.back() == '0') text.pop_back();
+            if (text.size() == position + 1) text.pop_back();
+        }
+        return text == negativeZero() ? "0" : text;
+    }
+
+    std::string operator()(FloatVec2 const& v) const { return number(v.x) + ", " + number(v.y); }
+    std::string operator()(FloatVec3 const& v) const {
+        return number(v.x) + ", " + number(v.y) + ", " + number(v.z);
+    }
+    std::string operator()(FloatVec4 const& v) const {
+        return number(v.x) + ", " + number(v.y) + ", " + number(v.z) + ", " + number(v.w);
+    }
+    std::string operator()(std::shared_ptr<FloatMat4 const> const& m) const {
+        std::string text;
+        if (!m) return text;
+        for (std::size_t i = 0; i < std::size(m->elements); ++i) {
+            text += number(m->elements[i]) + " ";
+            if (i % 4 == 3) text += "\n";
+        }
+        return text;
+    }
+    std::string operator()(bool b) const { return b ? "1" : "0"; }
+    template <Type resource>
+    std::string operator()(Value::ResourceID<resource> resourceId) const {
+        return std::to_string(resourceId.id);
+    }
+    std::string operator()(std::shared_ptr<Path const> const& p) const {
+        return hasElements(p) ? "Path" : "Empty Path";
+    }
+    std::string operator()(std::shared_ptr<Unstructured const> const& u) const {
+        std::string const* const text = u ? u->ifString() : nullptr;
+        return text ? *text : "unstructured";
+    }
+    std::string operator()(std::shared_ptr<std::string const> const& s) const {
+        return s ? *s : std::string();
+    }
+    template <class T>
+    std::string operator()(T const&) const = delete;
+
+private:
+    std::string number(double d) const { return (*this)(d); }
+};
+
+bool contentsEqual(FloatMat4 const& a, FloatMat4 const& b) {
+    return std::memcmp(&a, &b, sizeof(FloatMat4)) == 0;
+}
+template <class T>
+bool contentsEqual(T const& a, T const& b) {
+    return a == b;
+}
+
+// Compares two values that hold the same alternative.
+struct AreEqual : boost::static_visitor<bool> {
+    template <class T>
+    bool operator()(T const& a, T const& b) const {
+        return a == b;
+    }
+    template <class T>
+    bool operator()(std::shared_ptr<T const> const& a, std::shared_ptr<T const> const& b) const {
+        return a == b || (a && b && contentsEqual(*a, *b));
+    }
+    template <class T, class U>
+    bool operator()(T const&, U const&) const {
+        return false;
+    }
+};
+
+}  // namespace
+
+std::string typeToString(Type type) {
+    if (std::size_t(type) >= kTypeNames.size()) assertionFailed("0", __func__, kModule, __LINE__);
+    return std::string(kTypeNames[std::size_t(type)]);
+}
+
+Optional<Type> stringToType(std::string const& name) {
+    for (std::size_t i = 0; i < kTypeNames.size(); ++i) {
+        if (kTypeNames[i] == name) return Type(i);
+    }
+    return std::nullopt;
+}
+
+bool typeIsResource(Type type) { return contains(kResourceTypes, type); }
+
+bool typeShouldCopyAcrossDeletedConnections(Type type) { return contains(kCopiedTypes, type); }
+
+Value::Value() : storage(0.0) {}
+Value::Value(double number) : storage(number) {}
+Value::Value(long long integer) : storage(integer) {}
+Value::Value(bool truth) : storage(truth) {}
+Value::Value(FloatVec2 vector) : storage(vector) {}
+Value::Value(FloatVec3 vector) : storage(vector) {}
+Value::Value(FloatVec4 vector) : storage(vector) {}
+Value::Value(FloatMat4 const& matrix) : storage(std::make_shared<FloatMat4 const>(matrix)) {}
+Value::Value(char const* text)
+    : storage(std::make_shared<std::string const>(text == nullptr ? "" : text)) {}
+Value::Value(std::string text) : storage(std::make_shared<std::string const>(std::move(text))) {}
+Value::Value(Path path) : storage(std::make_shared<Path const>(std::move(path))) {}
+Value::Value(std::shared_ptr<Path const> path) : storage(std::move(path)) {}
+Value::Value(Unstructured tree) : storage(std::make_shared<Unstructured const>(std::move(tree))) {}
+
+Value::Value(unsigned long long id, Type type) {
+    switch (type) {
+        case Type::Image: storage = ImageID{id}; return;
+        case Type::Video: storage = VideoID{id}; return;
+        case Type::Sound: storage = SoundID{id}; return;
+        case Type::Model: storage = ModelID{id}; return;
+        case Type::Float:
+        case Type::Vec2:
+        case Type::Vec3:
+        case Type::Vec4:
+        case Type::Mat4:
+        case Type::Boolean:
+        case Type::Int:
+        case Type::Path:
+        case Type::String:
+        case Type::Unstructured: break;
+    }
+    assertionFailed("0", __func__, kModule, kResourceTypeLine);
+}
+
+Value Value::Image(unsigned long long id) { return Value(id, Type::Image); }
+Value Value::Video(unsigned long long id) { return Value(id, Type::Video); }
+Value Value::Sound(unsigned long long id) { return Value(id, Type::Sound); }
+Value Value::Model(unsigned long long id) { return Value(id, Type::Model); }
+
+Value Value::defaultValue(Type type) { return defaultValue(type, 0); }
+
+Value Value::defaultValue(Type type, unsigned char qualifier) {
+    switch (type) {
+        case Type::Float: return 0.0;
+        case Type::Vec2: return FloatVec2();
+        case Type::Vec3: return FloatVec3();
+        case Type::Vec4: return FloatVec4{0.0, 0.0, 0.0, qualifier == 4 ? 1.0 : 0.0};
+        case Type::Mat4: return FloatMat4Identity;
+        case Type::Boolean: return false;
+        case Type::Int: return 0LL;
+        case Type::Image:
+        case Type::Video:
+        case Type::Sound:
+        case Type::Model: return Value(0, type);
+        case Type::Path: return *Path::EmptyPath();
+        case Type::String: return std::string();
+        case Type::Unstructured: return Unstructured::Undefined();
+    }
+    assertionFailed("0", __func__, kModule, __LINE__);
+}
+
+Type Value::type() const { return boost::apply_visitor(TypeOf(), storage); }
+
+Value::operator long long() const { return boost::apply_visitor(AsInteger(), storage); }
+Value::operator double() const { return boost::apply_visitor(AsDouble(), storage); }
+Value::operator bool() const { return boost::apply_visitor(IsTrue(), storage); }
+Value::operator unsigned long long() const { return boost::apply_visitor(AsId(), storage); }
+Value::operator FloatVec2() const { return boost::apply_visitor(AsVector<FloatVec2>(), storage); }
+Value::operator FloatVec3() const { return boost::apply_visitor(AsVector<FloatVec3>(), storage); }
+Value::operator FloatVec4() const { return boost::apply_visitor(AsVector<FloatVec4>(), storage); }
+
+Value::operator FloatMat4() const {
+    FloatMat4 const* const matrix = asFloatMat4();
+    return matrix ? *matrix : FloatMat4Identity;
+}
+
+Value::operator Path() const {
+    Path const* const path = ifPath();
+    return path ? *path : *Path::EmptyPath();
+}
+
+Value::operator std::string() const {
+    if (Unstructured const* tree = ifUnstructured()) {
+        return tree->ifString() ? *tree->ifString() : "??";
+    }
+    return type() == Type::Unstructured ? "??" : to_string(*this);
+}
+
+Unstructured Value::asUnstructured() const {
+    return boost::apply_visitor(AsUnstructured(), storage);
+}
+
+FloatMat4 const* Value::asFloatMat4() const {
+    auto const* matrix = boost::get<std::shared_ptr<FloatMat4 const>>(&storage);
+    return matrix ? matrix->get() : nullptr;
+}
+
+Path const* Value::ifPath() const {
+    auto const* path = boost::get<std::shared_ptr<Path const>>(&storage);
+    return path ? path->get() : nullptr;
+}
+
+std::string const* Value::ifString() const {
+    auto const* text = boost::get<std::shared_ptr<std::string const>>(&storage);
+    return text ? text->get() : nullptr;
+}
+
+Unstructured const* Value::ifUnstructured() const {
+    auto const* tree = boost::get<std::shared_ptr<Unstructured const>>(&storage);
+    return tree ? tree->get() : nullptr;
+}
+
+Value Value::asType(Type type) const {
+    switch (type) {
+        case Type::Float: return operator double();
+        case Type::Vec2: return operator FloatVec2();
+        case Type::Vec3: return operator FloatVec3();
+        case Type::Vec4: return operator FloatVec4();
+        case Type::Mat4: return operator FloatMat4();
+        case Type::Boolean: return operator bool();
+        case Type::Int: return operator long long();
+        case Type::Image:
+        case Type::Video:
+        case Type::Sound:
+        case Type::Model: return Value(operator unsigned long long(), type);
+        case Type::Path: return operator Path();
+        case Type::String: return operator std::string();
+        case Type::Unstructured: return Value(Unstructured(*this));
+    }
+    assertionFailed("0", __func__, kModule, __LINE__);
+}
+
+bool Value::operator==(Value const& other) const {
+    return boost::apply_visitor(AreEqual(), storage, other.storage);
+}
+bool Value::operator!=(Value const& other) const { return !(*this == other); }
+
+std::string to_string(Value const& value) {
+    return boost::apply_visitor(ToStringVisitor(), value.storage);
+}
+
+bool TypeInfo::operator==(TypeInfo const& other) const {
+    return type == other.type && subtype == other.subtype && min == other.min && max == other.max &&
+           extra == other.extra;
+}
+bool TypeInfo::operator!=(TypeInfo const& other) const { return !(*this == other); }
+
+std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural) {
+    switch (typeInfo.type) {
+        case Type::Float:
+        case Type::Int: return plural ? "Numbers" : "Number";
+        case Type::Vec2: return plural ? "Positions" : "Position";
+        case Type::Vec3: return plural ? "3D Points" : "Point 3D";
+        case Type::Vec4: return plural ? "Colors" : "Color";
+        case Type::Mat4: return plural ? "Matrices" : "Matrix";
+        case Type::Boolean:
+            if (typeInfo.subtype == 1) return plural ? "Pulses" : "Pulse";
+            return plural ? "Booleans" : "Boolean";
+        case Type::Image: return plural ? "Images" : "Image";
+        case Type::Video: return plural ? "Videos" : "Video";
+        case Type::Sound: return plural ? "Sounds" : "Sound";
+        case Type::Path: return plural ? "Paths" : "Path";
+        case Type::String: return plural ? "Strings" : "String";
+        case Type::Model: return plural ? "Models" : "Model";
+        case Type::Unstructured:
+            if (typeInfo.subtype == 1) return plural ? "Layers" : "Layer";
+            return "Unstructured";
+    }
+    assertionFailed("0", __func__, kModule, __LINE__);
+}
+
+Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) {
+    if (typeInfo.type != Type::Float) return value;
+    if (typeInfo.min && double(*typeInfo.min) > double(value)) return *typeInfo.min;
+    if (typeInfo.max && double(value) > double(*typeInfo.max)) return *typeInfo.max;
+    return value;
+}
+
+// Deliberate: the value is copied, not moved from.
+Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
+    Value const& named = value;
+    return castValueToType(named, typeInfo);
+}
+
+Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                              unsigned long long index) {
+    return castValueToType(loop.empty() ? nullValue() : loop[index % loop.size()], typeInfo);
+}
+
+Loop const& nullLoop() {
+    static Loop const loop;
+    return loop;
+}
+
+std::ostream& operator<<(std::ostream& stream, Value const& value) {
+    return stream << to_string(value);
+}
+
+std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo) {
+    return stream << "[type: " << typeToString(typeInfo.type) << "]";
+}
+
+}  // namespace tarn::engine

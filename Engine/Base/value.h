@@ -1,0 +1,397 @@
+// Engine/Base/value.h: the values that travel along connections, and the ports that take them.
+//
+//     Value radius = 2.5;
+//     double r = radius;                          // 2.5
+//     Value text = radius.asType(Type::String);   // "2.5"
+//     std::cout << text;
+
+#ifndef TARN_ENGINE_BASE_VALUE_H
+#define TARN_ENGINE_BASE_VALUE_H
+
+#include <Engine/Base/export.h>
+#include <Engine/Base/optional.h>
+
+#include <boost/variant/variant.hpp>
+
+#include <cstddef>
+#include <iosfwd>
+#include <memory>
+#include <string>
+#include <type_traits>
+#include <vector>
+
+namespace tarn::engine {
+
+struct Path;
+class Unstructured;
+
+/// The closed set of value types. The numbers are persisted and index tables; they are not the
+/// order of the alternatives inside a `Value`. A pulse is a `Boolean` port and a layer an
+/// `Unstructured` port that `TypeInfo::subtype` marks.
+enum class Type : unsigned char {
+    Float = 0,
+    Vec2 = 1,
+    Vec3 = 2,
+    Vec4 = 3,
+    Mat4 = 4,
+    Boolean = 5,
+    Int = 6,
+    Image = 7,
+    Video = 8,
+    Sound = 9,
+    Path = 10,
+    String = 11,
+    Model = 12,
+    Unstructured = 13,
+};
+
+/// Two doubles. Equality is the floating-point one, component by component.
+struct FloatVec2 {
+    double x = 0.0;
+    double y = 0.0;
+
+    friend constexpr bool operator==(FloatVec2 const& a, FloatVec2 const& b) {
+        return a.x == b.x && a.y == b.y;
+    }
+    friend constexpr bool operator!=(FloatVec2 const& a, FloatVec2 const& b) { return !(a == b); }
+};
+
+/// Three doubles. Equality is the floating-point one, component by component.
+struct FloatVec3 {
+    double x = 0.0;
+    double y = 0.0;
+    double z = 0.0;
+
+    friend constexpr bool operator==(FloatVec3 const& a, FloatVec3 const& b) {
+        return a.x == b.x && a.y == b.y && a.z == b.z;
+    }
+    friend constexpr bool operator!=(FloatVec3 const& a, FloatVec3 const& b) { return !(a == b); }
+};
+
+/// Four doubles. Equality is the floating-point one, component by component.
+struct FloatVec4 {
+    double x = 0.0;
+    double y = 0.0;
+    double z = 0.0;
+    double w = 0.0;
+
+    friend constexpr bool operator==(FloatVec4 const& a, FloatVec4 const& b) {
+        return a.x == b.x && a.y == b.y && a.z == b.z && a.w == b.w;
+    }
+    friend constexpr bool operator!=(FloatVec4 const& a, FloatVec4 const& b) { return !(a == b); }
+};
+
+/// A 4x4 matrix in one run, zero unless given; the identity has 1.0 at positions 0, 5, 10 and 15.
+/// Rows or columns first is the reader's convention. It has no equality of its own: a `Value`
+/// compares matrices by their bytes, and one reading of `==` is enough.
+struct FloatMat4 {
+    double elements[16] = {};
+};
+static_assert(sizeof(FloatMat4) == 128, "sixteen doubles and nothing else");
+
+namespace detail {
+
+template <class T, class... Candidates>
+constexpr bool isOneOf = (std::is_same_v<T, Candidates> || ...);
+
+template <class T>
+constexpr bool isSignedInteger = isOneOf<T, signed char, short, int, long, long long>;
+
+template <class T>
+constexpr bool isUnsignedInteger =
+    isOneOf<T, unsigned char, unsigned short, unsigned int, unsigned long, unsigned long long>;
+
+template <class T>
+constexpr bool isCharacter = std::is_integral_v<T> && !isSignedInteger<T> &&
+                             !isUnsignedInteger<T> && !std::is_same_v<T, bool>;
+
+/// The other spelling of a 64-bit integer: `long` where `std::int64_t` is one, for example.
+template <class T>
+constexpr bool isWideInteger = isOneOf<T, long, unsigned long> && sizeof(long) == sizeof(long long);
+
+/// What a `Value` refuses to be read as, since a promotion of its truth value would answer.
+template <class T>
+constexpr bool isNarrowNumber = std::is_arithmetic_v<T> && !isWideInteger<T> &&
+                                !isOneOf<T, bool, double, long long, unsigned long long>;
+
+/// What a `Value` refuses to be made from, since its truth value would be stored.
+template <class T>
+constexpr bool isNoValueSource = isUnsignedInteger<T> || isCharacter<T> ||
+                                 std::is_same_v<T, long double> || std::is_member_pointer_v<T> ||
+                                 (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>);
+
+}  // namespace detail
+
+/// The name that documents store, "float" to "unstructured". An enumerator out of range is an
+/// assertion failure.
+TARN_ENGINE_BASE_EXPORT std::string typeToString(Type type);
+
+/// The inverse of `typeToString`, byte by byte; empty for any other text.
+TARN_ENGINE_BASE_EXPORT Optional<Type> stringToType(std::string const& name);
+
+/// True for images, videos, sounds and models; false for any byte that is no enumerator.
+TARN_ENGINE_BASE_EXPORT bool typeIsResource(Type type);
+
+/// Whether the value that flowed along a deleted connection is copied across to the input: true
+/// but for paths, models and unstructured data; false for any byte that is no enumerator.
+TARN_ENGINE_BASE_EXPORT bool typeShouldCopyAcrossDeletedConnections(Type type);
+
+/// The tag of a native type. Other types than these do not compile.
+template <class T>
+constexpr Type TarnType() = delete;
+template <>
+constexpr Type TarnType<double>() {
+    return Type::Float;
+}
+template <>
+constexpr Type TarnType<FloatVec2>() {
+    return Type::Vec2;
+}
+template <>
+constexpr Type TarnType<FloatVec3>() {
+    return Type::Vec3;
+}
+template <>
+constexpr Type TarnType<FloatVec4>() {
+    return Type::Vec4;
+}
+template <>
+constexpr Type TarnType<FloatMat4>() {
+    return Type::Mat4;
+}
+template <>
+constexpr Type TarnType<bool>() {
+    return Type::Boolean;
+}
+template <>
+constexpr Type TarnType<long long>() {
+    return Type::Int;
+}
+template <>  // Deliberate: a bare number is an image's, the first of the resource kinds.
+constexpr Type TarnType<unsigned long long>() {
+    return Type::Image;
+}
+template <>
+constexpr Type TarnType<Path>() {
+    return Type::Path;
+}
+template <>
+constexpr Type TarnType<std::string>() {
+    return Type::String;
+}
+template <>
+constexpr Type TarnType<Unstructured>() {
+    return Type::Unstructured;
+}
+
+/// One value of one of the fourteen types. Numbers, vectors, truth values and identifiers are held
+/// inline; a matrix, a path, a tree or a string is allocated once, never changed afterwards, and
+/// shared by every copy. A copy costs at most one reference count and never fails.
+///
+/// Every value reads as every type, without failing: a reading that makes no sense is zero, false,
+/// the identity matrix or the empty path. A value that was moved from, or made from a null pointer,
+/// may hold a null payload; it reads as neutral and equals only another null of its alternative.
+///
+/// Distinct values may be used on distinct threads, copies of one value included.
+class Value {
+public:
+    /// A resource by its number; 0 is no resource. Four types, so that an image is never a video.
+    template <Type resource>
+    struct ResourceID {
+        unsigned long long id = 0;
+
+        friend constexpr bool operator==(ResourceID a, ResourceID b) { return a.id == b.id; }
+        friend constexpr bool operator!=(ResourceID a, ResourceID b) { return a.id != b.id; }
+    };
+    using ImageID = ResourceID<Type::Image>;
+    using VideoID = ResourceID<Type::Video>;
+    using SoundID = ResourceID<Type::Sound>;
+    using ModelID = ResourceID<Type::Model>;
+
+    /// The double 0.0.
+    TARN_ENGINE_BASE_EXPORT Value();
+    TARN_ENGINE_BASE_EXPORT Value(double number);
+    TARN_ENGINE_BASE_EXPORT Value(long long integer);
+    /// Every other signed integer type; `char` is not one.
+    template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
+    Value(Integer integer) : Value(static_cast<long long>(integer)) {}
+    TARN_ENGINE_BASE_EXPORT Value(bool truth);
+    TARN_ENGINE_BASE_EXPORT Value(FloatVec2 vector);
+    TARN_ENGINE_BASE_EXPORT Value(FloatVec3 vector);
+    TARN_ENGINE_BASE_EXPORT Value(FloatVec4 vector);
+    TARN_ENGINE_BASE_EXPORT Value(FloatMat4 const& matrix);
+    /// The bytes up to the terminating zero; a null pointer is the empty string.
+    TARN_ENGINE_BASE_EXPORT Value(char const* text);
+    TARN_ENGINE_BASE_EXPORT Value(std::string text);
+    TARN_ENGINE_BASE_EXPORT Value(Path path);
+    /// Shares the path; nothing is copied.
+    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Path const> path);
+    TARN_ENGINE_BASE_EXPORT Value(Unstructured tree);
+    /// The resource `id`. A `type` that is no resource is an assertion failure.
+    TARN_ENGINE_BASE_EXPORT Value(unsigned long long id, Type type);
+
+    /// An unsigned number needs its `Type`; a character, a pointer or null would be a truth value.
+    template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
+    Value(Source) = delete;
+    Value(std::nullptr_t) = delete;
+
+    TARN_ENGINE_BASE_EXPORT static Value Image(unsigned long long id);
+    TARN_ENGINE_BASE_EXPORT static Value Video(unsigned long long id);
+    TARN_ENGINE_BASE_EXPORT static Value Sound(unsigned long long id);
+    TARN_ENGINE_BASE_EXPORT static Value Model(unsigned long long id);
+
+    /// What a fresh port of `type` starts with: zero, false, the identity matrix, identifier 0, an
+    /// empty path or string, null data. `qualifier` 4 makes a `Vec4` start as (0, 0, 0, 1), an
+    /// opaque black, and changes nothing else. An enumerator out of range is an assertion failure.
+    TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type);
+    TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
+
+    TARN_ENGINE_BASE_EXPORT Type type() const;
+
+    /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
+    /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
+    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero. A
+    /// string is the number that `strtod` reads from all of it, else 1, and 0 when it is empty;
+    /// its truth is not being empty. A double becomes an integer towards zero, kept in range, and
+    /// 0 for a NaN.
+    TARN_ENGINE_BASE_EXPORT operator long long() const;
+    TARN_ENGINE_BASE_EXPORT operator double() const;
+    TARN_ENGINE_BASE_EXPORT operator bool() const;
+    /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
+    TARN_ENGINE_BASE_EXPORT operator unsigned long long() const;
+    /// As `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
+    template <class Integer, std::enable_if_t<detail::isWideInteger<Integer>, int> = 0>
+    operator Integer() const {
+        using Reading =
+            std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
+        return static_cast<Integer>(operator Reading());
+    }
+    /// `int(value)` would be a promoted truth value: read a `long long` and narrow that.
+    template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
+    operator Narrow() const = delete;
+
+    /// Vector readings; none allocates. A number or truth value fills every component, a shorter
+    /// vector is filled up with zeros and a longer one cut; data reads as `Unstructured` says;
+    /// everything else is zero.
+    TARN_ENGINE_BASE_EXPORT operator FloatVec2() const;
+    TARN_ENGINE_BASE_EXPORT operator FloatVec3() const;
+    TARN_ENGINE_BASE_EXPORT operator FloatVec4() const;
+    /// The matrix held, else the identity.
+    TARN_ENGINE_BASE_EXPORT operator FloatMat4() const;
+    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing.
+    TARN_ENGINE_BASE_EXPORT operator Path() const;
+    /// As `to_string`, but "??" for data that is no string.
+    TARN_ENGINE_BASE_EXPORT operator std::string() const;
+    /// The data of this value: numbers, strings and trees as they are, a truth value as the integer
+    /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
+    TARN_ENGINE_BASE_EXPORT Unstructured asUnstructured() const;
+
+    /// The payload inside the value, or null where the value holds another alternative or a null
+    /// payload. Lives until the value is assigned to or destroyed. Copies nothing.
+    TARN_ENGINE_BASE_EXPORT FloatMat4 const* asFloatMat4() const;
+    TARN_ENGINE_BASE_EXPORT Path const* ifPath() const;
+    TARN_ENGINE_BASE_EXPORT std::string const* ifString() const;
+    TARN_ENGINE_BASE_EXPORT Unstructured const* ifUnstructured() const;
+
+    /// A value of exactly `type`, made from the matching reading with a payload of its own, even
+    /// when this value has that type already. An enumerator out of range is an assertion failure.
+    TARN_ENGINE_BASE_EXPORT Value asType(Type type) const;
+
+    /// The same alternative with equal content: 1 and 1.0 differ. Numbers and vectors compare as
+    /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
+    TARN_ENGINE_BASE_EXPORT bool operator==(Value const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(Value const& other) const;
+
+private:
+    friend std::string to_string(Value const& value);
+
+    using Storage =
+        boost::variant<long long, double, FloatVec2, FloatVec3, FloatVec4,
+                       std::shared_ptr<FloatMat4 const>, bool, ImageID, VideoID, SoundID, ModelID,
+                       std::shared_ptr<Path const>, std::shared_ptr<Unstructured const>,
+                       std::shared_ptr<std::string const>>;
+    Storage storage;
+};
+static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they grow");
+
+/// The text that an editor shows; not made to be read back. Numbers have two decimals, or one from
+/// 1000 on, without trailing zeros: 2.5, 1234.6, 3. Components of a vector are joined by ", ", and
+/// a matrix is four lines of four. Truth is "1" or "0", an identifier its number, a path "Path" or
+/// "Empty Path", data "unstructured" unless it is a string. The decimal point that is trimmed is
+/// that of `std::cout`'s locale at the call; nobody may change that locale meanwhile.
+TARN_ENGINE_BASE_EXPORT std::string to_string(Value const& value);
+
+namespace detail {
+
+/// The kinds that convert to or from a `Value`.
+template <class T>
+constexpr bool isComparedByReading =
+    std::is_arithmetic_v<T> || std::is_convertible_v<T const&, std::string> ||
+    isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, Unstructured>;
+template <>
+inline constexpr bool isComparedByReading<Value> = false;
+
+template <class T>
+using EnableIfComparedByReading = std::enable_if_t<isComparedByReading<T>, int>;
+
+}  // namespace detail
+
+/// A value is compared with a value: whether the other side becomes one, or this one is read as
+/// the other kind, is for the caller to write.
+template <class Other, detail::EnableIfComparedByReading<Other> = 0>
+bool operator==(Value const&, Other const&) = delete;
+template <class Other, detail::EnableIfComparedByReading<Other> = 0>
+bool operator==(Other const&, Value const&) = delete;
+template <class Other, detail::EnableIfComparedByReading<Other> = 0>
+bool operator!=(Value const&, Other const&) = delete;
+template <class Other, detail::EnableIfComparedByReading<Other> = 0>
+bool operator!=(Other const&, Value const&) = delete;
+
+/// A list of values; indices wrap around it (`indexLoopCasting`).
+using Loop = std::vector<Value>;
+
+/// What a port carries, and the bounds of what it takes.
+struct TypeInfo {
+    Type type = Type::Float;
+    /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
+    unsigned char subtype = 0;
+    /// Bounds, both inclusive, of a `Float` port; other ports are never clamped.
+    Optional<Value> min;
+    Optional<Value> max;
+    /// Carried, copied and compared; this library reads nothing into it.
+    Optional<Value> extra;
+
+    TARN_ENGINE_BASE_EXPORT bool operator==(TypeInfo const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(TypeInfo const& other) const;
+};
+
+/// The name of a port of this kind, such as "Number" or, where `plural`, "Numbers". Only `type` and
+/// `subtype` matter. An enumerator out of range is an assertion failure.
+TARN_ENGINE_BASE_EXPORT std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural);
+
+/// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
+/// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
+/// refers into one of the arguments and lives no longer than both.
+TARN_ENGINE_BASE_EXPORT Value const& castValueToType(Value const& value, TypeInfo const& typeInfo);
+
+/// The same decision, as a copy of the value chosen.
+TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typeInfo);
+
+/// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as
+/// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
+/// a value that lives to program exit.
+TARN_ENGINE_BASE_EXPORT Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                                                      unsigned long long index);
+
+/// The empty loop that everyone shares; lives to program exit.
+TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();
+
+/// Writes `to_string(value)`.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Value const& value);
+
+/// Writes the type alone: "[type: float]".
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
+
+}  // namespace tarn::engine
+
+#endif

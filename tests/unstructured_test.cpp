@@ -1,0 +1,428 @@
+#include <Engine/Base/unstructured.h>
+
+#include <Engine/Base/path.h>
+
+#include "support/allocations.h"
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <cmath>
+
+using namespace tarn::engine;
+
+namespace {
+
+using Map = Unstructured::Map;
+using List = Unstructured::Array;
+using Kind = Unstructured::Type;
+
+}  // namespace
+
+TEST(Unstructured, IsMadeFromEverySourceAsItsAlternative) {
+    Map const map{{"a", 1}};
+    List const list{1, 2.5, "three"};
+    std::string const text = "text";
+    struct Row {
+        char const* what;
+        Unstructured value;
+        Kind kind;
+        int number;
+    };
+    for (Row const& row : {
+             Row{"nothing", Unstructured(), Kind::Null, 0},
+             Row{"undefined", Unstructured::Undefined(), Kind::Null, 0},
+             Row{"map", Unstructured(map), Kind::Map, 1},
+             Row{"map, moved", Unstructured(Map{}), Kind::Map, 1},
+             Row{"array", Unstructured(list), Kind::Array, 2},
+             Row{"array, moved", Unstructured(List{}), Kind::Array, 2},
+             Row{"double", Unstructured(2.5), Kind::Float, 3},
+             Row{"float", Unstructured(2.5f), Kind::Float, 3},
+             Row{"long long", Unstructured(1LL), Kind::Integer, 4},
+             Row{"int", Unstructured(1), Kind::Integer, 4},
+             Row{"int64", Unstructured(std::int64_t(1)), Kind::Integer, 4},
+             Row{"signed char", Unstructured(static_cast<signed char>(1)), Kind::Integer, 4},
+             Row{"unsigned long long", Unstructured(1ULL), Kind::UnsignedInteger, 5},
+             Row{"unsigned", Unstructured(1u), Kind::UnsignedInteger, 5},
+             Row{"uint64", Unstructured(std::uint64_t(1)), Kind::UnsignedInteger, 5},
+             Row{"unsigned char", Unstructured(static_cast<unsigned char>(1)),
+                 Kind::UnsignedInteger, 5},
+             Row{"string", Unstructured(text), Kind::String, 6},
+             Row{"string, moved", Unstructured(std::string("x")), Kind::String, 6},
+             Row{"literal", Unstructured("x"), Kind::String, 6},
+             Row{"null text", Unstructured(static_cast<char const*>(nullptr)), Kind::String, 6},
+             Row{"value", Unstructured(Value(2.5)), Kind::Float, 3},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.value.type(), row.kind);
+        EXPECT_EQ(static_cast<int>(row.kind), row.number);
+    }
+    EXPECT_EQ(Unstructured("a\0b").asString(), "a");
+    EXPECT_EQ(Unstructured(std::string("a\0b", 3)).asString(), std::string("a\0b", 3));
+    EXPECT_EQ(Unstructured(static_cast<char const*>(nullptr)).asString(), "");
+    static_assert(sizeof(Kind) == 1 && std::is_unsigned_v<std::underlying_type_t<Kind>>);
+    static_assert(std::is_nothrow_move_constructible_v<Unstructured>);
+    static_assert(std::is_nothrow_move_assignable_v<Unstructured>);
+}
+
+TEST(Unstructured, AnswersEveryReading) {
+    Map const map{{"X", 1.0}};
+    List const list{1, 2};
+    double const two64 = 18446744073709551616.0;
+    struct Row {
+        char const* what;
+        Unstructured value;
+        Map asMap;
+        List asArray;
+        long long integer;
+        double number;
+        bool truth;
+        unsigned long long id;
+        std::string text;
+    };
+    for (Row const& row : {
+             Row{"null", {}, {}, {}, 0, 0.0, false, 0, ""},
+             Row{"map", map, map, {}, 0, 0.0, true, 0, ""},
+             Row{"empty map", Map{}, {}, {}, 0, 0.0, true, 0, ""},
+             Row{"array", list, {}, list, 0, 0.0, true, 0, ""},
+             Row{"empty array", List{}, {}, {}, 0, 0.0, true, 0, ""},
+             Row{"double", 2.9, {}, {}, 2, 2.9, true, 2, ""},
+             Row{"negative double", -2.9, {}, {}, -2, -2.9, true, 0, ""},
+             Row{"small double", 0.5, {}, {}, 0, 0.5, true, 0, ""},
+             Row{"negative fraction", -0.5, {}, {}, 0, -0.5, true, 0, ""},
+             Row{"zero", 0.0, {}, {}, 0, 0.0, false, 0, ""},
+             Row{"negative zero", -0.0, {}, {}, 0, -0.0, false, 0, ""},
+             Row{"too large", 1e300, {}, {}, LLONG_MAX, 1e300, true, ULLONG_MAX, ""},
+             Row{"2^64", two64, {}, {}, LLONG_MAX, two64, true, ULLONG_MAX, ""},
+             Row{"below 2^64",
+                 18446744073709549568.0,
+                 {},
+                 {},
+                 LLONG_MAX,
+                 18446744073709549568.0,
+                 true,
+                 18446744073709549568ULL,
+                 ""},
+             Row{"2^63", two64 / 2, {}, {}, LLONG_MAX, two64 / 2, true, 1ULL << 63, ""},
+             Row{"too small", -1e300, {}, {}, LLONG_MIN, -1e300, true, 0, ""},
+             Row{"infinite", INFINITY, {}, {}, LLONG_MAX, INFINITY, true, ULLONG_MAX, ""},
+             Row{"minus infinite", -INFINITY, {}, {}, LLONG_MIN, -INFINITY, true, 0, ""},
+             Row{"integer", 3, {}, {}, 3, 3.0, true, 3, ""},
+             Row{"negative integer", -1LL, {}, {}, -1, -1.0, true, ULLONG_MAX, ""},
+             Row{"integer zero", 0, {}, {}, 0, 0.0, false, 0, ""},
+             Row{"unsigned", 7ULL, {}, {}, 0, 0.0, true, 7, ""},
+             Row{"unsigned zero", 0ULL, {}, {}, 0, 0.0, false, 0, ""},
+             Row{"string", "12", {}, {}, 0, 0.0, true, 0, "12"},
+             Row{"false", "false", {}, {}, 0, 0.0, true, 0, "false"},
+             Row{"empty string", "", {}, {}, 0, 0.0, false, 0, ""},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.value.asMap(), row.asMap);
+        EXPECT_EQ(row.value.asArray(), row.asArray);
+        EXPECT_EQ(row.value.asInteger(), row.integer);
+        EXPECT_EQ(tests::bits(row.value.asFloat()), tests::bits(row.number));
+        EXPECT_EQ(row.value.asBool(), row.truth);
+        EXPECT_EQ(row.value.asId(), row.id);
+        EXPECT_EQ(row.value.asString(), row.text);
+        EXPECT_EQ(row.value.ifMap() != nullptr, row.value.type() == Kind::Map);
+        EXPECT_EQ(row.value.ifArray() != nullptr, row.value.type() == Kind::Array);
+        EXPECT_EQ(row.value.ifString() != nullptr, row.value.type() == Kind::String);
+    }
+    Unstructured const nan = double(NAN);
+    EXPECT_EQ(nan.asInteger(), 0);
+    EXPECT_EQ(nan.asId(), 0u);
+    EXPECT_TRUE(nan.asBool());
+    EXPECT_TRUE(std::isnan(nan.asFloat()));
+}
+
+TEST(Unstructured, GivesItsContentInPlace) {
+    Unstructured const map = Map{{"k", "v"}};
+    Unstructured const list = List{1, 2};
+    Unstructured const text = "text";
+    tests::AllocationCounter counter;
+    EXPECT_EQ(map.ifMap()->size(), 1u);
+    EXPECT_EQ(list.ifArray()->size(), 2u);
+    EXPECT_EQ(*text.ifString(), "text");
+    EXPECT_EQ(map.asInteger() + list.asInteger() + text.asInteger(), 0);
+    EXPECT_EQ(counter.count(), 0u);
+}
+
+TEST(Unstructured, EqualsTheSameAlternativeWithEqualContent) {
+    struct Row {
+        char const* what;
+        Unstructured a;
+        Unstructured b;
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"nulls", {}, {}, true},
+             Row{"null and zero", {}, 0, false},
+             Row{"null and empty map", {}, Map{}, false},
+             Row{"integers", 1, 1, true},
+             Row{"integer and double", 1, 1.0, false},
+             Row{"integer and unsigned", 1, 1u, false},
+             Row{"unsigned and double", 1u, 1.0, false},
+             Row{"other integers", 1, -1, false},
+             Row{"unsigned", 1u, 1u, true},
+             Row{"other unsigned", 1u, 2u, false},
+             Row{"doubles", 0.5, 0.5, true},
+             Row{"zeros", 0.0, -0.0, true},
+             Row{"NaN", double(NAN), double(NAN), false},
+             Row{"strings", "a", "a", true},
+             Row{"other strings", "a", "A", false},
+             Row{"longer string", "a", "ab", false},
+             Row{"arrays", List{1, "b"}, List{1, "b"}, true},
+             Row{"order", List{1, 2}, List{2, 1}, false},
+             Row{"longer array", List{1}, List{1, 2}, false},
+             Row{"maps", Map{{"a", 1}, {"b", 2}}, Map{{"b", 2}, {"a", 1}}, true},
+             Row{"other key", Map{{"a", 1}}, Map{{"b", 1}}, false},
+             Row{"other entry", Map{{"a", 1}}, Map{{"a", 2}}, false},
+             Row{"larger map", Map{{"a", 1}}, Map{{"a", 1}, {"b", 1}}, false},
+             Row{"deep", Map{{"a", List{Map{{"b", 1}}}}}, Map{{"a", List{Map{{"b", 1}}}}}, true},
+             Row{"deep difference", Map{{"a", List{Map{{"b", 1}}}}},
+                 Map{{"a", List{Map{{"b", 2}}}}}, false},
+             Row{"empty map and empty array", Map{}, List{}, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.a == row.b, row.equal);
+        EXPECT_EQ(row.b == row.a, row.equal);
+        EXPECT_EQ(row.a != row.b, !row.equal);
+    }
+}
+
+TEST(Unstructured, CopiesDeeplyAndMovesInConstantTime) {
+    Unstructured const original =
+        Map{{"list", List{1, 2, "three"}}, {"text", std::string(50, 'x')}};
+    Unstructured copy = original;
+    EXPECT_EQ(copy, original);
+    EXPECT_NE(copy.ifMap(), original.ifMap());
+    EXPECT_NE(copy.ifMap()->at("list").ifArray(), original.ifMap()->at("list").ifArray());
+
+    Map const* const content = copy.ifMap();
+    tests::AllocationCounter counter;
+    Unstructured moved = std::move(copy);
+    EXPECT_EQ(moved.ifMap(), content);
+    EXPECT_EQ(copy.type(), Kind::Null);  // NOLINT(bugprone-use-after-move)
+    copy = std::move(moved);
+    EXPECT_EQ(copy.ifMap(), content);
+    EXPECT_EQ(moved.type(), Kind::Null);  // NOLINT(bugprone-use-after-move)
+    EXPECT_EQ(counter.count(), 0u);
+}
+
+TEST(Unstructured, TakesContentByRvalueWithoutCopyingIt) {
+    Map map{{"a", List{1, 2, 3}}};
+    List list{Map{{"b", 1}}, "text"};
+    std::string text(100, 'x');
+    auto const* const entry = &map.at("a");
+    auto const* const element = list.data();
+    char const* const letters = text.data();
+    Unstructured const fromMap = std::move(map);
+    Unstructured const fromList = std::move(list);
+    Unstructured const fromText = std::move(text);
+    EXPECT_EQ(&fromMap.ifMap()->at("a"), entry);
+    EXPECT_EQ(fromList.ifArray()->data(), element);
+    EXPECT_EQ(fromText.ifString()->data(), letters);
+}
+
+TEST(Unstructured, IsAssignedFromAPartOfItself) {
+    Unstructured tree = Map{{"inner", List{Map{{"leaf", "text"}}}}};
+    Unstructured const inner = tree.ifMap()->at("inner");
+    Unstructured copied = tree;
+    copied = copied.ifMap()->at("inner");
+    EXPECT_EQ(copied, inner);
+    Unstructured moved = tree;
+    moved = std::move(const_cast<Unstructured&>(moved.ifMap()->at("inner")));
+    EXPECT_EQ(moved, inner);
+    tree = *&tree;
+    EXPECT_EQ(tree.ifMap()->at("inner"), inner);
+    Unstructured& same = tree;
+    tree = std::move(same);
+    EXPECT_EQ(tree.ifMap()->at("inner"), inner);
+}
+
+TEST(Unstructured, RemovesEmptyValuesOneLevelDeep) {
+    Unstructured const inner = Map{{"g", ""}};
+    Map const map{{"a", ""}, {"b", List{}}, {"c", Map{}}, {"d", Unstructured::Undefined()},
+                  {"e", 0},  {"f", inner}};
+    Map const before = map;
+    EXPECT_EQ(Unstructured::removeEmptyValues(map),
+              (Map{{"d", Unstructured::Undefined()}, {"e", 0}, {"f", inner}}));
+    EXPECT_EQ(map, before);
+    EXPECT_EQ(Unstructured::removeEmptyValues({}), Map{});
+    Map const kept{{"", 0.0}, {"array", List{""}}, {"text", " "}, {"u", 0u}};
+    EXPECT_EQ(Unstructured::removeEmptyValues(kept), kept);
+}
+
+TEST(Unstructured, ReadsAsAVector) {
+    struct Row {
+        char const* what;
+        Unstructured value;
+        FloatVec4 expected;
+    };
+    for (Row const& row : {
+             Row{"map", Map{{"X", 1.5}, {"Z", 3}}, {1.5, 0, 3, 0}},
+             Row{"whole map",
+                 Map{{"X", 1.0}, {"Y", 2.0}, {"Z", 3.0}, {"W", 4.0}, {"V", 5.0}},
+                 {1, 2, 3, 4}},
+             Row{"lower case", Map{{"x", 1.0}, {"y", 2.0}}, {}},
+             Row{"map of no numbers", Map{{"X", 5u}, {"Y", "6"}, {"Z", Map{}}, {"W", {}}}, {}},
+             Row{"array", List{2.0}, {2, 0, 0, 0}},
+             Row{"long array", List{1, 2, 3, 4, 5}, {1, 2, 3, 4}},
+             Row{"array of no numbers", List{5u, "6", List{1}, {}}, {}},
+             Row{"empty array", List{}, {}},
+             Row{"double", 0.5, {0.5, 0.5, 0.5, 0.5}},
+             Row{"integer", -3, {-3, -3, -3, -3}},
+             Row{"unsigned", 5u, {}},
+             Row{"string", "5", {}},
+             Row{"null", {}, {}},
+         }) {
+        SCOPED_TRACE(row.what);
+        FloatVec4 const e = row.expected;
+        EXPECT_EQ(FloatVec4(row.value), e);
+        EXPECT_EQ(FloatVec3(row.value), (FloatVec3{e.x, e.y, e.z}));
+        EXPECT_EQ(FloatVec2(row.value), (FloatVec2{e.x, e.y}));
+        tests::AllocationCounter counter;
+        FloatVec4 const v = row.value;
+        EXPECT_EQ(counter.count(), 0u);
+        EXPECT_EQ(v, e);
+    }
+}
+
+TEST(Unstructured, IsTheDataOfAValue) {
+    struct Row {
+        char const* what;
+        Value value;
+        Unstructured expected;
+    };
+    for (Row const& row : {
+             Row{"integer", -5, -5},
+             Row{"double", 2.5, 2.5},
+             Row{"vector of 2", FloatVec2{1, 2}, Map{{"X", 1.0}, {"Y", 2.0}}},
+             Row{"vector of 3", FloatVec3{1, 2, 3}, Map{{"X", 1.0}, {"Y", 2.0}, {"Z", 3.0}}},
+             Row{"vector of 4", FloatVec4{1, 2, 3, 4},
+                 Map{{"X", 1.0}, {"Y", 2.0}, {"Z", 3.0}, {"W", 4.0}}},
+             Row{"matrix", FloatMat4(), {}},
+             Row{"true", true, 1},
+             Row{"false", false, 0},
+             Row{"image", Value::Image(4), {}},
+             Row{"video", Value::Video(4), {}},
+             Row{"sound", Value::Sound(4), {}},
+             Row{"model", Value::Model(4), {}},
+             Row{"path", PathBuilder().circle({0, 0}, 1).build(), {}},
+             Row{"data", Unstructured(List{1, "b"}), List{1, "b"}},
+             Row{"string", std::string("a\0b", 3), std::string("a\0b", 3)},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.value.asUnstructured(), row.expected);
+        EXPECT_EQ(Unstructured(row.value), row.expected);
+    }
+    EXPECT_NE(Value(true).asUnstructured(), Unstructured(1.0));
+    EXPECT_EQ(FloatVec2(Value(FloatVec2{1, 2}).asUnstructured()), (FloatVec2{1, 2}));
+}
+
+TEST(Unstructured, OfAMovedFromValueIsNeutral) {
+    Value text = "text";
+    Value data = Unstructured(5);
+    Value const takenText = std::move(text);
+    Value const takenData = std::move(data);
+    EXPECT_EQ(text.asUnstructured(), Unstructured(""));  // NOLINT(bugprone-use-after-move)
+    EXPECT_EQ(data.asUnstructured(), Unstructured());    // NOLINT(bugprone-use-after-move)
+}
+
+TEST(Unstructured, InAValueIsACopyOfItsOwn) {
+    Unstructured tree = Map{{"a", 1}};
+    Value const value = tree;
+    tree = 5;
+    EXPECT_EQ(*value.ifUnstructured(), Unstructured(Map{{"a", 1}}));
+}
+
+TEST(Unstructured, SurvivesFailingAllocations) {
+    Unstructured const before = List{"kept", Map{{"a", 1}}};
+    Unstructured const source = Map{{"list", List{1, "a text that is longer than a short one"}},
+                                    {"map", Map{{"deep", Map{{"deeper", "x"}}}}}};
+    Unstructured target = before;
+    EXPECT_GT(
+        tests::failEachAllocation([&] { target = source; }, [&] { EXPECT_EQ(target, before); }),
+        8u);
+    EXPECT_EQ(target, source);
+    EXPECT_GT(tests::failEachAllocation(
+                  [&] { target = Unstructured(Unstructured::removeEmptyValues(*source.ifMap())); },
+                  [&] { EXPECT_EQ(target, source); }),
+              8u);
+    EXPECT_EQ(target, source);
+}
+
+namespace {
+
+// A second form of a tree: its kind and content spelt out in one text.
+struct Spelt {
+    Unstructured tree;
+    std::string text;
+};
+
+Spelt randomTree(tests::Random& random, int depth) {
+    switch (random.below(depth > 0 ? 7 : 5)) {
+        case 0: return {Unstructured(), "null"};
+        case 1: {
+            double const number = random.number();
+            return {number, "d" + std::to_string(number)};
+        }
+        case 2: {
+            auto const number = static_cast<long long>(random.below(5)) - 2;
+            return {number, "i" + std::to_string(number)};
+        }
+        case 3: {
+            auto const number = static_cast<unsigned long long>(random.below(3));
+            return {number, "u" + std::to_string(number)};
+        }
+        case 4: {
+            std::string const text = random.text(3);
+            return {text, "s" + std::to_string(text.size()) + text};
+        }
+        case 5: {
+            Spelt result{{}, "["};
+            List list;
+            for (std::size_t n = random.below(4); n > 0; --n) {
+                Spelt element = randomTree(random, depth - 1);
+                list.push_back(std::move(element.tree));
+                result.text += element.text + ",";
+            }
+            result.tree = std::move(list);
+            return result;
+        }
+        default: {
+            Map map;
+            std::map<std::string, std::string> texts;
+            for (std::size_t n = random.below(4); n > 0; --n) {
+                std::string const key = random.text(2);
+                Spelt entry = randomTree(random, depth - 1);
+                map[key] = std::move(entry.tree);
+                texts[key] = entry.text;
+            }
+            Spelt result{std::move(map), "{"};
+            for (auto const& [key, text] : texts) {
+                result.text += std::to_string(key.size()) + key + text + ",";
+            }
+            return result;
+        }
+    }
+}
+
+}  // namespace
+
+TEST(Unstructured, EqualsExactlyWhereRandomTreesSpellTheSame) {
+    tests::Random random(21);
+    std::size_t equal = 0;
+    for (int i = 0; i < 20000; ++i) {
+        Spelt const a = randomTree(random, 3);
+        Spelt const b = random.below(3) == 0 ? a : randomTree(random, 3);
+        ASSERT_EQ(a.tree == b.tree, a.text == b.text) << a.text << " and " << b.text;
+        ASSERT_EQ(a.tree != b.tree, a.text != b.text);
+        Unstructured const copy = a.tree;
+        ASSERT_EQ(copy, a.tree);
+        ASSERT_EQ(Value(copy).asUnstructured(), a.tree);
+        equal += a.tree == b.tree;
+    }
+    EXPECT_GT(equal, 5000u);
+}

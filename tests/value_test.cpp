@@ -1,0 +1,1092 @@
+#include <Engine/Base/value.h>
+
+#include <Engine/Base/path.h>
+#include <Engine/Base/unstructured.h>
+
+#include "support/allocations.h"
+#include "support/locales.h"
+#include "support/number_text.h"
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <climits>
+#include <cmath>
+#include <iomanip>
+#include <sstream>
+#include <thread>
+
+using namespace tarn::engine;
+
+namespace {
+
+constexpr std::array<Type, 14> kAllTypes{Type::Float, Type::Vec2,        Type::Vec3, Type::Vec4,
+                                         Type::Mat4,  Type::Boolean,     Type::Int,  Type::Image,
+                                         Type::Video, Type::Sound,       Type::Path, Type::String,
+                                         Type::Model, Type::Unstructured};
+
+Type outOfRange() { return Type(14); }
+
+FloatMat4 countingMatrix() {
+    FloatMat4 matrix;
+    for (int i = 0; i < 16; ++i) matrix.elements[i] = i + 0.5;
+    return matrix;
+}
+
+FloatMat4 identityMatrix() { return {{1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1}}; }
+
+bool sameBytes(FloatMat4 const& a, FloatMat4 const& b) {
+    return std::memcmp(&a, &b, sizeof a) == 0;
+}
+
+Path linePath() { return PathBuilder().moveTo({1, 2}).lineTo({3, 4}).build(); }
+
+Unstructured smallMap() {
+    return Unstructured::Map{{"X", 1.5}, {"Y", 2}, {"Z", "no"}, {"W", Unstructured(7u)}};
+}
+
+Value movedFrom(Value value) {
+    Value taken = std::move(value);
+    return value;  // NOLINT(bugprone-use-after-move): what is left is what is tested.
+}
+
+Value nullPath() { return Value(std::shared_ptr<Path const>()); }
+Value nullMatrix() { return movedFrom(countingMatrix()); }
+Value nullString() { return movedFrom("text"); }
+Value nullData() { return movedFrom(Unstructured(5)); }
+
+}  // namespace
+
+TEST(Type, HasItsNumberItsNameAndItsClasses) {
+    struct Row {
+        int number;
+        Type type;
+        char const* name;
+        bool resource;
+        bool copied;
+    };
+    for (Row const& row : {
+             Row{0, Type::Float, "float", false, true},
+             Row{1, Type::Vec2, "vec2", false, true},
+             Row{2, Type::Vec3, "vec3", false, true},
+             Row{3, Type::Vec4, "vec4", false, true},
+             Row{4, Type::Mat4, "mat4", false, true},
+             Row{5, Type::Boolean, "boolean", false, true},
+             Row{6, Type::Int, "int", false, true},
+             Row{7, Type::Image, "image", true, true},
+             Row{8, Type::Video, "video", true, true},
+             Row{9, Type::Sound, "sound", true, true},
+             Row{10, Type::Path, "path", false, false},
+             Row{11, Type::String, "string", false, true},
+             Row{12, Type::Model, "model", true, false},
+             Row{13, Type::Unstructured, "unstructured", false, false},
+         }) {
+        SCOPED_TRACE(row.name);
+        EXPECT_EQ(static_cast<int>(row.type), row.number);
+        EXPECT_EQ(typeToString(row.type), row.name);
+        ASSERT_TRUE(stringToType(row.name).hasValue());
+        EXPECT_EQ(stringToType(row.name).value(), row.type);
+        EXPECT_EQ(typeIsResource(row.type), row.resource);
+        EXPECT_EQ(typeShouldCopyAcrossDeletedConnections(row.type), row.copied);
+    }
+    static_assert(std::is_same_v<std::underlying_type_t<Type>, unsigned char>);
+}
+
+TEST(Type, IsNotFoundByAnyOtherName) {
+    for (char const* name : {"Float", " int", "int ", "", "float4", "vec", "UNSTRUCTURED"}) {
+        EXPECT_FALSE(stringToType(name).hasValue()) << name;
+    }
+    EXPECT_FALSE(stringToType(std::string("int\0", 4)).hasValue());
+}
+
+TEST(Type, OutOfRangeIsInNoClass) {
+    for (int byte = 14; byte < 256; ++byte) {
+        EXPECT_FALSE(typeIsResource(Type(byte))) << byte;
+        EXPECT_FALSE(typeShouldCopyAcrossDeletedConnections(Type(byte))) << byte;
+    }
+}
+
+TEST(TypeDeathTest, OutOfRangeHasNoName) {
+    EXPECT_DEATH(typeToString(outOfRange()),
+                 "^Assertion failed: \\(0\\), function typeToString, file Engine/Base/value, "
+                 "line [0-9]+\\.\n$");
+}
+
+TEST(TarnType, NamesTheTypeOfANativeOne) {
+    static_assert(TarnType<double>() == Type::Float);
+    static_assert(TarnType<FloatVec2>() == Type::Vec2);
+    static_assert(TarnType<FloatVec3>() == Type::Vec3);
+    static_assert(TarnType<FloatVec4>() == Type::Vec4);
+    static_assert(TarnType<FloatMat4>() == Type::Mat4);
+    static_assert(TarnType<bool>() == Type::Boolean);
+    static_assert(TarnType<long long>() == Type::Int);
+    static_assert(TarnType<unsigned long long>() == Type::Image);
+    static_assert(TarnType<Path>() == Type::Path);
+    static_assert(TarnType<std::string>() == Type::String);
+    static_assert(TarnType<Unstructured>() == Type::Unstructured);
+}
+
+TEST(Vectors, CompareAsFloatingPointNumbersDo) {
+    EXPECT_TRUE((FloatVec2{1, 0.0} == FloatVec2{1, -0.0}));
+    EXPECT_TRUE((FloatVec2{1, 2} != FloatVec2{1, 3}));
+    EXPECT_TRUE((FloatVec2{0, 2} != FloatVec2{1, 2}));
+    EXPECT_TRUE((FloatVec2{NAN, 0} != FloatVec2{NAN, 0}));
+    EXPECT_FALSE((FloatVec2{NAN, 0} == FloatVec2{NAN, 0}));
+    EXPECT_TRUE((FloatVec3{1, 2, 3} == FloatVec3{1, 2, 3}));
+    EXPECT_TRUE((FloatVec3{1, 2, 3} != FloatVec3{1, 2, 4}));
+    EXPECT_TRUE((FloatVec3{1, 0, 3} != FloatVec3{1, 2, 3}));
+    EXPECT_TRUE((FloatVec3{0, 2, 3} != FloatVec3{1, 2, 3}));
+    EXPECT_TRUE((FloatVec4{1, 2, 3, 4} == FloatVec4{1, 2, 3, 4}));
+    EXPECT_TRUE((FloatVec4{0, 2, 3, 4} != FloatVec4{1, 2, 3, 4}));
+    EXPECT_TRUE((FloatVec4{1, 0, 3, 4} != FloatVec4{1, 2, 3, 4}));
+    EXPECT_TRUE((FloatVec4{1, 2, 0, 4} != FloatVec4{1, 2, 3, 4}));
+    EXPECT_TRUE((FloatVec4{1, 2, 3, 0} != FloatVec4{1, 2, 3, 4}));
+    static_assert(sizeof(FloatVec2) == 16 && sizeof(FloatVec3) == 24 && sizeof(FloatVec4) == 32);
+    static_assert(std::is_aggregate_v<FloatVec2> && std::is_aggregate_v<FloatMat4>);
+}
+
+TEST(Value, IsMadeFromEverySourceAsItsAlternative) {
+    struct Row {
+        char const* what;
+        Value value;
+        Type type;
+        std::string text;
+    };
+    char buffer[] = "buffer";
+    for (Row const& row : {
+             Row{"nothing", Value(), Type::Float, "0"},
+             Row{"double", Value(3.0), Type::Float, "3"},
+             Row{"float", Value(0.5f), Type::Float, "0.5"},
+             Row{"long long", Value(3LL), Type::Int, "3"},
+             Row{"int", Value(5), Type::Int, "5"},
+             Row{"int64", Value(std::int64_t(-5)), Type::Int, "-5"},
+             Row{"short", Value(short(6)), Type::Int, "6"},
+             Row{"signed char", Value(static_cast<signed char>(-7)), Type::Int, "-7"},
+             Row{"bool", Value(true), Type::Boolean, "1"},
+             Row{"vector of 2", Value(FloatVec2{1, 2}), Type::Vec2, "1, 2"},
+             Row{"vector of 3", Value(FloatVec3{1, 2, 3}), Type::Vec3, "1, 2, 3"},
+             Row{"vector of 4", Value(FloatVec4{1, 2, 3, 4}), Type::Vec4, "1, 2, 3, 4"},
+             Row{"matrix", Value(FloatMat4()), Type::Mat4,
+                 "0 0 0 0 \n0 0 0 0 \n0 0 0 0 \n0 0 0 0 \n"},
+             Row{"literal", Value("text"), Type::String, "text"},
+             Row{"char array", Value(buffer), Type::String, "buffer"},
+             Row{"null text", Value(static_cast<char const*>(nullptr)), Type::String, ""},
+             Row{"string", Value(std::string("a\0b", 3)), Type::String, std::string("a\0b", 3)},
+             Row{"path", Value(linePath()), Type::Path, "Path"},
+             Row{"shared path", Value(Path::EmptyPath()), Type::Path, "Empty Path"},
+             Row{"null path", nullPath(), Type::Path, "Empty Path"},
+             Row{"data", Value(smallMap()), Type::Unstructured, "unstructured"},
+             Row{"image", Value(5, Type::Image), Type::Image, "5"},
+             Row{"video", Value(6, Type::Video), Type::Video, "6"},
+             Row{"sound", Value(7, Type::Sound), Type::Sound, "7"},
+             Row{"model", Value(ULLONG_MAX, Type::Model), Type::Model, "18446744073709551615"},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.value.type(), row.type);
+        EXPECT_EQ(to_string(row.value), row.text);
+    }
+    EXPECT_EQ(tests::bits(double(Value())), tests::bits(0.0));
+}
+
+TEST(Value, MakersAreTheConstructorOfTheirType) {
+    EXPECT_EQ(Value::Image(42), Value(42, Type::Image));
+    EXPECT_EQ(Value::Video(42), Value(42, Type::Video));
+    EXPECT_EQ(Value::Sound(42), Value(42, Type::Sound));
+    EXPECT_EQ(Value::Model(42), Value(42, Type::Model));
+}
+
+TEST(ValueDeathTest, AnIdentifierOfNoResourceIsRefused) {
+    for (Type type : {Type::Float, Type::Vec2, Type::Vec3, Type::Vec4, Type::Mat4, Type::Boolean,
+                      Type::Int, Type::Path, Type::String, Type::Unstructured, outOfRange()}) {
+        EXPECT_DEATH(Value(5, type),
+                     "^Assertion failed: \\(0\\), function Value, file Engine/Base/value, line "
+                     "161\\.\n$")
+            << int(type);
+    }
+}
+
+TEST(Value, DefaultsAreNeutral) {
+    struct Row {
+        Type type;
+        Value expected;
+    };
+    for (Row const& row : {
+             Row{Type::Float, 0.0},
+             Row{Type::Vec2, FloatVec2{0, 0}},
+             Row{Type::Vec3, FloatVec3{0, 0, 0}},
+             Row{Type::Vec4, FloatVec4{0, 0, 0, 0}},
+             Row{Type::Mat4, identityMatrix()},
+             Row{Type::Boolean, false},
+             Row{Type::Int, 0},
+             Row{Type::Image, Value::Image(0)},
+             Row{Type::Video, Value::Video(0)},
+             Row{Type::Sound, Value::Sound(0)},
+             Row{Type::Path, Path()},
+             Row{Type::String, ""},
+             Row{Type::Model, Value::Model(0)},
+             Row{Type::Unstructured, Unstructured::Undefined()},
+         }) {
+        SCOPED_TRACE(typeToString(row.type));
+        EXPECT_EQ(Value::defaultValue(row.type), row.expected);
+        EXPECT_EQ(Value::defaultValue(row.type).type(), row.type);
+        for (int qualifier = 0; qualifier < 256; ++qualifier) {
+            bool const opaque = row.type == Type::Vec4 && qualifier == 4;
+            EXPECT_EQ(Value::defaultValue(row.type, static_cast<unsigned char>(qualifier)),
+                      opaque ? Value(FloatVec4{0, 0, 0, 1}) : row.expected)
+                << qualifier;
+        }
+    }
+    // A new payload at each call.
+    EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), Value::defaultValue(Type::Path).ifPath());
+    EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), Path::EmptyPath().get());
+}
+
+TEST(ValueDeathTest, OutOfRangeHasNoDefault) {
+    EXPECT_DEATH(Value::defaultValue(outOfRange()),
+                 "^Assertion failed: \\(0\\), function defaultValue, file Engine/Base/value, line "
+                 "[0-9]+\\.\n$");
+}
+
+TEST(Value, CopiesShareTheirPayload) {
+    Value const text = "shared";
+    Value const path = linePath();
+    Value const data = smallMap();
+    Value const matrix = countingMatrix();
+    tests::AllocationCounter counter;
+    Value const textCopy = text;
+    Value const pathCopy = path;
+    Value const dataCopy = data;
+    Value matrixCopy;
+    matrixCopy = matrix;
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_EQ(textCopy.ifString(), text.ifString());
+    EXPECT_EQ(pathCopy.ifPath(), path.ifPath());
+    EXPECT_EQ(dataCopy.ifUnstructured(), data.ifUnstructured());
+    EXPECT_EQ(matrixCopy.asFloatMat4(), matrix.asFloatMat4());
+}
+
+TEST(Value, SharesAPathThatIsGivenByPointer) {
+    auto const path = std::make_shared<Path const>(linePath());
+    EXPECT_EQ(Value(path).ifPath(), path.get());
+    EXPECT_EQ(Value(Path::EmptyPath()).ifPath(), Path::EmptyPath().get());
+}
+
+TEST(Value, PayloadsLiveAsLongAsTheLastCopy) {
+    Value kept;
+    {
+        Value const first = std::string(100, 'x');
+        kept = first;
+    }
+    EXPECT_EQ(std::string(kept), std::string(100, 'x'));
+}
+
+// One row of all readings for each alternative, and for the alternatives that read differently
+// by what they hold.
+TEST(Value, ReadsAsEveryScalar) {
+    struct Row {
+        char const* what;
+        Value value;
+        long long integer;
+        double number;
+        bool truth;
+        unsigned long long id;
+    };
+    double const huge = 1e300;
+    double const two63 = 9223372036854775808.0;
+    for (Row const& row : {
+             Row{"integer", -3, -3, -3.0, true, 0},
+             Row{"integer zero", 0, 0, 0.0, false, 0},
+             Row{"largest integer", LLONG_MAX, LLONG_MAX, two63, true, 0},
+             Row{"integer as no identifier", 42, 42, 42.0, true, 0},
+             Row{"double", 2.9, 2, 2.9, true, 0},
+             Row{"negative double", -2.9, -2, -2.9, true, 0},
+             Row{"double between 0 and 1", 0.5, 0, 0.5, true, 0},
+             Row{"double zero", 0.0, 0, 0.0, false, 0},
+             Row{"negative zero", -0.0, 0, -0.0, false, 0},
+             Row{"too large", huge, LLONG_MAX, huge, true, 0},
+             Row{"2^63", two63, LLONG_MAX, two63, true, 0},
+             Row{"below 2^63", 9223372036854774784.0, 9223372036854774784, 9223372036854774784.0,
+                 true, 0},
+             Row{"too small", -huge, LLONG_MIN, -huge, true, 0},
+             Row{"-2^63", -two63, LLONG_MIN, -two63, true, 0},
+             Row{"infinite", INFINITY, LLONG_MAX, INFINITY, true, 0},
+             Row{"vector of 2", FloatVec2{2.5, 7}, 2, 2.5, true, 0},
+             Row{"vector of 2, y alone", FloatVec2{0, 7}, 0, 0.0, true, 0},
+             Row{"vector of 2, zeros", FloatVec2{0, -0.0}, 0, 0.0, false, 0},
+             Row{"vector of 2, NaN", FloatVec2{0, NAN}, 0, 0.0, true, 0},
+             Row{"vector of 3", FloatVec3{-2.5, 1, 1}, -2, -2.5, true, 0},
+             Row{"vector of 3, y alone", FloatVec3{0, 1, 0}, 0, 0.0, true, 0},
+             Row{"vector of 3, z alone", FloatVec3{0, 0, 1}, 0, 0.0, true, 0},
+             Row{"vector of 3, zeros", FloatVec3{}, 0, 0.0, false, 0},
+             Row{"vector of 4", FloatVec4{8.5, 1, 1, 1}, 8, 8.5, true, 0},
+             Row{"vector of 4, y alone", FloatVec4{0, 1, 0, 0}, 0, 0.0, true, 0},
+             Row{"vector of 4, z alone", FloatVec4{0, 0, 1, 0}, 0, 0.0, true, 0},
+             Row{"vector of 4, w alone", FloatVec4{0, 0, 0, 1}, 0, 0.0, true, 0},
+             Row{"vector of 4, zeros", FloatVec4{}, 0, 0.0, false, 0},
+             Row{"vector, x too large", FloatVec4{huge, 0, 0, 0}, LLONG_MAX, huge, true, 0},
+             Row{"matrix", countingMatrix(), 0, 0.0, false, 0},
+             Row{"null matrix", nullMatrix(), 0, 0.0, false, 0},
+             Row{"true", true, 1, 1.0, true, 0},
+             Row{"false", false, 0, 0.0, false, 0},
+             Row{"image", Value::Image(42), 1, 1.0, true, 42},
+             Row{"video", Value::Video(42), 1, 1.0, true, 42},
+             Row{"sound", Value::Sound(42), 1, 1.0, true, 42},
+             Row{"model", Value::Model(42), 1, 1.0, true, 42},
+             Row{"no image", Value::Image(0), 0, 0.0, false, 0},
+             Row{"no video", Value::Video(0), 0, 0.0, false, 0},
+             Row{"no sound", Value::Sound(0), 0, 0.0, false, 0},
+             Row{"no model", Value::Model(0), 0, 0.0, false, 0},
+             Row{"path", linePath(), 1, 1.0, true, 0},
+             Row{"empty path", Path(), 0, 0.0, false, 0},
+             Row{"null path", nullPath(), 0, 0.0, false, 0},
+             Row{"data: double", Unstructured(-7.9), -7, -7.9, true, 0},
+             Row{"data: double zero", Unstructured(0.0), 0, 0.0, false, 0},
+             Row{"data: positive double", Unstructured(7.9), 7, 7.9, true, 7},
+             Row{"data: integer", Unstructured(-7), -7, -7.0, true, ULLONG_MAX - 6},
+             Row{"data: unsigned", Unstructured(7u), 0, 0.0, true, 7},
+             Row{"data: null", Unstructured(), 0, 0.0, false, 0},
+             Row{"data: map", smallMap(), 0, 0.0, true, 0},
+             Row{"data: empty array", Unstructured(Unstructured::Array{}), 0, 0.0, true, 0},
+             Row{"data: string", Unstructured("12"), 0, 0.0, true, 0},
+             Row{"data: empty string", Unstructured(""), 0, 0.0, false, 0},
+             Row{"null data", nullData(), 0, 0.0, false, 0},
+             Row{"string", "3.9", 3, 3.9, true, 0},
+             Row{"string of zero", "0", 0, 0.0, true, 0},
+             Row{"empty string", "", 0, 0.0, false, 0},
+             Row{"null string", nullString(), 0, 0.0, false, 0},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(static_cast<long long>(row.value), row.integer);
+        EXPECT_EQ(tests::bits(double(row.value)), tests::bits(row.number));
+        EXPECT_EQ(bool(row.value), row.truth);
+        EXPECT_EQ(static_cast<unsigned long long>(row.value), row.id);
+        EXPECT_EQ(static_cast<std::int64_t>(row.value), row.integer);
+        EXPECT_EQ(static_cast<std::uint64_t>(row.value), row.id);
+    }
+    Value const nan = NAN;
+    EXPECT_EQ(static_cast<long long>(nan), 0);
+    EXPECT_TRUE(std::isnan(double(nan)));
+    EXPECT_TRUE(bool(nan));
+    EXPECT_TRUE(bool(Value(Unstructured(double(NAN)))));
+}
+
+TEST(Value, ReadsAStringAsTheNumberThatAllOfItIs) {
+    struct Row {
+        char const* what;
+        std::string text;
+        double number;
+        long long integer;
+    };
+    for (Row const& row : {
+             Row{"decimals", "3.9", 3.9, 3},
+             Row{"negative", "-3.9", -3.9, -3},
+             Row{"no number", "abc", 1.0, 1},
+             Row{"empty", "", 0.0, 0},
+             Row{"leading blank", " 12", 12.0, 12},
+             Row{"all leading space", "\t\n\v\f\r 12", 12.0, 12},
+             Row{"trailing blank", "12 ", 1.0, 1},
+             Row{"trailing letter", "12x", 1.0, 1},
+             Row{"exponent", "1e3", 1000.0, 1000},
+             Row{"cut exponent", "1e", 1.0, 1},
+             Row{"hexadecimal", "0x1p4", 16.0, 16},
+             Row{"plus", "+5", 5.0, 5},
+             Row{"sign alone", "-", 1.0, 1},
+             Row{"blank alone", " ", 1.0, 1},
+             Row{"point alone", ".", 1.0, 1},
+             Row{"leading point", ".5", 0.5, 0},
+             Row{"comma", "1,5", 1.0, 1},
+             Row{"too large", "1e999", INFINITY, LLONG_MAX},
+             Row{"infinite", "-inf", -INFINITY, LLONG_MIN},
+             Row{"zero", "0", 0.0, 0},
+             Row{"negative zero", "-0", -0.0, 0},
+             Row{"zero byte inside", std::string("12\0", 3), 1.0, 1},
+             Row{"zero byte first", std::string("\0", 1), 1.0, 1},
+             Row{"zero byte and more", std::string("12\0 34", 6), 1.0, 1},
+         }) {
+        SCOPED_TRACE(row.what);
+        Value const value = row.text;
+        EXPECT_EQ(tests::bits(double(value)), tests::bits(row.number));
+        EXPECT_EQ(static_cast<long long>(value), row.integer);
+        EXPECT_EQ(bool(value), !row.text.empty());
+    }
+    EXPECT_TRUE(std::isnan(double(Value("nan"))));
+    EXPECT_EQ(static_cast<long long>(Value("nan")), 0);
+}
+
+TEST(Value, ReadsAnyNumberBackFromItsDigits) {
+    tests::Random random(161);
+    for (int i = 0; i < 100000; ++i) {
+        double const number = random.anyDouble();
+        if (!std::isfinite(number)) continue;
+        char digits[64];
+        std::snprintf(digits, sizeof digits, random.chance() ? "%.17g" : "%a", number);
+        std::string const space = std::array<char const*, 3>{"", " ", "\n\t"}[random.below(3)];
+        std::string const rest =
+            std::array<std::string, 5>{"", "", " ", "q", std::string(1, '\0')}[random.below(5)];
+        double const expected = rest.empty() ? number : 1.0;
+        EXPECT_EQ(tests::bits(double(Value(space + digits + rest))), tests::bits(expected))
+            << space << digits << rest;
+    }
+}
+
+TEST(Value, ReadsStringsWithTheDecimalPointOfTheCLibrary) {
+    tests::CLocaleWithComma comma;
+    ASSERT_TRUE(comma.isSet());
+    EXPECT_EQ(double(Value("1,5")), 1.5);
+    EXPECT_EQ(double(Value("1.5")), 1.0);
+}
+
+TEST(Value, ReadsAsEveryVector) {
+    struct Row {
+        char const* what;
+        Value value;
+        FloatVec2 v2;
+        FloatVec3 v3;
+        FloatVec4 v4;
+    };
+    FloatVec2 const zero2;
+    FloatVec3 const zero3;
+    FloatVec4 const zero4;
+    for (Row const& row : {
+             Row{"integer", -3, {-3, -3}, {-3, -3, -3}, {-3, -3, -3, -3}},
+             Row{"double", 0.5, {0.5, 0.5}, {0.5, 0.5, 0.5}, {0.5, 0.5, 0.5, 0.5}},
+             Row{"vector of 2", FloatVec2{1, 2}, {1, 2}, {1, 2, 0}, {1, 2, 0, 0}},
+             Row{"vector of 3", FloatVec3{1, 2, 3}, {1, 2}, {1, 2, 3}, {1, 2, 3, 0}},
+             Row{"vector of 4", FloatVec4{1, 2, 3, 4}, {1, 2}, {1, 2, 3}, {1, 2, 3, 4}},
+             Row{"true", true, {1, 1}, {1, 1, 1}, {1, 1, 1, 1}},
+             Row{"false", false, zero2, zero3, zero4},
+             Row{"data", smallMap(), {1.5, 2}, {1.5, 2, 0}, {1.5, 2, 0, 0}},
+             Row{"null data", nullData(), zero2, zero3, zero4},
+             Row{"matrix", countingMatrix(), zero2, zero3, zero4},
+             Row{"null matrix", nullMatrix(), zero2, zero3, zero4},
+             Row{"image", Value::Image(42), zero2, zero3, zero4},
+             Row{"video", Value::Video(42), zero2, zero3, zero4},
+             Row{"sound", Value::Sound(42), zero2, zero3, zero4},
+             Row{"model", Value::Model(42), zero2, zero3, zero4},
+             Row{"path", linePath(), zero2, zero3, zero4},
+             Row{"string", "1.5", zero2, zero3, zero4},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(FloatVec2(row.value), row.v2);
+        EXPECT_EQ(FloatVec3(row.value), row.v3);
+        EXPECT_EQ(FloatVec4(row.value), row.v4);
+    }
+    EXPECT_EQ(tests::bits(FloatVec2(Value(-0.0)).y), tests::bits(-0.0));
+}
+
+TEST(Value, ReadsAsAMatrix) {
+    EXPECT_TRUE(sameBytes(FloatMat4(Value(countingMatrix())), countingMatrix()));
+    EXPECT_TRUE(sameBytes(FloatMat4(nullMatrix()), identityMatrix()));
+    for (Value const& value : {Value(1.0), Value("m"), Value(smallMap()), Value(linePath())}) {
+        EXPECT_TRUE(sameBytes(FloatMat4(value), identityMatrix()));
+    }
+}
+
+TEST(Value, ReadsAsAPath) {
+    EXPECT_EQ(Path(Value(linePath())), linePath());
+    EXPECT_EQ(Path(nullPath()), Path());
+    for (Value const& value : {Value(1.0), Value("p"), Value(smallMap()), Value::Image(4)}) {
+        EXPECT_EQ(Path(value), Path());
+    }
+}
+
+TEST(Value, ReadsAsAStringLikeItsTextButForData) {
+    struct Row {
+        char const* what;
+        Value value;
+        char const* reading;
+        char const* text;
+    };
+    for (Row const& row : {
+             Row{"integer", -12, "-12", "-12"},
+             Row{"smallest integer", LLONG_MIN, "-9223372036854775808", "-9223372036854775808"},
+             Row{"double", 2.5, "2.5", "2.5"},
+             Row{"vector of 2", FloatVec2{1, 2.5}, "1, 2.5", "1, 2.5"},
+             Row{"vector of 3", FloatVec3{1, 2.5, -0.001}, "1, 2.5, 0", "1, 2.5, 0"},
+             Row{"vector of 4", FloatVec4{1000, 999.999, -0.5, 1e6}, "1000, 1000, -0.5, 1000000",
+                 "1000, 1000, -0.5, 1000000"},
+             Row{"identity", identityMatrix(), "1 0 0 0 \n0 1 0 0 \n0 0 1 0 \n0 0 0 1 \n",
+                 "1 0 0 0 \n0 1 0 0 \n0 0 1 0 \n0 0 0 1 \n"},
+             Row{"matrix", countingMatrix(),
+                 "0.5 1.5 2.5 3.5 \n4.5 5.5 6.5 7.5 \n8.5 9.5 10.5 11.5 \n12.5 13.5 14.5 15.5 \n",
+                 "0.5 1.5 2.5 3.5 \n4.5 5.5 6.5 7.5 \n8.5 9.5 10.5 11.5 \n12.5 13.5 14.5 15.5 \n"},
+             Row{"null matrix", nullMatrix(), "", ""},
+             Row{"true", true, "1", "1"},
+             Row{"false", false, "0", "0"},
+             Row{"image", Value::Image(42), "42", "42"},
+             Row{"video", Value::Video(0), "0", "0"},
+             Row{"sound", Value::Sound(9), "9", "9"},
+             Row{"model", Value::Model(10), "10", "10"},
+             Row{"path", linePath(), "Path", "Path"},
+             Row{"empty path", Path(), "Empty Path", "Empty Path"},
+             Row{"null path", nullPath(), "Empty Path", "Empty Path"},
+             Row{"string", "text", "text", "text"},
+             Row{"null string", nullString(), "", ""},
+             Row{"data: string", Unstructured("abc"), "abc", "abc"},
+             Row{"data: empty string", Unstructured(""), "", ""},
+             Row{"data: integer", Unstructured(5), "??", "unstructured"},
+             Row{"data: double", Unstructured(5.0), "??", "unstructured"},
+             Row{"data: unsigned", Unstructured(5u), "??", "unstructured"},
+             Row{"data: map", smallMap(), "??", "unstructured"},
+             Row{"data: array", Unstructured(Unstructured::Array{}), "??", "unstructured"},
+             Row{"data: null", Unstructured(), "??", "unstructured"},
+             Row{"null data", nullData(), "??", "unstructured"},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(std::string(row.value), row.reading);
+        EXPECT_EQ(to_string(row.value), row.text);
+        std::ostringstream stream;
+        stream << "<" << row.value << ">";
+        EXPECT_EQ(stream.str(), "<" + std::string(row.text) + ">");
+    }
+}
+
+TEST(Value, GivesItsPayloadInPlace) {
+    Value const matrix = countingMatrix();
+    Value const path = linePath();
+    Value const data = smallMap();
+    Value const text = "text";
+    EXPECT_TRUE(sameBytes(*matrix.asFloatMat4(), countingMatrix()));
+    EXPECT_EQ(*path.ifPath(), linePath());
+    EXPECT_EQ(*data.ifUnstructured(), smallMap());
+    EXPECT_EQ(*text.ifString(), "text");
+    for (Value const& value :
+         {matrix, path, data, text, Value(1.0), Value(1), Value(true), Value::Image(1),
+          nullMatrix(), nullPath(), nullData(), nullString()}) {
+        SCOPED_TRACE(to_string(value));
+        EXPECT_EQ(value.asFloatMat4() != nullptr, value == matrix);
+        EXPECT_EQ(value.ifPath() != nullptr, value == path);
+        EXPECT_EQ(value.ifUnstructured() != nullptr, value == data);
+        EXPECT_EQ(value.ifString() != nullptr, value == text);
+    }
+}
+
+TEST(Value, ReadingsOfScalarsAndVectorsAllocateNothing) {
+    std::vector<Value> const values{1,
+                                    2.5,
+                                    FloatVec2{1, 2},
+                                    FloatVec3{1, 2, 3},
+                                    true,
+                                    "12.5",
+                                    linePath(),
+                                    FloatVec4{1, 2, 3, 4},
+                                    smallMap(),
+                                    countingMatrix(),
+                                    Value::Image(5)};
+    double sum = 0.0;
+    tests::AllocationCounter counter;
+    for (Value const& value : values) {
+        sum += double(value) + double(static_cast<long long>(value)) + (bool(value) ? 1 : 0) +
+               double(static_cast<unsigned long long>(value)) + FloatVec2(value).x +
+               FloatVec3(value).y + FloatVec4(value).z + FloatMat4(value).elements[0];
+        sum += value.ifPath() || value.ifString() || value.ifUnstructured() || value.asFloatMat4();
+        sum += static_cast<double>(value.type());
+    }
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_GT(sum, 0.0);
+}
+
+TEST(Value, BecomesAnyType) {
+    std::vector<Value> const values{7,
+                                    2.5,
+                                    FloatVec2{1, 2},
+                                    FloatVec3{1, 2, 3},
+                                    FloatVec4{1, 2, 3, 4},
+                                    countingMatrix(),
+                                    true,
+                                    Value::Image(11),
+                                    Value::Video(12),
+                                    Value::Sound(13),
+                                    Value::Model(14),
+                                    linePath(),
+                                    smallMap(),
+                                    Unstructured("s"),
+                                    "15",
+                                    nullPath(),
+                                    nullData(),
+                                    nullString(),
+                                    nullMatrix()};
+    for (Value const& value : values) {
+        SCOPED_TRACE(to_string(value));
+        struct Row {
+            Type type;
+            Value expected;
+        };
+        unsigned long long const id = value;
+        for (Row const& row : {
+                 Row{Type::Float, double(value)},
+                 Row{Type::Vec2, FloatVec2(value)},
+                 Row{Type::Vec3, FloatVec3(value)},
+                 Row{Type::Vec4, FloatVec4(value)},
+                 Row{Type::Mat4, FloatMat4(value)},
+                 Row{Type::Boolean, bool(value)},
+                 Row{Type::Int, static_cast<long long>(value)},
+                 Row{Type::Image, Value::Image(id)},
+                 Row{Type::Video, Value::Video(id)},
+                 Row{Type::Sound, Value::Sound(id)},
+                 Row{Type::Model, Value::Model(id)},
+                 Row{Type::Path, Path(value)},
+                 Row{Type::String, std::string(value)},
+                 Row{Type::Unstructured, Value(value.asUnstructured())},
+             }) {
+            EXPECT_EQ(value.asType(row.type), row.expected) << typeToString(row.type);
+            EXPECT_EQ(value.asType(row.type).type(), row.type);
+        }
+    }
+    EXPECT_EQ(std::string(Value(smallMap()).asType(Type::String)), "??");
+}
+
+TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
+    Value const matrix = countingMatrix();
+    Value const path = linePath();
+    Value const data = smallMap();
+    Value const text = "text";
+    EXPECT_NE(matrix.asType(Type::Mat4).asFloatMat4(), matrix.asFloatMat4());
+    EXPECT_NE(path.asType(Type::Path).ifPath(), path.ifPath());
+    EXPECT_NE(data.asType(Type::Unstructured).ifUnstructured(), data.ifUnstructured());
+    EXPECT_NE(text.asType(Type::String).ifString(), text.ifString());
+}
+
+TEST(ValueDeathTest, BecomesNothingOutOfRange) {
+    EXPECT_DEATH(Value().asType(outOfRange()),
+                 "^Assertion failed: \\(0\\), function asType, file Engine/Base/value, line "
+                 "[0-9]+\\.\n$");
+}
+
+TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
+    FloatMat4 zeroMatrix;
+    FloatMat4 negativeZeroMatrix;
+    negativeZeroMatrix.elements[7] = -0.0;
+    FloatMat4 nanMatrix;
+    nanMatrix.elements[15] = NAN;
+    auto const nanPath = std::make_shared<Path const>(PathBuilder().moveTo({NAN, 0}).build());
+    Value const sharedNanData = Unstructured(double(NAN));
+    struct Row {
+        char const* what;
+        Value a;
+        Value b;
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"integers", 1, 1, true},
+             Row{"other integers", 1, 2, false},
+             Row{"integer and double", 1, 1.0, false},
+             Row{"integer and bool", 1, true, false},
+             Row{"doubles", 1.5, 1.5, true},
+             Row{"other doubles", 1.5, 1.25, false},
+             Row{"zeros", 0.0, -0.0, true},
+             Row{"NaN", NAN, NAN, false},
+             Row{"vectors", FloatVec2{1, 0.0}, FloatVec2{1, -0.0}, true},
+             Row{"vectors, NaN", FloatVec2{1, NAN}, FloatVec2{1, NAN}, false},
+             Row{"vectors of 3", FloatVec3{1, 2, 3}, FloatVec3{1, 2, 4}, false},
+             Row{"vectors of 4", FloatVec4{1, 2, 3, 4}, FloatVec4{1, 2, 3, 4}, true},
+             Row{"vectors of two lengths", FloatVec2{1, 0}, FloatVec3{1, 0, 0}, false},
+             Row{"matrices", countingMatrix(), countingMatrix(), true},
+             Row{"matrices, zeros", zeroMatrix, negativeZeroMatrix, false},
+             Row{"matrices, NaN", nanMatrix, nanMatrix, true},
+             Row{"null matrix", nullMatrix(), zeroMatrix, false},
+             Row{"null matrices", nullMatrix(), nullMatrix(), true},
+             Row{"bools", true, true, true},
+             Row{"other bools", true, false, false},
+             Row{"images", Value::Image(4), Value::Image(4), true},
+             Row{"other images", Value::Image(4), Value::Image(5), false},
+             Row{"image and video", Value::Image(4), Value::Video(4), false},
+             Row{"videos", Value::Video(4), Value::Video(4), true},
+             Row{"sounds", Value::Sound(4), Value::Sound(5), false},
+             Row{"models", Value::Model(4), Value::Model(4), true},
+             Row{"paths", linePath(), linePath(), true},
+             Row{"other paths", linePath(), Path(), false},
+             Row{"path with NaN", *nanPath, *nanPath, false},
+             Row{"shared path with NaN", nanPath, nanPath, true},
+             Row{"null path and empty path", nullPath(), Path(), false},
+             Row{"null paths", nullPath(), nullPath(), true},
+             Row{"data", smallMap(), smallMap(), true},
+             Row{"other data", smallMap(), Unstructured(), false},
+             Row{"data with NaN", Unstructured(double(NAN)), Unstructured(double(NAN)), false},
+             Row{"shared data with NaN", sharedNanData, sharedNanData, true},
+             Row{"null data", nullData(), Unstructured(), false},
+             Row{"both null data", nullData(), nullData(), true},
+             Row{"strings", "text", "text", true},
+             Row{"other strings", "text", "texT", false},
+             Row{"longer string", "text", "text2", false},
+             Row{"string and data", "text", Unstructured("text"), false},
+             Row{"null string and empty string", nullString(), "", false},
+             Row{"null strings", nullString(), nullString(), true},
+             Row{"nulls of two alternatives", nullString(), nullPath(), false},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.a == row.b, row.equal);
+        EXPECT_EQ(row.b == row.a, row.equal);
+        EXPECT_EQ(row.a != row.b, !row.equal);
+    }
+}
+
+TEST(Value, MovedFromCanBeUsedAgain) {
+    Value value = "text";
+    Value const taken = std::move(value);
+    EXPECT_EQ(std::string(taken), "text");
+    value = 5.0;  // NOLINT(bugprone-use-after-move)
+    EXPECT_EQ(value, Value(5.0));
+    value = *&value;
+    EXPECT_EQ(value, Value(5.0));
+}
+
+TEST(NumberText, IsShortenedForReading) {
+    struct Row {
+        double number;
+        char const* text;
+    };
+    for (Row const& row : {
+             Row{3.0, "3"},
+             Row{2.5, "2.5"},
+             Row{0.5, "0.5"},
+             Row{1234.56, "1234.6"},
+             Row{999.999, "1000"},
+             Row{100.0, "100"},
+             Row{-0.001, "0"},
+             Row{1000.0, "1000"},
+             Row{999.994, "999.99"},
+             Row{-1234.56, "-1234.6"},
+             Row{-0.0, "0"},
+             Row{-0.004, "0"},
+             Row{-0.006, "-0.01"},
+             Row{0.0, "0"},
+             Row{0.125, "0.12"},
+             Row{0.375, "0.38"},
+             Row{0.005, "0.01"},
+             Row{0.015, "0.01"},
+             Row{999.995, "1000"},
+             Row{1000.05, "1000"},
+             Row{1000.25, "1000.2"},
+             Row{-999.999, "-1000"},
+             Row{20.0, "20"},
+             Row{-1000.0, "-1000"},
+             Row{1e15, "1000000000000000"},
+             Row{5e-324, "0"},
+             Row{-5e-324, "0"},
+             Row{0.1, "0.1"},
+             Row{10.10, "10.1"},
+             Row{100.05, "100.05"},
+         }) {
+        EXPECT_EQ(to_string(Value(row.number)), row.text) << row.number;
+    }
+}
+
+TEST(NumberText, IsCutAfter127Characters) {
+    struct Row {
+        char const* what;
+        double number;
+        std::size_t length;
+    };
+    for (Row const& row : {
+             Row{"125 digits, the point and its zero", 1e125, 125},
+             Row{"126 digits and the point", 1e126, 126},
+             Row{"127 digits", std::ldexp(1.0, 421), 127},
+             Row{"the sign and 125 digits and the point", -1e125, 126},
+             Row{"the sign and 126 digits", -std::ldexp(1.0, 418), 127},
+             Row{"128 digits", 2e127, 127},
+             Row{"301 digits", 1e300, 127},
+             Row{"the largest", -1.7976931348623157e308, 127},
+         }) {
+        SCOPED_TRACE(row.what);
+        std::string const text = to_string(Value(row.number));
+        EXPECT_EQ(text.size(), row.length);
+        EXPECT_EQ(text.find('.'), std::string::npos);
+        EXPECT_EQ(text, tests::modelNumberText(row.number, '.', '.'));
+    }
+}
+
+TEST(NumberText, OfWhatIsNoNumberIsThePlatforms) {
+    for (double number : {double(INFINITY), -double(INFINITY)}) {
+        char text[128];
+        std::snprintf(text, sizeof text, "%.1f", number);
+        EXPECT_EQ(to_string(Value(number)), text);
+    }
+    char text[128];
+    std::snprintf(text, sizeof text, "%.2f", double(NAN));
+    EXPECT_EQ(to_string(Value(double(NAN))), text);
+}
+
+TEST(NumberText, AgreesWithDecimalDigitsWorkedOutByHand) {
+    tests::Random random(128);
+    for (int i = 0; i < 60000; ++i) {
+        double const number = random.anyDouble();
+        ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, '.', '.'))
+            << std::hexfloat << number;
+    }
+}
+
+TEST(NumberText, TakesTheDecimalPointFromCoutAtEachCall) {
+    EXPECT_EQ(to_string(Value(2.5)), "2.5");
+    {
+        tests::CoutDecimalPoint comma(',');
+        EXPECT_EQ(to_string(Value(2.5)), "2.50");
+        EXPECT_EQ(to_string(Value(3.0)), "3.00");
+        EXPECT_EQ(to_string(Value(-0.0)), "-0.00");
+        EXPECT_EQ(to_string(FloatVec2{1, 2}), "1.00, 2.00");
+        tests::CLocaleWithComma cComma;
+        ASSERT_TRUE(cComma.isSet());
+        EXPECT_EQ(to_string(Value(2.5)), "2,5");
+        EXPECT_EQ(to_string(Value(-0.0)), "0");
+        EXPECT_EQ(to_string(Value(1234.0)), "1234");
+    }
+    {
+        tests::CLocaleWithComma cComma;
+        ASSERT_TRUE(cComma.isSet());
+        EXPECT_EQ(to_string(Value(2.5)), "2,50");
+    }
+    EXPECT_EQ(to_string(Value(2.5)), "2.5");
+}
+
+TEST(NumberText, AgreesWithTheModelUnderEveryPairOfDecimalPoints) {
+    tests::Random random(44);
+    for (char cout : {'.', ',', '\'', 'n'}) {
+        tests::CoutDecimalPoint point(cout);
+        for (int i = 0; i < 5000; ++i) {
+            double const number = random.anyDouble();
+            ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, '.', cout))
+                << std::hexfloat << number << " with " << cout;
+        }
+    }
+    tests::CLocaleWithComma comma;
+    ASSERT_TRUE(comma.isSet());
+    for (char cout : {'.', ','}) {
+        tests::CoutDecimalPoint point(cout);
+        for (int i = 0; i < 5000; ++i) {
+            double const number = random.anyDouble();
+            ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, ',', cout))
+                << std::hexfloat << number << " with " << cout;
+        }
+    }
+}
+
+TEST(NumberText, FollowsNoStreamFlags) {
+    std::ostringstream stream;
+    stream << std::setprecision(10) << std::scientific << Value(2.5) << std::hex << Value(255);
+    EXPECT_EQ(stream.str(), "2.5255");
+}
+
+TEST(TypeInfo, IsAFloatPortWithoutBoundsUnlessGiven) {
+    TypeInfo const info;
+    EXPECT_EQ(info.type, Type::Float);
+    EXPECT_EQ(info.subtype, 0);
+    EXPECT_FALSE(info.min.hasValue() || info.max.hasValue() || info.extra.hasValue());
+    static_assert(std::is_aggregate_v<TypeInfo>);
+    static_assert(std::is_same_v<decltype(info.subtype), unsigned char>);
+    TypeInfo const all{Type::Int, 1, Value(1), std::nullopt, Value("x")};
+    EXPECT_EQ(*reinterpret_cast<unsigned char const*>(&all), 6);
+    EXPECT_EQ(all.min.value(), Value(1));
+    EXPECT_EQ(all.extra.value(), Value("x"));
+}
+
+TEST(TypeInfo, EqualsFieldByField) {
+    TypeInfo const base{Type::Float, 0, Value(0.0), Value(1.0), Value("e")};
+    struct Row {
+        char const* what;
+        TypeInfo other;
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"same", {Type::Float, 0, Value(0.0), Value(1.0), Value("e")}, true},
+             Row{"type", {Type::Int, 0, Value(0.0), Value(1.0), Value("e")}, false},
+             Row{"subtype", {Type::Float, 1, Value(0.0), Value(1.0), Value("e")}, false},
+             Row{"min", {Type::Float, 0, Value(0.5), Value(1.0), Value("e")}, false},
+             Row{"min of another type", {Type::Float, 0, Value(0), Value(1.0), Value("e")}, false},
+             Row{"no min", {Type::Float, 0, {}, Value(1.0), Value("e")}, false},
+             Row{"max", {Type::Float, 0, Value(0.0), Value(2.0), Value("e")}, false},
+             Row{"no max", {Type::Float, 0, Value(0.0), {}, Value("e")}, false},
+             Row{"extra", {Type::Float, 0, Value(0.0), Value(1.0), Value("f")}, false},
+             Row{"no extra", {Type::Float, 0, Value(0.0), Value(1.0), {}}, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(base == row.other, row.equal);
+        EXPECT_EQ(row.other == base, row.equal);
+        EXPECT_EQ(base != row.other, !row.equal);
+    }
+    EXPECT_EQ(TypeInfo(), TypeInfo());
+    TypeInfo nan;
+    nan.min = Value(double(NAN));
+    EXPECT_NE(nan, TypeInfo(nan));
+}
+
+TEST(TypeInfo, WritesItsTypeAlone) {
+    for (Type type : kAllTypes) {
+        std::ostringstream stream;
+        stream << TypeInfo{type, 1, Value(0.0), Value(1.0), Value(2)};
+        EXPECT_EQ(stream.str(), "[type: " + typeToString(type) + "]");
+    }
+}
+
+TEST(TypeInfo, NamesItsPort) {
+    struct Row {
+        Type type;
+        int subtype;
+        char const* plural;
+        char const* singular;
+    };
+    for (Row const& row : {
+             Row{Type::Float, 0, "Numbers", "Number"},
+             Row{Type::Float, 1, "Numbers", "Number"},
+             Row{Type::Int, 0, "Numbers", "Number"},
+             Row{Type::Vec2, 0, "Positions", "Position"},
+             Row{Type::Vec3, 0, "3D Points", "Point 3D"},
+             Row{Type::Vec4, 0, "Colors", "Color"},
+             Row{Type::Mat4, 0, "Matrices", "Matrix"},
+             Row{Type::Boolean, 1, "Pulses", "Pulse"},
+             Row{Type::Boolean, 0, "Booleans", "Boolean"},
+             Row{Type::Boolean, 2, "Booleans", "Boolean"},
+             Row{Type::Boolean, 255, "Booleans", "Boolean"},
+             Row{Type::Image, 1, "Images", "Image"},
+             Row{Type::Video, 0, "Videos", "Video"},
+             Row{Type::Sound, 0, "Sounds", "Sound"},
+             Row{Type::Path, 0, "Paths", "Path"},
+             Row{Type::String, 0, "Strings", "String"},
+             Row{Type::Model, 0, "Models", "Model"},
+             Row{Type::Unstructured, 1, "Layers", "Layer"},
+             Row{Type::Unstructured, 0, "Unstructured", "Unstructured"},
+             Row{Type::Unstructured, 2, "Unstructured", "Unstructured"},
+         }) {
+        TypeInfo info;
+        info.type = row.type;
+        info.subtype = static_cast<unsigned char>(row.subtype);
+        EXPECT_EQ(portNameForTypeInfo(info, true), row.plural);
+        EXPECT_EQ(portNameForTypeInfo(info, false), row.singular);
+    }
+}
+
+TEST(TypeInfoDeathTest, OutOfRangeNamesNoPort) {
+    TypeInfo info;
+    info.type = outOfRange();
+    EXPECT_DEATH(
+        portNameForTypeInfo(info, false),
+        "^Assertion failed: \\(0\\), function portNameForTypeInfo, file Engine/Base/value, "
+        "line [0-9]+\\.\n$");
+}
+
+TEST(CastValueToType, ClampsFloatPortsAndKeepsTheAlternative) {
+    Optional<Value> const none;
+    struct Row {
+        char const* what;
+        Value value;
+        Optional<Value> min;
+        Optional<Value> max;
+        char from;
+    };
+    for (Row const& row : {
+             Row{"no bounds", -3.0, none, none, 'v'},
+             Row{"below", -3.0, Value(0.0), none, '<'},
+             Row{"above", 3.0, none, Value(1.0), '>'},
+             Row{"inside", 0.5, Value(0.0), Value(1.0), 'v'},
+             Row{"at min", 0.0, Value(0.0), Value(1.0), 'v'},
+             Row{"at max", 1.0, Value(0.0), Value(1.0), 'v'},
+             Row{"negative zero at min", -0.0, Value(0.0), none, 'v'},
+             Row{"crossed bounds, below both", 0.0, Value(5.0), Value(2.0), '<'},
+             Row{"crossed bounds, between", 3.0, Value(5.0), Value(2.0), '<'},
+             Row{"crossed bounds, at min", 5.0, Value(5.0), Value(2.0), '>'},
+             Row{"crossed bounds, above both", 6.0, Value(5.0), Value(2.0), '>'},
+             Row{"NaN", NAN, Value(0.0), Value(1.0), 'v'},
+             Row{"NaN bounds", 5.0, Value(double(NAN)), Value(double(NAN)), 'v'},
+             Row{"string above", "7", none, Value(5.0), '>'},
+             Row{"string inside", "3", none, Value(5.0), 'v'},
+             Row{"integer bound", 9.5, none, Value(5), '>'},
+             Row{"string bound", 9.5, none, Value("5"), '>'},
+             Row{"vector by its x", FloatVec2{-1, 9}, Value(0.0), none, '<'},
+             Row{"true by its number", true, none, Value(0.5), '>'},
+         }) {
+        SCOPED_TRACE(row.what);
+        TypeInfo const info{Type::Float, 0, row.min, row.max, {}};
+        Value const* const expected = row.from == '<'   ? &info.min.value()
+                                      : row.from == '>' ? &info.max.value()
+                                                        : &row.value;
+        EXPECT_EQ(&castValueToType(row.value, info), expected);
+        Value argument = row.value;
+        Value const copy = castValueToType(std::move(argument), info);
+        EXPECT_EQ(copy.type(), expected->type());
+        EXPECT_EQ(to_string(copy), to_string(*expected));
+        // Copied, not moved from.
+        EXPECT_EQ(to_string(argument), to_string(row.value));  // NOLINT(bugprone-use-after-move)
+    }
+}
+
+TEST(CastValueToType, CopiesNothingAndLeavesOtherPortsAlone) {
+    Value const value = -3.0;
+    Value const text = "-3";
+    for (Type type : kAllTypes) {
+        TypeInfo const info{type, 0, Value(0.0), Value(1.0), {}};
+        EXPECT_EQ(&castValueToType(value, info), type == Type::Float ? &info.min.value() : &value);
+    }
+    Value argument = text;
+    EXPECT_EQ(castValueToType(std::move(argument), TypeInfo()).ifString(), text.ifString());
+    EXPECT_EQ(argument.ifString(), text.ifString());  // NOLINT(bugprone-use-after-move)
+}
+
+TEST(IndexLoopCasting, WrapsAroundAndClamps) {
+    Loop const loop{10.0, "20", 30};
+    TypeInfo const plain{Type::String, 0, {}, {}, {}};
+    TypeInfo const bounded{Type::Float, 0, Value(15.0), Value(25.0), {}};
+    EXPECT_EQ(&indexLoopCasting(loop, plain, 0), &loop[0]);
+    EXPECT_EQ(&indexLoopCasting(loop, plain, 7), &loop[1]);
+    EXPECT_EQ(&indexLoopCasting(loop, plain, ULLONG_MAX), &loop[ULLONG_MAX % 3]);
+    EXPECT_EQ(&indexLoopCasting(loop, bounded, 3), &bounded.min.value());
+    EXPECT_EQ(&indexLoopCasting(loop, bounded, 4), &loop[1]);
+    EXPECT_EQ(&indexLoopCasting(loop, bounded, 5), &bounded.max.value());
+}
+
+TEST(IndexLoopCasting, ReadsAnEmptyLoopAsZero) {
+    TypeInfo const plain;
+    TypeInfo const bounded{Type::Float, 0, Value(1.0), {}, {}};
+    Value const& zero = indexLoopCasting(nullLoop(), plain, 5);
+    EXPECT_EQ(zero, Value(0.0));
+    EXPECT_EQ(&zero, &indexLoopCasting(Loop(), plain, 9));
+    EXPECT_EQ(&indexLoopCasting(nullLoop(), bounded, 5), &bounded.min.value());
+}
+
+TEST(NullLoop, IsOneEmptyLoop) {
+    EXPECT_TRUE(nullLoop().empty());
+    EXPECT_EQ(&nullLoop(), &nullLoop());
+}
+
+// The clamp, written down a second time from its meaning: the lower bound first.
+TEST(CastValueToType, AgreesWithAModelOnRandomNumbers) {
+    tests::Random random(15);
+    for (int i = 0; i < 100000; ++i) {
+        double const value = random.chance() ? random.anyDouble() : double(random.below(4));
+        double const low = random.chance() ? random.anyDouble() : double(random.below(4));
+        double const high = random.chance() ? random.anyDouble() : double(random.below(4));
+        TypeInfo info;
+        if (random.chance()) info.min = Value(low);
+        if (random.chance()) info.max = Value(high);
+        double expected = value;
+        if (info.max && value > high) expected = high;
+        if (info.min && value < low) expected = low;
+        ASSERT_EQ(tests::bits(double(castValueToType(Value(value), info))), tests::bits(expected))
+            << value << " in " << low << ", " << high;
+    }
+}
+
+TEST(Value, IsReadAndCopiedOnManyThreads) {
+    Value const shared = smallMap();
+    std::vector<std::thread> threads;
+    std::vector<std::string> texts(4);
+    for (std::string& text : texts) {
+        threads.emplace_back([&shared, &text] {
+            for (int i = 0; i < 2000; ++i) {
+                Value const copy = shared;
+                text = to_string(Value(double(FloatVec2(copy).x) + i)) + to_string(copy);
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    for (std::string const& text : texts) EXPECT_EQ(text, "2000.5unstructured");
+}
+
+TEST(Value, SurvivesFailingAllocations) {
+    Value const before = "kept, and too long to be stored in place";
+    Value value = before;
+    Unstructured const tree = smallMap();
+    EXPECT_GT(
+        tests::failEachAllocation([&] { value = Value(tree); }, [&] { EXPECT_EQ(value, before); }),
+        3u);
+    EXPECT_EQ(value, Value(tree));
+}
