@@ -1,0 +1,212 @@
+#include <Engine/Base/patch.h>
+
+#include <cstdint>
+#include <ostream>
+
+namespace tarn::engine {
+
+namespace {
+
+template <class List>
+bool listsEqual(List const& a, List const& b) {
+    return a == b || *a == *b;
+}
+
+template <class AnyPatch>
+AnyPatch const* findPatch(AnyPatch const& root, unsigned long long id) {
+    if (id == 0) return nullptr;
+    if (root.id == id) return &root;
+    for (AnyPatch const& child : *root.children) {
+        if (child.id == id) return &child;
+    }
+    for (AnyPatch const& child : *root.children) {
+        if (AnyPatch const* found = findPatch(child, id)) return found;
+    }
+    return nullptr;
+}
+
+// The first element of the list whose `field` is `wanted`.
+template <class Element>
+Element const* findByField(std::vector<Element> const& list, unsigned long long Element::*field,
+                           unsigned long long wanted) {
+    for (Element const& element : list) {
+        if (element.*field == wanted) return &element;
+    }
+    return nullptr;
+}
+
+// The port among those that `ports` names, of the patch, then of its children.
+EvalPort const* findPort(EvalPatch const& patch, MutableArray<EvalPort> EvalPatch::*ports,
+                         unsigned long long portId) {
+    if (EvalPort const* port = findByField(*(patch.*ports), &EvalPort::id, portId)) return port;
+    for (EvalPatch const& child : *patch.children) {
+        if (EvalPort const* port = findByField(*(child.*ports), &EvalPort::id, portId)) return port;
+    }
+    return nullptr;
+}
+
+std::unordered_set<Connection> connectionsByField(Patch const& patch,
+                                                  unsigned long long Connection::*field,
+                                                  unsigned long long wanted) {
+    std::unordered_set<Connection> found;
+    for (Connection const& connection : *patch.connections) {
+        if (connection.*field == wanted) found.insert(connection);
+    }
+    return found;
+}
+
+}  // namespace
+
+bool Port::operator==(Port const& other) const {
+    return id == other.id && tag == other.tag && name == other.name && typeInfo == other.typeInfo &&
+           defaultValue == other.defaultValue && attributes == other.attributes;
+}
+bool Port::operator!=(Port const& other) const { return !(*this == other); }
+
+bool Connection::operator==(Connection const& other) const {
+    return fromPatchId == other.fromPatchId && fromPortId == other.fromPortId &&
+           toPatchId == other.toPatchId && toPortId == other.toPortId;
+}
+bool Connection::operator!=(Connection const& other) const { return !(*this == other); }
+
+bool Patch::operator==(Patch const& other) const {
+    return id == other.id && descriptor == other.descriptor && builtin == other.builtin &&
+           name == other.name && listsEqual(inputs, other.inputs) &&
+           listsEqual(outputs, other.outputs) && listsEqual(children, other.children) &&
+           modelLayer == other.modelLayer && listsEqual(connections, other.connections) &&
+           attributes == other.attributes;
+}
+bool Patch::operator!=(Patch const& other) const { return !(*this == other); }
+
+EvalPort::EvalPort() = default;
+EvalPort::EvalPort(Port const& port)
+    : id(port.id),
+      tag(port.tag),
+      typeInfo(port.typeInfo),
+      values(1, port.defaultValue),
+      name(port.name) {}
+
+bool EvalPort::operator==(EvalPort const& other) const {
+    return id == other.id && tag == other.tag && evaluatorState == other.evaluatorState &&
+           evaluatorFlag == other.evaluatorFlag && typeInfo == other.typeInfo &&
+           values == other.values && name == other.name;
+}
+bool EvalPort::operator!=(EvalPort const& other) const { return !(*this == other); }
+
+EvalPatch::EvalPatch() = default;
+EvalPatch::EvalPatch(Patch const& patch)
+    : id(patch.id),
+      builtin(patch.builtin),
+      inputs(map(toEvalPort, patch.inputs)),
+      outputs(map(toEvalPort, patch.outputs)),
+      name(patch.name),
+      children(map(toEvalPatch, patch.children)),
+      modelLayer(patch.modelLayer),
+      hasInputCount(patch.attributes.count("inputCount") != 0),
+      hasOutputCount(patch.attributes.count("outputCount") != 0) {}
+
+bool EvalPatch::operator==(EvalPatch const& other) const {
+    return id == other.id && builtin == other.builtin && name == other.name &&
+           hasInputCount == other.hasInputCount && hasOutputCount == other.hasOutputCount &&
+           listsEqual(inputs, other.inputs) && listsEqual(outputs, other.outputs) &&
+           listsEqual(children, other.children) && modelLayer == other.modelLayer;
+}
+bool EvalPatch::operator!=(EvalPatch const& other) const { return !(*this == other); }
+
+EvalPort toEvalPort(Port const& port) { return EvalPort(port); }
+EvalPatch toEvalPatch(Patch const& patch) { return EvalPatch(patch); }
+
+Patch const* findPatchRecursive(Patch const& root, unsigned long long id) {
+    return findPatch(root, id);
+}
+EvalPatch const* findPatchRecursive(EvalPatch const& root, unsigned long long id) {
+    return findPatch(root, id);
+}
+
+EvalPort const* findInputPort(EvalPatch const& patch, unsigned long long portId) {
+    return findPort(patch, &EvalPatch::inputs, portId);
+}
+EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long long portId) {
+    return findPort(patch, &EvalPatch::outputs, portId);
+}
+
+Optional<Connection> findIncomingConnectionToPort(Patch const& patch, unsigned long long portId) {
+    Connection const* const found = findByField(*patch.connections, &Connection::toPortId, portId);
+    if (found == nullptr) return std::nullopt;
+    return *found;
+}
+
+std::unordered_set<Connection> findIncomingConnectionsToPatch(Patch const& patch,
+                                                              unsigned long long patchId) {
+    return connectionsByField(patch, &Connection::toPatchId, patchId);
+}
+std::unordered_set<Connection> findOutgoingConnectionsFromPatch(Patch const& patch,
+                                                                unsigned long long patchId) {
+    return connectionsByField(patch, &Connection::fromPatchId, patchId);
+}
+
+Optional<std::unordered_set<Connection>>
+_findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId) {
+    for (Patch const& child : *root.children) {
+        if (findByField(*child.outputs, &Port::id, portId) != nullptr) {
+            return connectionsByField(root, &Connection::fromPortId, portId);
+        }
+    }
+    for (Patch const& child : *root.children) {
+        auto found = _findOutgoingConnectionsFromPort(child, portId);
+        if (found) return found;
+    }
+    return std::nullopt;
+}
+
+std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,
+                                                               unsigned long long portId) {
+    auto found = _findOutgoingConnectionsFromPort(root, portId);
+    return found ? *std::move(found) : std::unordered_set<Connection>();
+}
+
+Port const* inPortForTag(Patch const& patch, unsigned long long tag) {
+    return findByField(*patch.inputs, &Port::tag, tag);
+}
+EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long tag) {
+    return findByField(*patch.inputs, &EvalPort::tag, tag);
+}
+Port const* outPortForTag(Patch const& patch, unsigned long long tag) {
+    return findByField(*patch.outputs, &Port::tag, tag);
+}
+EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag) {
+    return findByField(*patch.outputs, &EvalPort::tag, tag);
+}
+
+std::ostream& operator<<(std::ostream& stream, Port const& port) {
+    return stream << "[" << port.name << ":" << port.id << " tag: " << port.tag
+                  << " typeInfo: " << port.typeInfo << " defaultValue: " << port.defaultValue
+                  << "]";
+}
+
+std::ostream& operator<<(std::ostream& stream, Connection const& connection) {
+    return stream << "[connection:" << connection.fromPortId << "->" << connection.toPortId << "]";
+}
+
+std::ostream& operator<<(std::ostream& stream, Patch const& patch) {
+    stream << "[patch:" << patch.id << " name: " << patch.name << " builtin: " << patch.builtin;
+    if (patch.inputs->empty() && patch.outputs->empty()) stream << "]";
+    for (Array<Port> const& ports : {patch.inputs, patch.outputs}) {
+        for (Port const& port : *ports) stream << "  " << port << std::endl;
+    }
+    for (Patch const& child : *patch.children) stream << child << std::endl;
+    for (Connection const& connection : *patch.connections) stream << connection << std::endl;
+    return stream;
+}
+
+}  // namespace tarn::engine
+
+std::size_t std::hash<tarn::engine::Connection>::operator()(
+    tarn::engine::Connection const& connection) const noexcept {
+    std::uint64_t seed = 0;
+    for (std::uint64_t const field : {connection.fromPatchId, connection.fromPortId,
+                                      connection.toPatchId, connection.toPortId}) {
+        seed ^= field + 0x9e3779b9 + (seed << 6) + (seed >> 2);
+    }
+    return static_cast<std::size_t>(seed);
+}

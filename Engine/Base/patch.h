@@ -1,0 +1,226 @@
+// Engine/Base/patch.h: the graph of patches, its evaluation form, its queries and its debug text.
+//
+//     Patch const* patch = findPatchRecursive(root, 7);
+//     for (Connection const& c : findOutgoingConnectionsFromPort(root, portId)) { follow(c); }
+//     EvalPatch evaluated(root);
+
+#ifndef TARN_ENGINE_BASE_PATCH_H
+#define TARN_ENGINE_BASE_PATCH_H
+
+#include <Engine/Base/export.h>
+#include <Engine/Base/layers.h>
+#include <Engine/Base/unstructured.h>
+#include <Engine/Base/value.h>
+
+#include <cstddef>
+#include <functional>
+#include <iosfwd>
+#include <map>
+#include <memory>
+#include <string>
+#include <type_traits>
+#include <unordered_set>
+#include <utility>
+#include <vector>
+
+namespace tarn::engine {
+
+/// A list that records share: copying a record copies the pointer. Never null in a record, except
+/// in one that was moved from, which is only to be assigned to or destroyed.
+template <class T>
+using Array = std::shared_ptr<std::vector<T> const>;
+
+/// The same with elements that change in place, for everyone who shares it.
+template <class T>
+using MutableArray = std::shared_ptr<std::vector<T>>;
+
+/// An input or output of a patch.
+struct Port {
+    /// Unique among all ports of a document.
+    unsigned long long id = 0;
+    /// Finds the port among those of its own patch.
+    unsigned long long tag = 0;
+    std::string name;
+    TypeInfo typeInfo;
+    Value defaultValue;
+    std::map<std::string, Unstructured> attributes;
+
+    TARN_ENGINE_BASE_EXPORT bool operator==(Port const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(Port const& other) const;
+};
+
+/// From an output port to an input port. Held by the patch whose children both ends are.
+struct Connection {
+    unsigned long long fromPatchId = 0;
+    unsigned long long fromPortId = 0;
+    unsigned long long toPatchId = 0;
+    unsigned long long toPortId = 0;
+
+    TARN_ENGINE_BASE_EXPORT bool operator==(Connection const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(Connection const& other) const;
+};
+
+}  // namespace tarn::engine
+
+/// The four fields in their order, each combined as
+/// `seed ^= v + 0x9e3779b9 + (seed << 6) + (seed >> 2)` in 64 bits. The same on every platform.
+template <>
+struct std::hash<tarn::engine::Connection> {
+    TARN_ENGINE_BASE_EXPORT std::size_t
+    operator()(tarn::engine::Connection const& connection) const noexcept;
+};
+
+namespace tarn::engine {
+
+/// A node of the graph: its ports, its children and the connections between the children's ports.
+/// Copies share the lists.
+struct Patch {
+    /// Never 0 in a document: that means no patch.
+    unsigned long long id = 0;
+    /// The number of the built-in kind; the evaluator owns the table.
+    unsigned long long builtin = 0;
+    /// A second text; compared, but neither printed nor evaluated.
+    std::string descriptor;
+    ModelLayer modelLayer;
+    std::string name;
+    Array<Port> inputs = std::make_shared<std::vector<Port> const>();
+    Array<Port> outputs = std::make_shared<std::vector<Port> const>();
+    /// "inputCount" and "outputCount" are the configured numbers of ports.
+    std::map<std::string, Unstructured> attributes;
+    Array<Connection> connections = std::make_shared<std::vector<Connection> const>();
+    Array<Patch> children = std::make_shared<std::vector<Patch> const>();
+
+    /// Deep and in order. Lists that are one object are equal without a look at them.
+    TARN_ENGINE_BASE_EXPORT bool operator==(Patch const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(Patch const& other) const;
+};
+static_assert(std::is_nothrow_move_constructible_v<Port>, "lists of ports move when they grow");
+static_assert(std::is_nothrow_move_constructible_v<Patch>, "lists of patches move when they grow");
+
+/// A port as the evaluator keeps it: with a list of the values that it has now.
+struct EvalPort {
+    unsigned long long id = 0;
+    unsigned long long tag = 0;
+    /// The evaluator's own; zero and false at first, and not looked at here.
+    unsigned long long evaluatorState = 0;
+    bool evaluatorFlag = false;
+    TypeInfo typeInfo;
+    /// At first one element, the port's default value.
+    std::vector<Value> values;
+    std::string name;
+
+    TARN_ENGINE_BASE_EXPORT EvalPort();
+    TARN_ENGINE_BASE_EXPORT explicit EvalPort(Port const& port);
+
+    TARN_ENGINE_BASE_EXPORT bool operator==(EvalPort const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPort const& other) const;
+};
+
+/// A patch as the evaluator keeps it. Copies share the lists; two conversions do not.
+struct EvalPatch {
+    unsigned long long id = 0;
+    unsigned long long builtin = 0;
+    MutableArray<EvalPort> inputs = std::make_shared<std::vector<EvalPort>>();
+    MutableArray<EvalPort> outputs = std::make_shared<std::vector<EvalPort>>();
+    std::string name;
+    MutableArray<EvalPatch> children = std::make_shared<std::vector<EvalPatch>>();
+    ModelLayer modelLayer;
+    /// Whether the patch's attributes have the keys "inputCount" and "outputCount", of any value.
+    bool hasInputCount = false;
+    bool hasOutputCount = false;
+
+    TARN_ENGINE_BASE_EXPORT EvalPatch();
+    /// Converts the whole subtree. Linear in its size; each list is allocated once.
+    TARN_ENGINE_BASE_EXPORT explicit EvalPatch(Patch const& patch);
+
+    /// Deep and in order. Lists that are one object are equal without a look at them.
+    TARN_ENGINE_BASE_EXPORT bool operator==(EvalPatch const& other) const;
+    TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPatch const& other) const;
+};
+static_assert(std::is_nothrow_move_constructible_v<EvalPort>, "lists of ports move");
+static_assert(std::is_nothrow_move_constructible_v<EvalPatch>, "lists of patches move");
+
+/// The constructors, to be passed to `map`.
+TARN_ENGINE_BASE_EXPORT EvalPort toEvalPort(Port const& port);
+TARN_ENGINE_BASE_EXPORT EvalPatch toEvalPatch(Patch const& patch);
+
+/// A new list of what `function` gives for each element, in order; allocated once. Never null.
+template <class Function, class T>
+MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
+                                                                          Array<T> const& list);
+
+// Queries. None fails: what is not there is null, an empty optional or an empty set. Pointers refer
+// into the lists of the argument and live as long as those lists. All are linear in what they
+// search and allocate for their sets alone.
+
+/// The patch of this id in the whole subtree, `root` included; null for id 0, even where a patch
+/// carries it. Each level's children are all looked at before the first of them is entered; the
+/// first found in this order wins.
+TARN_ENGINE_BASE_EXPORT Patch const* findPatchRecursive(Patch const& root, unsigned long long id);
+TARN_ENGINE_BASE_EXPORT EvalPatch const* findPatchRecursive(EvalPatch const& root,
+                                                            unsigned long long id);
+
+/// The port of this id among the inputs (outputs) of the patch, then of its children in order; not
+/// of grandchildren.
+TARN_ENGINE_BASE_EXPORT EvalPort const* findInputPort(EvalPatch const& patch,
+                                                      unsigned long long portId);
+TARN_ENGINE_BASE_EXPORT EvalPort const* findOutputPort(EvalPatch const& patch,
+                                                       unsigned long long portId);
+
+/// The first of the patch's own connections that leads to the port.
+TARN_ENGINE_BASE_EXPORT Optional<Connection>
+findIncomingConnectionToPort(Patch const& patch, unsigned long long portId);
+
+/// Those of the patch's own connections that lead to (start from) the patch `patchId`.
+TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
+findIncomingConnectionsToPatch(Patch const& patch, unsigned long long patchId);
+TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
+findOutgoingConnectionsFromPatch(Patch const& patch, unsigned long long patchId);
+
+/// The connections that start from the port, out of those of the first patch in the subtree with a
+/// child that has the port among its outputs; searched from `root`, depth first. Empty where
+/// that patch has none, and for a port of `root` itself.
+TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
+findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
+
+/// The worker behind it: empty where no patch of the subtree has such a child.
+TARN_ENGINE_BASE_EXPORT Optional<std::unordered_set<Connection>>
+_findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
+
+/// The first input (output) of the patch with this tag; children are not searched.
+TARN_ENGINE_BASE_EXPORT Port const* inPortForTag(Patch const& patch, unsigned long long tag);
+TARN_ENGINE_BASE_EXPORT EvalPort const* inPortForTag(EvalPatch const& patch,
+                                                     unsigned long long tag);
+TARN_ENGINE_BASE_EXPORT Port const* outPortForTag(Patch const& patch, unsigned long long tag);
+TARN_ENGINE_BASE_EXPORT EvalPort const* outPortForTag(EvalPatch const& patch,
+                                                      unsigned long long tag);
+
+// Debug text, for people; nothing reads it back. Numbers follow the stream's flags.
+
+/// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Port const& port);
+
+/// "[connection:12->34]", the ids of the ports, without an end of line.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream,
+                                                 Connection const& connection);
+
+/// The patch, its ports, its children's whole texts and its connections. Deliberate: only a
+/// patch without ports closes its bracket, and nesting is not indented. Every line end is
+/// flushed: print to a string stream where the text is long.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Patch const& patch);
+
+// Implementation
+
+template <class Function, class T>
+MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
+                                                                          Array<T> const& list) {
+    using Result = std::decay_t<std::invoke_result_t<Function&, T const&>>;
+    std::vector<Result> results;
+    results.reserve(list->size());
+    for (T const& element : *list) results.push_back(function(element));
+    return std::make_shared<std::vector<Result>>(std::move(results));
+}
+
+}  // namespace tarn::engine
+
+#endif

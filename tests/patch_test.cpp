@@ -1,0 +1,712 @@
+#include <Engine/Base/patch.h>
+
+#include <Engine/Base/path.h>
+
+#include "support/allocations.h"
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <climits>
+#include <cmath>
+#include <fstream>
+#include <iomanip>
+#include <iterator>
+#include <sstream>
+
+using namespace tarn::engine;
+
+namespace {
+
+using Set = std::unordered_set<Connection>;
+
+template <class T>
+Array<T> listOf(std::vector<T> elements) {
+    return std::make_shared<std::vector<T> const>(std::move(elements));
+}
+
+Port port(unsigned long long id, unsigned long long tag = 0) {
+    Port result;
+    result.id = id;
+    result.tag = tag;
+    result.name = "p" + std::to_string(id);
+    return result;
+}
+
+Patch patch(unsigned long long id, std::vector<Patch> children = {},
+            std::vector<Connection> connections = {}) {
+    Patch result;
+    result.id = id;
+    result.name = "n" + std::to_string(id);
+    result.children = listOf(std::move(children));
+    result.connections = listOf(std::move(connections));
+    return result;
+}
+
+Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> outputs) {
+    base.inputs = listOf(std::move(inputs));
+    base.outputs = listOf(std::move(outputs));
+    return base;
+}
+
+// Three levels, with everything that the debug text shows.
+Patch document() {
+    Port number = port(11, 1);
+    number.name = "";
+    number.defaultValue = 2.5;
+    Port text = port(12, 2);
+    text.typeInfo.type = Type::String;
+    text.defaultValue = "a text";
+    Port color = port(13);
+    color.typeInfo.type = Type::Vec4;
+    color.defaultValue = FloatVec4{1, 0.5, 0, 1};
+    Port shape = port(21, 7);
+    shape.typeInfo.type = Type::Path;
+    shape.defaultValue = Path();
+    Patch const leaf = withPorts(patch(4), {number}, {});
+    Patch const bare = patch(5);
+    Patch const middle =
+        withPorts(patch(2, {leaf, bare}, {{4, 11, 5, 99}}), {text, color}, {shape});
+    Patch root = patch(1, {middle, patch(3)}, {{2, 21, 3, 31}, {2, 21, 2, 12}});
+    root.builtin = 77;
+    root.descriptor = "not printed";
+    return root;
+}
+
+template <class T>
+std::string written(T const& what) {
+    std::ostringstream stream;
+    stream << what;
+    return stream.str();
+}
+
+}  // namespace
+
+TEST(Records, HoldEmptyListsUntilGivenOthers) {
+    Patch const fresh;
+    for (std::size_t size : {fresh.inputs->size(), fresh.outputs->size(), fresh.connections->size(),
+                             fresh.children->size()}) {
+        EXPECT_EQ(size, 0u);
+    }
+    EXPECT_EQ(fresh, Patch());
+    EvalPatch const evaluated;
+    EXPECT_TRUE(evaluated.inputs->empty() && evaluated.outputs->empty());
+    EXPECT_TRUE(evaluated.children->empty());
+    EXPECT_NE(evaluated.inputs, EvalPatch().inputs);
+    EXPECT_EQ(evaluated, EvalPatch());
+    EXPECT_EQ(EvalPort(), EvalPort());
+    EXPECT_EQ(Port(), Port());
+    EXPECT_EQ(Connection(), (Connection{0, 0, 0, 0}));
+}
+
+TEST(Port, EqualsFieldByField) {
+    auto const base = [] {
+        Port p = port(1, 2);
+        p.typeInfo.min = Value(0.0);
+        p.defaultValue = 1.5;
+        p.attributes = {{"a", 1}, {"b", "two"}};
+        return p;
+    };
+    struct Row {
+        char const* what;
+        void (*change)(Port&);
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"nothing", [](Port&) {}, true},
+             Row{"id", [](Port& p) { p.id = 9; }, false},
+             Row{"tag", [](Port& p) { p.tag = 9; }, false},
+             Row{"name", [](Port& p) { p.name = "other"; }, false},
+             Row{"type info", [](Port& p) { p.typeInfo.subtype = 1; }, false},
+             Row{"default value", [](Port& p) { p.defaultValue = 2; }, false},
+             Row{"attribute's value", [](Port& p) { p.attributes["a"] = 2; }, false},
+             Row{"attribute's key",
+                 [](Port& p) {
+                     p.attributes = {{"A", 1}, {"b", "two"}};
+                 },
+                 false},
+             Row{"another attribute", [](Port& p) { p.attributes["c"] = 3; }, false},
+             Row{"order of insertion",
+                 [](Port& p) {
+                     p.attributes.clear();
+                     p.attributes["b"] = "two";
+                     p.attributes["a"] = 1;
+                 },
+                 true},
+             Row{"NaN", [](Port& p) { p.defaultValue = double(NAN); }, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        Port other = base();
+        row.change(other);
+        EXPECT_EQ(base() == other, row.equal);
+        EXPECT_EQ(other == base(), row.equal);
+        EXPECT_EQ(base() != other, !row.equal);
+    }
+}
+
+TEST(Connection, EqualsAndHashesByAllFields) {
+    Connection const base{1, 2, 3, 4};
+    EXPECT_EQ(base, (Connection{1, 2, 3, 4}));
+    for (Connection const& other : {Connection{9, 2, 3, 4}, Connection{1, 9, 3, 4},
+                                    Connection{1, 2, 9, 4}, Connection{1, 2, 3, 9}}) {
+        EXPECT_FALSE(base == other);
+        EXPECT_TRUE(base != other);
+        EXPECT_NE(std::hash<Connection>()(base), std::hash<Connection>()(other));
+    }
+    struct Row {
+        Connection connection;
+        std::size_t hash;
+    };
+    for (Row const& row : {
+             Row{{1, 2, 3, 4}, 0x28253c81ad382},
+             Row{{3, 4, 1, 2}, 0x28253c81259e0},
+             Row{{0, 0, 0, 0}, 0x28253c84d221a},
+         }) {
+        EXPECT_EQ(std::hash<Connection>()(row.connection), row.hash);
+    }
+    EXPECT_EQ(Set().max_load_factor(), 1.0f);
+}
+
+TEST(Patch, EqualsFieldByField) {
+    struct Row {
+        char const* what;
+        void (*change)(Patch&);
+        bool equal;
+    };
+    for (Row const& row : {
+             Row{"nothing", [](Patch&) {}, true},
+             Row{"id", [](Patch& p) { p.id = 9; }, false},
+             Row{"builtin", [](Patch& p) { p.builtin = 9; }, false},
+             Row{"descriptor", [](Patch& p) { p.descriptor = "other"; }, false},
+             Row{"name", [](Patch& p) { p.name = "other"; }, false},
+             Row{"model layer", [](Patch& p) { p.modelLayer.id = 9; }, false},
+             Row{"inputs", [](Patch& p) { p.inputs = listOf<Port>({port(9)}); }, false},
+             Row{"outputs", [](Patch& p) { p.outputs = listOf<Port>({port(9)}); }, false},
+             Row{"connections", [](Patch& p) { p.connections = listOf<Connection>({}); }, false},
+             Row{"order of connections",
+                 [](Patch& p) {
+                     p.connections = listOf<Connection>({{2, 21, 2, 12}, {2, 21, 3, 31}});
+                 },
+                 false},
+             Row{"attributes", [](Patch& p) { p.attributes["a"] = 1; }, false},
+             Row{"fewer children", [](Patch& p) { p.children = listOf<Patch>({}); }, false},
+             Row{"grandchild's port",
+                 [](Patch& p) {
+                     Patch middle = p.children->at(0);
+                     Patch leaf = middle.children->at(0);
+                     Port changed = leaf.inputs->at(0);
+                     changed.attributes["x"] = 0;
+                     leaf.inputs = listOf<Port>({changed});
+                     middle.children = listOf<Patch>({leaf, middle.children->at(1)});
+                     p.children = listOf<Patch>({middle, p.children->at(1)});
+                 },
+                 false},
+             Row{"order of children",
+                 [](Patch& p) {
+                     p.children = listOf<Patch>({p.children->at(1), p.children->at(0)});
+                 },
+                 false},
+         }) {
+        SCOPED_TRACE(row.what);
+        Patch const base = document();
+        Patch other = document();
+        row.change(other);
+        EXPECT_EQ(base == other, row.equal);
+        EXPECT_EQ(other == base, row.equal);
+        EXPECT_EQ(base != other, !row.equal);
+    }
+}
+
+TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
+    Port nan = port(1);
+    nan.defaultValue = double(NAN);
+    for (Array<Port> Patch::*ports : {&Patch::inputs, &Patch::outputs}) {
+        Patch a;
+        a.*ports = listOf<Port>({nan});
+        Patch b;
+        b.*ports = listOf<Port>({nan});
+        EXPECT_FALSE(a == b);
+        b.*ports = a.*ports;
+        EXPECT_TRUE(a == b);
+        EXPECT_TRUE(a == Patch(a));
+        Patch c = patch(1, {a});
+        EXPECT_TRUE(c == Patch(c));
+        // Children that are not shared are looked at, and share their own lists.
+        EXPECT_TRUE(c == patch(1, {a}));
+        EXPECT_FALSE(c == patch(1, {[&] {
+                                    Patch d;
+                                    d.*ports = listOf<Port>({nan});
+                                    return d;
+                                }()}));
+    }
+    Patch attributes;
+    attributes.attributes["a"] = double(NAN);
+    EXPECT_FALSE(attributes == attributes);
+}
+
+TEST(Patch, CopiesShareTheirLists) {
+    Patch const original = document();
+    Patch const copy = original;
+    EXPECT_EQ(copy.inputs, original.inputs);
+    EXPECT_EQ(copy.children, original.children);
+    EXPECT_EQ(copy.connections, original.connections);
+}
+
+TEST(EvalPort, TakesOverAPort) {
+    Port source = port(5, 6);
+    source.typeInfo = {Type::Int, 1, Value(0), {}, Value("e")};
+    source.defaultValue = 7;
+    source.attributes["dropped"] = 1;
+    for (EvalPort const& evaluated : {EvalPort(source), toEvalPort(source)}) {
+        EXPECT_EQ(evaluated.id, 5u);
+        EXPECT_EQ(evaluated.tag, 6u);
+        EXPECT_EQ(evaluated.evaluatorState, 0u);
+        EXPECT_FALSE(evaluated.evaluatorFlag);
+        EXPECT_EQ(evaluated.typeInfo, source.typeInfo);
+        EXPECT_EQ(evaluated.values, Loop{7});
+        EXPECT_EQ(evaluated.values.capacity(), 1u);
+        EXPECT_EQ(evaluated.name, "p5");
+    }
+}
+
+TEST(EvalPort, EqualsFieldByField) {
+    struct Row {
+        char const* what;
+        void (*change)(EvalPort&);
+    };
+    EvalPort const base(port(1));
+    EXPECT_EQ(base, EvalPort(port(1)));
+    for (Row const& row : {
+             Row{"id", [](EvalPort& p) { p.id = 9; }},
+             Row{"tag", [](EvalPort& p) { p.tag = 9; }},
+             Row{"state", [](EvalPort& p) { p.evaluatorState = 9; }},
+             Row{"flag", [](EvalPort& p) { p.evaluatorFlag = true; }},
+             Row{"type info", [](EvalPort& p) { p.typeInfo.type = Type::Int; }},
+             Row{"values", [](EvalPort& p) { p.values.push_back(1); }},
+             Row{"name", [](EvalPort& p) { p.name = "other"; }},
+         }) {
+        SCOPED_TRACE(row.what);
+        EvalPort other = base;
+        row.change(other);
+        EXPECT_FALSE(base == other);
+        EXPECT_TRUE(base != other);
+    }
+}
+
+TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
+    Patch source = document();
+    source.modelLayer = {3, {{4, {}, {}}}, {{5, {}, {}}}};
+    for (EvalPatch const& evaluated : {EvalPatch(source), toEvalPatch(source)}) {
+        EXPECT_EQ(evaluated.id, 1u);
+        EXPECT_EQ(evaluated.builtin, 77u);
+        EXPECT_EQ(evaluated.name, "n1");
+        EXPECT_EQ(evaluated.modelLayer, source.modelLayer);
+        EXPECT_TRUE(evaluated.inputs->empty());
+        ASSERT_EQ(evaluated.children->size(), 2u);
+        EvalPatch const& middle = evaluated.children->at(0);
+        EXPECT_EQ(middle.id, 2u);
+        ASSERT_EQ(middle.inputs->size(), 2u);
+        EXPECT_EQ(middle.inputs->at(0), EvalPort(source.children->at(0).inputs->at(0)));
+        EXPECT_EQ(middle.inputs->at(1).id, 13u);
+        EXPECT_EQ(middle.outputs->at(0).id, 21u);
+        ASSERT_EQ(middle.children->size(), 2u);
+        EXPECT_EQ(middle.children->at(0).inputs->at(0).values, Loop{2.5});
+        ASSERT_NE(middle.children->at(1).children, nullptr);
+        EXPECT_TRUE(middle.children->at(1).children->empty());
+        EXPECT_EQ(evaluated.children->at(1).id, 3u);
+    }
+}
+
+TEST(EvalPatch, RecordsWhetherPortsAreCounted) {
+    struct Row {
+        char const* what;
+        std::map<std::string, Unstructured> attributes;
+        bool in, out;
+    };
+    for (Row const& row : {
+             Row{"none", {}, false, false},
+             Row{"inputs", {{"inputCount", 3}}, true, false},
+             Row{"outputs", {{"outputCount", 3}}, false, true},
+             Row{"of null", {{"inputCount", {}}, {"outputCount", {}}}, true, true},
+             Row{"another case", {{"InputCount", 3}, {"outputcount", 3}}, false, false},
+         }) {
+        SCOPED_TRACE(row.what);
+        Patch source;
+        source.attributes = row.attributes;
+        EXPECT_EQ(EvalPatch(source).hasInputCount, row.in);
+        EXPECT_EQ(EvalPatch(source).hasOutputCount, row.out);
+    }
+}
+
+TEST(EvalPatch, SharesListsWithCopiesAndNotWithOtherConversions) {
+    Patch const source = document();
+    EvalPatch const first(source);
+    EvalPatch const second(source);
+    EvalPatch const copy = first;
+    EXPECT_EQ(first, second);
+    EXPECT_NE(first.inputs, second.inputs);
+    EXPECT_NE(first.outputs, second.outputs);
+    EXPECT_NE(first.children, second.children);
+    EXPECT_EQ(copy.inputs, first.inputs);
+    EXPECT_EQ(copy.children, first.children);
+    copy.children->at(0).inputs->at(0).values[0] = 9.0;
+    EXPECT_EQ(first.children->at(0).inputs->at(0).values, Loop{9.0});
+    EXPECT_NE(first, second);
+}
+
+TEST(EvalPatch, EqualsFieldByField) {
+    struct Row {
+        char const* what;
+        void (*change)(EvalPatch&);
+    };
+    for (Row const& row : {
+             Row{"id", [](EvalPatch& p) { p.id = 9; }},
+             Row{"builtin", [](EvalPatch& p) { p.builtin = 9; }},
+             Row{"name", [](EvalPatch& p) { p.name = "other"; }},
+             Row{"inputs", [](EvalPatch& p) { p.inputs->emplace_back(); }},
+             Row{"outputs", [](EvalPatch& p) { p.outputs->emplace_back(); }},
+             Row{"children", [](EvalPatch& p) { p.children->at(0).id = 9; }},
+             Row{"model layer", [](EvalPatch& p) { p.modelLayer.id = 9; }},
+             Row{"input count", [](EvalPatch& p) { p.hasInputCount = true; }},
+             Row{"output count", [](EvalPatch& p) { p.hasOutputCount = true; }},
+         }) {
+        SCOPED_TRACE(row.what);
+        EvalPatch const base(document());
+        EvalPatch other(document());
+        EXPECT_TRUE(base == other);
+        row.change(other);
+        EXPECT_FALSE(base == other);
+        EXPECT_TRUE(base != other);
+    }
+}
+
+TEST(Map, AppliesAFunctionInOrderWithOneAllocationForTheList) {
+    Array<Port> const ports = listOf<Port>({port(1), port(2), port(3)});
+    MutableArray<unsigned long long> const ids =
+        map([](Port const& p) { return p.id * 10; }, ports);
+    EXPECT_EQ(*ids, (std::vector<unsigned long long>{10, 20, 30}));
+    tests::AllocationCounter counter;
+    EXPECT_EQ(map([](Port const& p) { return p.id; }, ports)->size(), 3u);
+    EXPECT_EQ(counter.count(), 2u);  // The elements, and the list with its count.
+    MutableArray<EvalPort> const none = map(toEvalPort, listOf<Port>({}));
+    ASSERT_NE(none, nullptr);
+    EXPECT_TRUE(none->empty());
+}
+
+TEST(FindPatchRecursive, LooksAtALevelBeforeItEntersIt) {
+    Patch deep = patch(7);
+    deep.name = "deep";
+    Patch shallow = patch(7);
+    shallow.name = "shallow";
+    Patch const root = patch(1, {patch(2, {deep, patch(8)}), patch(3, {patch(9)}), shallow});
+    EvalPatch const evaluated(root);
+    EXPECT_EQ(findPatchRecursive(root, 1), &root);
+    EXPECT_EQ(findPatchRecursive(evaluated, 1), &evaluated);
+    EXPECT_EQ(findPatchRecursive(root, 7)->name, "shallow");
+    EXPECT_EQ(findPatchRecursive(evaluated, 7)->name, "shallow");
+    EXPECT_EQ(findPatchRecursive(root, 9), &root.children->at(1).children->at(0));
+    EXPECT_EQ(findPatchRecursive(root, 8), &root.children->at(0).children->at(1));
+    EXPECT_EQ(findPatchRecursive(root, 99), nullptr);
+    EXPECT_EQ(findPatchRecursive(evaluated, 99), nullptr);
+}
+
+TEST(FindPatchRecursive, FindsNothingForZero) {
+    Patch const root = patch(0, {patch(0)});
+    EXPECT_EQ(findPatchRecursive(root, 0), nullptr);
+    EXPECT_EQ(findPatchRecursive(EvalPatch(root), 0), nullptr);
+}
+
+TEST(FindPort, SearchesThePatchAndItsChildren) {
+    Patch const grandchild = withPorts(patch(4), {port(41)}, {port(42)});
+    Patch const root = withPorts(
+        patch(1, {withPorts(patch(2, {grandchild}), {port(21), port(90)}, {port(22), port(91)}),
+                  withPorts(patch(3), {port(31), port(21)}, {port(32), port(22)})}),
+        {port(11), port(90)}, {port(12), port(91)});
+    EvalPatch const evaluated(root);
+    EXPECT_EQ(findInputPort(evaluated, 11), &evaluated.inputs->at(0));
+    EXPECT_EQ(findOutputPort(evaluated, 12), &evaluated.outputs->at(0));
+    EXPECT_EQ(findInputPort(evaluated, 90), &evaluated.inputs->at(1));
+    EXPECT_EQ(findOutputPort(evaluated, 91), &evaluated.outputs->at(1));
+    EXPECT_EQ(findInputPort(evaluated, 21), &evaluated.children->at(0).inputs->at(0));
+    EXPECT_EQ(findOutputPort(evaluated, 22), &evaluated.children->at(0).outputs->at(0));
+    EXPECT_EQ(findInputPort(evaluated, 31), &evaluated.children->at(1).inputs->at(0));
+    EXPECT_EQ(findOutputPort(evaluated, 32), &evaluated.children->at(1).outputs->at(0));
+    EXPECT_EQ(findInputPort(evaluated, 41), nullptr);
+    EXPECT_EQ(findOutputPort(evaluated, 42), nullptr);
+    EXPECT_EQ(findInputPort(evaluated, 12), nullptr);
+    EXPECT_EQ(findOutputPort(evaluated, 11), nullptr);
+}
+
+TEST(FindConnections, SearchThePatchsOwn) {
+    Connection const a{1, 10, 2, 20};
+    Connection const b{3, 30, 2, 20};
+    Connection const c{1, 10, 4, 40};
+    Connection const inner{1, 10, 2, 50};
+    Patch const root = patch(9, {patch(1, {}, {inner}), patch(2)}, {a, b, c, a});
+    EXPECT_EQ(findIncomingConnectionToPort(root, 20).value(), a);
+    EXPECT_EQ(findIncomingConnectionToPort(root, 40).value(), c);
+    EXPECT_FALSE(findIncomingConnectionToPort(root, 10).hasValue());
+    EXPECT_FALSE(findIncomingConnectionToPort(root, 50).hasValue());
+    EXPECT_EQ(findIncomingConnectionsToPatch(root, 2), (Set{a, b}));
+    EXPECT_EQ(findIncomingConnectionsToPatch(root, 4), (Set{c}));
+    EXPECT_EQ(findIncomingConnectionsToPatch(root, 1), Set());
+    EXPECT_EQ(findOutgoingConnectionsFromPatch(root, 1), (Set{a, c}));
+    EXPECT_EQ(findOutgoingConnectionsFromPatch(root, 3), (Set{b}));
+    EXPECT_EQ(findOutgoingConnectionsFromPatch(root, 2), Set());
+}
+
+TEST(FindOutgoingConnectionsFromPort, EndsAtTheParentOfThePortsPatch) {
+    Connection const wrongPatch{77, 10, 3, 30};  // Matched by the port alone.
+    Connection const twice{2, 10, 4, 40};
+    Patch const deeper =
+        patch(6, {withPorts(patch(7), {}, {port(10), port(60)})}, {{7, 10, 8, 80}, {7, 60, 8, 81}});
+    Patch const root = withPorts(patch(1, {deeper, withPorts(patch(2), {}, {port(10), port(11)})},
+                                       {wrongPatch, twice, twice, {2, 12, 3, 30}}),
+                                 {}, {port(5)});
+    struct Row {
+        char const* what;
+        unsigned long long portId;
+        bool engaged;
+        Set expected;
+    };
+    for (Row const& row : {
+             Row{"child's port, although a deeper patch has it too", 10, true, {wrongPatch, twice}},
+             Row{"child's port without connections", 11, true, {}},
+             Row{"deeper port", 60, true, {{7, 60, 8, 81}}},
+             Row{"the root's own port", 5, false, {}},
+             Row{"no port", 12, false, {}},
+         }) {
+        SCOPED_TRACE(row.what);
+        auto const worker = _findOutgoingConnectionsFromPort(root, row.portId);
+        EXPECT_EQ(worker.hasValue(), row.engaged);
+        if (worker) {
+            EXPECT_EQ(*worker, row.expected);
+        }
+        EXPECT_EQ(findOutgoingConnectionsFromPort(root, row.portId), row.expected);
+    }
+    EXPECT_FALSE(_findOutgoingConnectionsFromPort(patch(1), 1).hasValue());
+}
+
+TEST(PortForTag, IsTheFirstOfThePatchsOwn) {
+    Patch const root =
+        withPorts(patch(1, {withPorts(patch(2), {port(21, 5)}, {port(22, 6)})}),
+                  {port(11, 1), port(12, 2), port(13, 1)}, {port(14, 1), port(15, 3), port(16, 3)});
+    EvalPatch const evaluated(root);
+    EXPECT_EQ(inPortForTag(root, 1), &root.inputs->at(0));
+    EXPECT_EQ(inPortForTag(root, 2), &root.inputs->at(1));
+    EXPECT_EQ(inPortForTag(root, 3), nullptr);
+    EXPECT_EQ(inPortForTag(root, 5), nullptr);
+    EXPECT_EQ(outPortForTag(root, 1), &root.outputs->at(0));
+    EXPECT_EQ(outPortForTag(root, 3), &root.outputs->at(1));
+    EXPECT_EQ(outPortForTag(root, 6), nullptr);
+    EXPECT_EQ(inPortForTag(evaluated, 1), &evaluated.inputs->at(0));
+    EXPECT_EQ(inPortForTag(evaluated, 3), nullptr);
+    EXPECT_EQ(outPortForTag(evaluated, 3), &evaluated.outputs->at(1));
+    EXPECT_EQ(outPortForTag(evaluated, 2), nullptr);
+}
+
+TEST(GraphText, OfPortsAndConnections) {
+    Port p = port(12, 34);
+    p.typeInfo.type = Type::Vec2;
+    p.defaultValue = FloatVec2{1, 2.5};
+    EXPECT_EQ(written(p), "[p12:12 tag: 34 typeInfo: [type: vec2] defaultValue: 1, 2.5]");
+    p.name = "";
+    EXPECT_EQ(written(p), "[:12 tag: 34 typeInfo: [type: vec2] defaultValue: 1, 2.5]");
+    EXPECT_EQ(written(Connection{1, 2, 3, 4}), "[connection:2->4]");
+    std::ostringstream hex;
+    hex << std::hex << Connection{1, 255, 3, 16} << p;
+    EXPECT_EQ(hex.str(),
+              "[connection:ff->10][:c tag: 22 typeInfo: [type: vec2] defaultValue: 1, 2.5]");
+}
+
+TEST(GraphText, OfPatches) {
+    std::string const in = "[p11:11 tag: 0 typeInfo: [type: float] defaultValue: 0]";
+    std::string const out = "[p12:12 tag: 0 typeInfo: [type: float] defaultValue: 0]";
+    struct Row {
+        char const* what;
+        Patch patch;
+        std::string text;
+    };
+    for (Row const& row : {
+             Row{"nothing", patch(1), "[patch:1 name: n1 builtin: 0]"},
+             Row{"one input", withPorts(patch(1), {port(11)}, {}),
+                 "[patch:1 name: n1 builtin: 0  " + in + "\n"},
+             Row{"one output", withPorts(patch(1), {}, {port(12)}),
+                 "[patch:1 name: n1 builtin: 0  " + out + "\n"},
+             Row{"both", withPorts(patch(1), {port(11)}, {port(12)}),
+                 "[patch:1 name: n1 builtin: 0  " + in + "\n  " + out + "\n"},
+             Row{"one child", patch(1, {patch(2)}),
+                 "[patch:1 name: n1 builtin: 0][patch:2 name: n2 builtin: 0]\n"},
+             Row{"child with a port", patch(1, {withPorts(patch(2), {port(11)}, {})}),
+                 "[patch:1 name: n1 builtin: 0][patch:2 name: n2 builtin: 0  " + in + "\n\n"},
+             Row{"connections after children",
+                 patch(1, {patch(2, {}, {{0, 3, 0, 4}})}, {{0, 1, 0, 2}}),
+                 "[patch:1 name: n1 builtin: 0][patch:2 name: n2 builtin: 0][connection:3->4]\n"
+                 "\n[connection:1->2]\n"},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(written(row.patch), row.text);
+    }
+}
+
+TEST(GraphText, OfADocumentIsItsGoldenText) {
+    std::ifstream file(TARN_TESTS_GOLDEN_DIR "/document.txt", std::ios::binary);
+    ASSERT_TRUE(file);
+    std::string const golden((std::istreambuf_iterator<char>(file)), {});
+    EXPECT_EQ(written(document()), golden);
+}
+
+TEST(GraphText, FlushesEveryLine) {
+    struct FlushCounter : std::stringbuf {
+        int flushes = 0;
+        int sync() override {
+            ++flushes;
+            return 0;
+        }
+    } buffer;
+    std::ostream stream(&buffer);
+    EXPECT_EQ(&(stream << document()), &stream);
+    std::string const text = buffer.str();
+    EXPECT_EQ(buffer.flushes, std::count(text.begin(), text.end(), '\n'));
+    EXPECT_EQ(&(stream << port(1)), &stream);
+    EXPECT_EQ(&(stream << Connection()), &stream);
+}
+
+namespace {
+
+// A random tree with few identifiers, so that they occur often and in many places.
+Patch randomPatch(tests::Random& random, int depth) {
+    auto const ports = [&] {
+        std::vector<Port> list;
+        for (std::size_t n = random.below(3); n > 0; --n) {
+            list.push_back(port(random.below(12), random.below(3)));
+        }
+        return list;
+    };
+    Patch result = withPorts(patch(random.below(12)), ports(), ports());
+    std::vector<Connection> connections;
+    for (std::size_t n = random.below(5); n > 0; --n) {
+        connections.push_back(
+            {random.below(4), random.below(12), random.below(4), random.below(12)});
+    }
+    result.connections = listOf(std::move(connections));
+    std::vector<Patch> children;
+    for (std::size_t n = depth > 0 ? random.below(4) : 0; n > 0; --n) {
+        children.push_back(random.below(4) == 0 && !children.empty()
+                               ? children.back()  // Shares all its lists.
+                               : randomPatch(random, depth - 1));
+    }
+    result.children = listOf(std::move(children));
+    return result;
+}
+
+// All patches of the tree in the order in which a search looks at them, by an explicit stack.
+template <class AnyPatch>
+std::vector<AnyPatch const*> searchOrder(AnyPatch const& root) {
+    std::vector<AnyPatch const*> order{&root};
+    std::vector<AnyPatch const*> toEnter{&root};
+    while (!toEnter.empty()) {
+        AnyPatch const* const next = toEnter.back();
+        toEnter.pop_back();
+        for (AnyPatch const& child : *next->children) order.push_back(&child);
+        for (auto child = next->children->rbegin(); child != next->children->rend(); ++child) {
+            toEnter.push_back(&*child);
+        }
+    }
+    return order;
+}
+
+template <class AnyPatch>
+AnyPatch const* modelFind(AnyPatch const& root, unsigned long long id) {
+    for (AnyPatch const* candidate : searchOrder(root)) {
+        if (id != 0 && candidate->id == id) return candidate;
+    }
+    return nullptr;
+}
+
+// The parents that a search for an output port enters, in order: depth first.
+std::vector<Patch const*> depthFirst(Patch const& root) {
+    std::vector<Patch const*> order;
+    std::vector<Patch const*> stack{&root};
+    while (!stack.empty()) {
+        Patch const* const next = stack.back();
+        stack.pop_back();
+        order.push_back(next);
+        for (auto child = next->children->rbegin(); child != next->children->rend(); ++child) {
+            stack.push_back(&*child);
+        }
+    }
+    return order;
+}
+
+Optional<Set> modelOutgoing(Patch const& root, unsigned long long portId) {
+    for (Patch const* parent : depthFirst(root)) {
+        bool const holds = std::any_of(
+            parent->children->begin(), parent->children->end(), [&](Patch const& child) {
+                return std::any_of(child.outputs->begin(), child.outputs->end(),
+                                   [&](Port const& p) { return p.id == portId; });
+            });
+        if (!holds) continue;
+        Set found;
+        std::copy_if(parent->connections->begin(), parent->connections->end(),
+                     std::inserter(found, found.end()),
+                     [&](Connection const& c) { return c.fromPortId == portId; });
+        return found;
+    }
+    return std::nullopt;
+}
+
+}  // namespace
+
+TEST(Queries, AgreeWithAModelOnRandomTrees) {
+    tests::Random random(33);
+    for (int i = 0; i < 2000; ++i) {
+        Patch const root = randomPatch(random, 4);
+        EvalPatch const evaluated(root);
+        for (unsigned long long id = 0; id < 13; ++id) {
+            ASSERT_EQ(findPatchRecursive(root, id), modelFind(root, id)) << id;
+            ASSERT_EQ(findPatchRecursive(evaluated, id), modelFind(evaluated, id)) << id;
+            Optional<Set> const expected = modelOutgoing(root, id);
+            Optional<Set> const actual = _findOutgoingConnectionsFromPort(root, id);
+            ASSERT_EQ(actual.hasValue(), expected.hasValue()) << id;
+            ASSERT_EQ(findOutgoingConnectionsFromPort(root, id), expected ? *expected : Set());
+        }
+    }
+}
+
+TEST(EvalPatch, AgreesWithItsPatchOnRandomTrees) {
+    tests::Random random(32);
+    for (int i = 0; i < 500; ++i) {
+        Patch const root = randomPatch(random, 4);
+        EvalPatch const evaluated(root);
+        std::vector<Patch const*> const patches = searchOrder(root);
+        std::vector<EvalPatch const*> const copies = searchOrder(evaluated);
+        ASSERT_EQ(patches.size(), copies.size());
+        for (std::size_t n = 0; n < patches.size(); ++n) {
+            ASSERT_EQ(copies[n]->id, patches[n]->id);
+            ASSERT_EQ(copies[n]->inputs->size(), patches[n]->inputs->size());
+            ASSERT_EQ(copies[n]->outputs->size(), patches[n]->outputs->size());
+        }
+        ASSERT_EQ(evaluated, EvalPatch(Patch(root)));
+    }
+}
+
+TEST(Patch, SurvivesFailingAllocations) {
+    Patch const source = document();
+    Patch const before = patch(9, {patch(8)});
+    Patch target = before;
+    EXPECT_GE(tests::failEachAllocation(
+                  [&] {
+                      Patch copy = source;
+                      copy.name.append(100, 'x');
+                      copy.attributes["key of some length, so that it allocates"] = "value";
+                      target = std::move(copy);
+                  },
+                  [&] { EXPECT_EQ(target, before); }),
+              3u);
+    EXPECT_EQ(target.children, source.children);
+    EXPECT_GT(tests::failEachAllocation([&] { EvalPatch const evaluated(source); },
+                                        [&] { EXPECT_EQ(source, document()); }),
+              20u);
+}
