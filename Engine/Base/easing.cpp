@@ -1,0 +1,244 @@
+#include <Engine/Base/easing.h>
+
+#include <Engine/Base/truncate.h>
+
+#include <array>
+#include <cmath>
+
+namespace tarn::engine {
+
+namespace {
+
+constexpr std::array<char const*, 13> kNames{
+    "Linear",        "Quadratic In",   "Quadratic Out",    "Quadratic In-Out", "Cubic In",
+    "Cubic Out",     "Cubic In-Out",   "Exponential In",   "Exponential Out",  "Exponential In-Out",
+    "Sinusoidal In", "Sinusoidal Out", "Sinusoidal In-Out"};
+static_assert(kNames.size() == std::size_t(EasingFunction::SinusoidalInOut) + 1);
+
+// 2^-10 is where the exponential curves would start; the rest rescales them to start at 0.
+constexpr double kExponentialOffset = 0.0009765625;       // 2^-10
+constexpr double kExponentialRange = 0.9990234375;        // 1 - 2^-10
+constexpr double kExponentialScale = 1.0009775171065494;  // 1024 / 1023
+constexpr double kExponent = 10.0;
+constexpr double kHalfPi = 1.5707963267948966;
+constexpr double kPi = 3.141592653589793;
+
+double cube(double x) { return std::pow(x, 3.0); }
+
+// The rising half of the exponential curve, as a factor, and the falling one's power.
+double exponentialIn(double t) {
+    return (std::exp2((t - 1.0) * kExponent) - kExponentialOffset) / kExponentialRange;
+}
+double exponentialOut(double t) { return 1.0 - std::exp2(t * -kExponent); }
+
+// b - a in 64 bits, wrapping around.
+long long difference(long long b, long long a) {
+    return static_cast<long long>(static_cast<unsigned long long>(b) -
+                                  static_cast<unsigned long long>(a));
+}
+
+// What a curve gives for each component: `formula(a, delta)`, with `a` the start and `delta` the
+// way to the end. Whatever depends on progress alone is computed before, once for all components.
+template <class Formula>
+double eachComponent(double from, double to, Formula formula) {
+    return formula(from, to - from);
+}
+template <class Formula>
+FloatVec2 eachComponent(FloatVec2 from, FloatVec2 to, Formula formula) {
+    return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y)};
+}
+template <class Formula>
+FloatVec3 eachComponent(FloatVec3 from, FloatVec3 to, Formula formula) {
+    return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y),
+            formula(from.z, to.z - from.z)};
+}
+template <class Formula>
+FloatVec4 eachComponent(FloatVec4 from, FloatVec4 to, Formula formula) {
+    return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y),
+            formula(from.z, to.z - from.z), formula(from.w, to.w - from.w)};
+}
+template <class Formula>
+long long eachComponent(long long from, long long to, Formula formula) {
+    return truncate<long long>(
+        formula(static_cast<double>(from), static_cast<double>(difference(to, from))));
+}
+
+template <class T>
+T exponentialInOut(T from, T to, double t) {
+    if (t == 0.0 || t == 1.0) return t == 0.0 ? from : to;
+    T const middle =
+        eachComponent(from, to, [](double a, double delta) { return delta * 0.5 + a; });
+    double const u = 2.0 * t;
+    if (u < 1.0) {
+        if (u == 0.0) return from;
+        double const factor = exponentialIn(u);
+        return eachComponent(from, middle,
+                             [=](double a, double delta) { return a + factor * delta; });
+    }
+    double const v = u - 1.0;
+    if (v == 1.0) return to;
+    double const factor = exponentialOut(v);
+    return eachComponent(
+        middle, to, [=](double a, double delta) { return factor * delta * kExponentialScale + a; });
+}
+
+template <class T>
+T easeAlong(EasingFunction function, T from, T to, double t) {
+    double const u = 2.0 * t;
+    switch (function) {
+        case EasingFunction::Linear:
+            return eachComponent(from, to, [=](double a, double delta) { return a + delta * t; });
+        case EasingFunction::QuadraticIn:
+            return eachComponent(from, to,
+                                 [=](double a, double delta) { return a + delta * t * t; });
+        case EasingFunction::QuadraticOut:
+            return eachComponent(
+                from, to, [=](double a, double delta) { return a - (t - 2.0) * (delta * t); });
+        case EasingFunction::QuadraticInOut: {
+            if (u < 1.0) {
+                double const factor = u * u;
+                return eachComponent(
+                    from, to, [=](double a, double delta) { return a + factor * (delta * 0.5); });
+            }
+            double const v = u - 1.0;
+            double const factor = (v - 2.0) * v - 1.0;
+            return eachComponent(
+                from, to, [=](double a, double delta) { return a + factor * (delta * -0.5); });
+        }
+        case EasingFunction::CubicIn: {
+            double const factor = cube(t);
+            return eachComponent(from, to,
+                                 [=](double a, double delta) { return a + factor * delta; });
+        }
+        case EasingFunction::CubicOut: {
+            double const factor = cube(t - 1.0) + 1.0;
+            return eachComponent(from, to,
+                                 [=](double a, double delta) { return a + factor * delta; });
+        }
+        case EasingFunction::CubicInOut: {
+            double const factor = u < 1.0 ? cube(u) : cube(u - 2.0) + 2.0;
+            return eachComponent(
+                from, to, [=](double a, double delta) { return a + factor * (delta * 0.5); });
+        }
+        case EasingFunction::ExponentialIn: {
+            if (t == 0.0) return from;
+            double const factor = exponentialIn(t);
+            return eachComponent(from, to,
+                                 [=](double a, double delta) { return a + factor * delta; });
+        }
+        case EasingFunction::ExponentialOut: {
+            if (t == 1.0) return to;
+            double const factor = exponentialOut(t);
+            return eachComponent(from, to, [=](double a, double delta) {
+                return a + factor * delta * kExponentialScale;
+            });
+        }
+        case EasingFunction::ExponentialInOut: return exponentialInOut(from, to, t);
+        case EasingFunction::SinusoidalIn: {
+            double const factor = std::cos(t * kHalfPi);
+            return eachComponent(
+                from, to, [=](double a, double delta) { return a + (delta - factor * delta); });
+        }
+        case EasingFunction::SinusoidalOut: {
+            double const factor = std::sin(t * kHalfPi);
+            return eachComponent(from, to,
+                                 [=](double a, double delta) { return a + factor * delta; });
+        }
+        case EasingFunction::SinusoidalInOut: {
+            double const factor = std::cos(t * kPi) - 1.0;
+            return eachComponent(
+                from, to, [=](double a, double delta) { return a + factor * (delta * -0.5); });
+        }
+    }
+    return from;  // An enumerator out of range: stay at the start.
+}
+
+}  // namespace
+
+std::vector<std::string> easingFunctionNames() {
+    return std::vector<std::string>(kNames.begin(), kNames.end());
+}
+
+template <>
+double ease(EasingFunction function, double from, double to, double t) {
+    return easeAlong(function, from, to, t);
+}
+template <>
+FloatVec2 ease(EasingFunction function, FloatVec2 from, FloatVec2 to, double t) {
+    return easeAlong(function, from, to, t);
+}
+template <>
+FloatVec3 ease(EasingFunction function, FloatVec3 from, FloatVec3 to, double t) {
+    return easeAlong(function, from, to, t);
+}
+template <>
+FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 to, double t) {
+    return easeAlong(function, from, to, t);
+}
+
+// Where the other forms negate the difference, this one takes it the other way round: that is
+// not the same where it wraps around.
+template <>
+long long ease(EasingFunction function, long long from, long long to, double t) {
+    double const a = static_cast<double>(from);
+    double const delta = static_cast<double>(difference(to, from));
+    double const back = static_cast<double>(difference(from, to));
+    double const u = 2.0 * t;
+    double const v = u - 1.0;
+    if (function == EasingFunction::QuadraticOut) {
+        return truncate<long long>((t - 2.0) * (back * t) + a);
+    }
+    if (function == EasingFunction::QuadraticInOut && !(u < 1.0)) {
+        return truncate<long long>(a + ((v - 2.0) * v - 1.0) * (back * 0.5));
+    }
+    if (function == EasingFunction::SinusoidalIn) {
+        return truncate<long long>(a + (delta + std::cos(t * kHalfPi) * back));
+    }
+    if (function == EasingFunction::SinusoidalInOut) {
+        return truncate<long long>(a + (std::cos(t * kPi) - 1.0) * (back * 0.5));
+    }
+    return easeAlong(function, from, to, t);
+}
+
+template <>
+double easeExponentialInOut(double from, double to, double t) {
+    return exponentialInOut(from, to, t);
+}
+template <>
+long long easeExponentialInOut(long long from, long long to, double t) {
+    return exponentialInOut(from, to, t);
+}
+template <>
+FloatVec2 easeExponentialInOut(FloatVec2 from, FloatVec2 to, double t) {
+    return exponentialInOut(from, to, t);
+}
+template <>
+FloatVec3 easeExponentialInOut(FloatVec3 from, FloatVec3 to, double t) {
+    return exponentialInOut(from, to, t);
+}
+template <>
+FloatVec4 easeExponentialInOut(FloatVec4 from, FloatVec4 to, double t) {
+    return exponentialInOut(from, to, t);
+}
+
+Value ease(EasingFunction function, Value from, Value to, double t) {
+    switch (to.type()) {
+        case Type::Float: return ease<double>(function, from, to, t);
+        case Type::Vec2: return ease<FloatVec2>(function, from, to, t);
+        case Type::Vec3: return ease<FloatVec3>(function, from, to, t);
+        case Type::Vec4: return ease<FloatVec4>(function, from, to, t);
+        case Type::Int: return ease<long long>(function, from, to, t);
+        case Type::Mat4:
+        case Type::Boolean:
+        case Type::Image:
+        case Type::Video:
+        case Type::Sound:
+        case Type::Path:
+        case Type::String:
+        case Type::Model:
+        case Type::Unstructured: break;
+    }
+    return Value();
+}
+
+}  // namespace tarn::engine

@@ -1,0 +1,80 @@
+// Engine/Base/easing.h: curves between two numbers, vectors or values.
+//
+//     double y = ease(EasingFunction::CubicOut, 0.0, 100.0, 0.5);  // 87.5
+
+#ifndef TARN_ENGINE_BASE_EASING_H
+#define TARN_ENGINE_BASE_EASING_H
+
+#include <Engine/Base/export.h>
+#include <Engine/Base/value.h>
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace tarn::engine {
+
+enum class EasingFunction : std::int32_t {
+    Linear = 0,
+    QuadraticIn = 1,
+    QuadraticOut = 2,
+    QuadraticInOut = 3,
+    CubicIn = 4,
+    CubicOut = 5,
+    CubicInOut = 6,
+    ExponentialIn = 7,
+    ExponentialOut = 8,
+    ExponentialInOut = 9,
+    SinusoidalIn = 10,
+    SinusoidalOut = 11,
+    SinusoidalInOut = 12,
+};
+
+/// The names that an editor shows, "Linear" to "Sinusoidal In-Out", at their enumerator's
+/// position. A new list at every call.
+TARN_ENGINE_BASE_EXPORT std::vector<std::string> easingFunctionNames();
+
+/// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
+/// `FloatVec3` and `FloatVec4`; other types do not compile.
+///
+/// `t` is progress: 0 at `from`, 1 at `to`. Not clamped, so 1.5 overshoots. Exponential curves
+/// give exactly the ends there, since they are rescaled to meet them and tested for equality. A NaN
+/// gives NaN. An enumerator out of range gives `from`.
+///
+/// Vectors are eased component by component. Integers are eased in double precision, cut towards
+/// zero and kept in range (a NaN is 0); their difference wraps around modulo 2^64.
+template <class T>
+T ease(EasingFunction function, T from, T to, double t) = delete;
+template <>
+TARN_ENGINE_BASE_EXPORT double ease<double>(EasingFunction, double, double, double);
+template <>
+TARN_ENGINE_BASE_EXPORT long long ease<long long>(EasingFunction, long long, long long, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec2 ease<FloatVec2>(EasingFunction, FloatVec2, FloatVec2, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
+
+/// `EasingFunction::ExponentialInOut`, by itself, for the same types: the in curve up to the
+/// midpoint (for integers cut towards zero) and the out curve from there.
+template <class T>
+T easeExponentialInOut(T from, T to, double t) = delete;
+template <>
+TARN_ENGINE_BASE_EXPORT double easeExponentialInOut<double>(double, double, double);
+template <>
+TARN_ENGINE_BASE_EXPORT long long easeExponentialInOut<long long>(long long, long long, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec2 easeExponentialInOut<FloatVec2>(FloatVec2, FloatVec2, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec3 easeExponentialInOut<FloatVec3>(FloatVec3, FloatVec3, double);
+template <>
+TARN_ENGINE_BASE_EXPORT FloatVec4 easeExponentialInOut<FloatVec4>(FloatVec4, FloatVec4, double);
+
+/// The same between values. The type of `to` decides: both ends are read as that type, and so is
+/// the result. Only numbers and vectors are eased; for every other type the result is 0.0.
+TARN_ENGINE_BASE_EXPORT Value ease(EasingFunction function, Value from, Value to, double t);
+
+}  // namespace tarn::engine
+
+#endif
