@@ -1,0 +1,140 @@
+#include "evaluator.h"
+
+#include "kinds.h"
+
+#include <algorithm>
+#include <set>
+#include <unordered_map>
+
+using namespace tarn::engine;
+
+Evaluator::Evaluator(Document const& evaluatedDocument)
+    : document(evaluatedDocument),
+      evaluatedRoot(document.root),
+      top(plan(document.root, evaluatedRoot)) {}
+
+void Evaluator::evaluate(long long frame) { run(*top, frame); }
+
+// The lists of the evaluation form never change their lengths here: pointers into them last.
+std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch& evaluated) {
+    auto level = std::make_shared<Level>(Level{&evaluated, {}});
+    for (std::size_t const i : order(patch)) {
+        Patch const& child = patch.children->at(i);
+        EvalPatch& evaluatedChild = evaluated.children->at(i);
+        Step step{&evaluatedChild, {}, nullptr};
+        // A patch of unknown kind hands its inputs' defaults on: nothing takes their place.
+        for (Port const& input : *child.inputs) {
+            if (child.builtin == kUnknownKind) break;
+            Optional<Connection> const incoming = findIncomingConnectionToPort(patch, input.id);
+            step.sources.push_back(incoming ? findOutputPort(evaluated, incoming->fromPortId)
+                                            : nullptr);
+        }
+        if (!child.children->empty()) step.inside = plan(child, evaluatedChild);
+        level->steps.push_back(std::move(step));
+    }
+    return level;
+}
+
+// The positions of the children, sources first; those in a circle last, as they stand.
+std::vector<std::size_t> Evaluator::order(Patch const& patch) {
+    std::vector<Patch> const& children = *patch.children;
+    std::unordered_map<unsigned long long, std::size_t> positions;
+    for (std::size_t i = 0; i < children.size(); ++i) positions.emplace(children[i].id, i);
+
+    std::vector<std::vector<std::size_t>> followers(children.size());
+    std::vector<std::size_t> waitingFor(children.size(), 0);
+    for (Connection const& connection : *patch.connections) {
+        std::size_t const to = positions.at(connection.toPatchId);
+        followers[positions.at(connection.fromPatchId)].push_back(to);
+        ++waitingFor[to];
+    }
+
+    std::set<std::size_t> ready;
+    for (std::size_t i = 0; i < children.size(); ++i) {
+        if (waitingFor[i] == 0) ready.insert(i);
+    }
+    std::vector<std::size_t> result;
+    while (!ready.empty()) {
+        std::size_t const next = *ready.begin();
+        ready.erase(ready.begin());
+        result.push_back(next);
+        for (std::size_t const follower : followers[next]) {
+            if (--waitingFor[follower] == 0) ready.insert(follower);
+        }
+    }
+    for (std::size_t i = 0; i < children.size(); ++i) {
+        if (waitingFor[i] != 0) result.push_back(i);
+    }
+    return result;
+}
+
+void Evaluator::run(Level const& level, long long frame) const {
+    for (Step const& step : level.steps) {
+        EvalPatch& patch = *step.patch;
+        for (std::size_t i = 0; i < step.sources.size(); ++i) {
+            if (step.sources[i] != nullptr) patch.inputs->at(i).values = step.sources[i]->values;
+        }
+        if (patch.builtin == kGroupInputKind) {
+            for (EvalPort& output : *patch.outputs) {
+                EvalPort const* const port = inPortForTag(*level.group, output.tag);
+                if (port != nullptr) output.values = port->values;
+            }
+        } else if (patch.builtin == kGroupOutputKind) {
+            for (EvalPort const& input : *patch.inputs) {
+                for (EvalPort& port : *level.group->outputs) {
+                    if (port.tag == input.tag) port.values = input.values;
+                }
+            }
+        } else if (step.inside) {
+            run(*step.inside, frame);
+        } else {
+            compute(patch, frame);
+        }
+    }
+}
+
+void Evaluator::compute(EvalPatch& patch, long long frame) const {
+    std::vector<EvalPort> const& inputs = *patch.inputs;
+    std::vector<EvalPort>& outputs = *patch.outputs;
+    Kind const* const kind = kindByNumber(patch.builtin);
+    if (kind == nullptr || kind->evaluate == nullptr) {
+        for (std::size_t i = 0; i < std::min(inputs.size(), outputs.size()); ++i) {
+            outputs[i].values = {inputs[i].values.front().asType(outputs[i].typeInfo.type)};
+        }
+        return;
+    }
+
+    std::size_t iterations = 1;
+    for (EvalPort const& input : inputs) iterations = std::max(iterations, input.values.size());
+
+    Value const absent;
+    std::vector<Value> values(inputs.size());
+    std::vector<Loop> results(outputs.size());
+    auto const in = [&](unsigned long long tag) -> Value const& {
+        for (std::size_t i = 0; i < inputs.size(); ++i) {
+            if (inputs[i].tag == tag) return values[i];
+        }
+        return absent;
+    };
+    auto const outType = [&](unsigned long long tag) {
+        EvalPort const* const port = outPortForTag(patch, tag);
+        return port != nullptr ? port->typeInfo.type : Type::Float;
+    };
+    auto const out = [&](unsigned long long tag, Value value) {
+        for (std::size_t i = 0; i < outputs.size(); ++i) {
+            if (outputs[i].tag != tag || results[i].size() >= kLongestLoop) continue;
+            results[i].push_back(value.asType(outputs[i].typeInfo.type));
+        }
+    };
+    for (std::size_t index = 0; index < iterations; ++index) {
+        for (std::size_t i = 0; i < inputs.size(); ++i) {
+            // Cast to the port's bounds first, then read as the port's type.
+            TypeInfo const& typeInfo = inputs[i].typeInfo;
+            values[i] = indexLoopCasting(inputs[i].values, typeInfo, index).asType(typeInfo.type);
+        }
+        kind->evaluate({{frame, document.framesPerSecond}, in, values, outType, out});
+    }
+    for (std::size_t i = 0; i < outputs.size(); ++i) {
+        if (!results[i].empty()) outputs[i].values = std::move(results[i]);
+    }
+}

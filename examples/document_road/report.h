@@ -1,0 +1,26 @@
+// What the program prints, as texts.
+
+#ifndef DOCUMENT_ROAD_REPORT_H
+#define DOCUMENT_ROAD_REPORT_H
+
+#include "document.h"
+#include "evaluator.h"
+
+#include <functional>
+#include <string>
+
+// How many patches, ports and connections there are, and of which types; what was left out.
+std::string countsText(Document const& document);
+
+// What a patch (a port) is, where it belongs, and what it is connected to. Empty where no patch
+// (port) has the identifier.
+std::string patchText(Document const& document, unsigned long long id);
+std::string portText(Document const& document, unsigned long long id);
+
+// One row for each `every`-th of the frames 0 to `frames` - 1, one column for each of the root's
+// outputs, or for each output without a connection where the root has none. `progress` is called
+// before each frame.
+std::string framesText(Document const& document, long long frames, long long every,
+                       std::function<void(long long frame)> const& progress);
+
+#endif

@@ -1,0 +1,464 @@
+// The example program, as its users run it: what it prints, and what it says to bad input.
+
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <sstream>
+#include <string>
+
+#include <sys/wait.h>
+
+namespace {
+
+struct Outcome {
+    int status;
+    std::string output;
+    std::string errors;
+};
+
+std::string contentsOf(std::filesystem::path const& file) {
+    std::ifstream stream(file, std::ios::binary);
+    return std::string((std::istreambuf_iterator<char>(stream)), {});
+}
+
+class DocumentRoad : public testing::Test {
+protected:
+    DocumentRoad() {
+        std::string name = testing::TempDir() + "document_road_XXXXXX";
+        folder = mkdtemp(name.data());
+    }
+    ~DocumentRoad() override { std::filesystem::remove_all(folder); }
+
+    std::string write(std::string const& name, std::string const& contents) const {
+        std::ofstream(folder / name, std::ios::binary) << contents;
+        return (folder / name).string();
+    }
+
+    Outcome run(std::string const& arguments) const {
+        std::string const command = TARN_DOCUMENT_ROAD " " + arguments + " > " +
+                                    (folder / "out").string() + " 2> " + (folder / "err").string();
+        int const status = std::system(command.c_str());
+        return {WEXITSTATUS(status), contentsOf(folder / "out"), contentsOf(folder / "err")};
+    }
+
+    std::filesystem::path folder;
+};
+
+std::string const kDocuments = TARN_DOCUMENTS_DIR "/";
+
+// A document of a root and one child, with holes for what is to be wrong.
+std::string document(std::string const& child, std::string const& connections = "[]") {
+    return R"({"root":{"id":1,"children":[)" + child + R"(],"connections":)" + connections + "}}";
+}
+
+std::string port(std::string const& members) {
+    return document(R"({"id":2,"inputs":[{"id":3,)" + members + "}]}");
+}
+
+std::string graph(std::string const& nodes, std::string const& links = "[]") {
+    return R"({"nodes":)" + nodes + R"(,"links":)" + links + "}";
+}
+
+}  // namespace
+
+TEST_F(DocumentRoad, PrintsTheBundledDocuments) {
+    struct Row {
+        char const* arguments;
+        char const* golden;
+    };
+    for (Row const& row : {
+             Row{"small.json --frames 5", "small_frames.txt"},
+             Row{"small.json --frames 0 --debug", "small_debug.txt"},
+             Row{"animation.json", "animation_frames.txt"},
+             Row{"animation.json --frames 25 --every 6", "animation_every_6.txt"},
+             Row{"animation.json --frames 0 --debug", "animation_debug.txt"},
+             Row{"animation.json --frames 0 --patch 6 --port 651", "animation_patch_6.txt"},
+             Row{"animation.json --frames 0 --patch 1 --port 603", "animation_patch_1.txt"},
+             Row{"node_graph.json --frames 3", "node_graph_frames.txt"},
+             Row{"node_graph.json --frames 0 --patch 7 --port 13", "node_graph_patch_7.txt"},
+         }) {
+        SCOPED_TRACE(row.arguments);
+        Outcome const outcome = run(kDocuments + row.arguments);
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_EQ(outcome.errors, "");
+        EXPECT_EQ(outcome.output, contentsOf(std::string(TARN_TESTS_GOLDEN_DIR "/") + row.golden));
+        EXPECT_NE(outcome.output, "");
+    }
+}
+
+TEST_F(DocumentRoad, RefusesBadInputInOneLine) {
+    std::string const float2 = R"({"id":2,"outputs":[{"id":3,"type":"float"}]})";
+    struct Row {
+        char const* what;
+        std::string contents;
+        std::string line;
+    };
+    for (Row const& row : {
+             Row{"empty", "", "it is empty"},
+             Row{"blank", " \n\t\n", "it is empty"},
+             Row{"truncated", "{\"root\":\n {\"id\": 1,",
+                 "line 2, column 11: the JSON ends too early"},
+             Row{"truncated text", "{\"root", "line 1, column 7: the JSON ends too early"},
+             Row{"no JSON", "{\"root\": nonsense}", "line 1, column 11: this is not valid JSON"},
+             Row{"two documents", "{}{}", "line 1, column 3: this is not valid JSON"},
+             Row{"bytes", std::string("\x80\xff\0", 3), "line 1, column 1: this is not valid JSON"},
+             Row{"an array", "[]", "the document: expected an object, found array"},
+             Row{"another object", "{}",
+                 "the document: neither a document (it has no \"root\") nor a node graph (it has "
+                 "no "
+                 "\"nodes\")"},
+             Row{"huge integer", "{\"root\":\n  18446744073709551616}",
+                 "line 2, column 3: a number beyond 64 bits"},
+             Row{"huge negative integer", "[-9223372036854775809]",
+                 "line 1, column 2: a number beyond 64 bits"},
+             Row{"huge double", "[1, 1e400]", "line 1, column 5: a number beyond 64 bits"},
+             Row{"deep", std::string(1001, '['), "line 1, column 1001: nested deeper than 1000"},
+             Row{"deep maps",
+                 [] {
+                     std::string text;
+                     for (int i = 0; i < 1001; ++i) text += "{\"a\":\n";
+                     return text;
+                 }(),
+                 "line 1001, column 1: nested deeper than 1000"},
+             Row{"root is a text", R"({"root":"x"})",
+                 "/root: expected an object, found string \"x\""},
+             Row{"no identifier", R"({"root":{}})", "/root: \"id\" is missing"},
+             Row{"identifier 0", R"({"root":{"id":0}})",
+                 "/root/id: the identifier 0 stands for nothing; identifiers start at 1"},
+             Row{"negative identifier", R"({"root":{"id":-1}})",
+                 "/root/id: expected an identifier, an integer from 1 on, found number -1"},
+             Row{"identifier is a double", R"({"root":{"id":1.5}})",
+                 "/root/id: expected an identifier, an integer from 1 on, found number 1.5"},
+             Row{"identifier is null", R"({"root":{"id":null}})",
+                 "/root/id: expected an identifier, an integer from 1 on, found null"},
+             Row{"duplicate patch", document(R"({"id":1})"),
+                 "/root/children/0/id: the patch identifier 1 is used twice"},
+             Row{"duplicate port",
+                 document(R"({"id":2,"inputs":[{"id":3,"type":"int"},{"id":3,"type":"int"}]})"),
+                 "/root/children/0/inputs/1/id: the port identifier 3 is used twice"},
+             Row{"unknown key", document(R"({"id":2,"a/b~c":1})"),
+                 "/root/children/0: unknown key \"a/b~c\""},
+             Row{"unknown kind", document(R"({"id":2,"kind":"blur"})"),
+                 "/root/children/0/kind: unknown kind \"blur\""},
+             Row{"unknown value type", port(R"("type":"Float")"),
+                 "/root/children/0/inputs/0/type: unknown value type \"Float\""},
+             Row{"no value type", port(R"("name":"x")"),
+                 "/root/children/0/inputs/0: \"type\" is missing"},
+             Row{"name is a number", port(R"("type":"int","name":5)"),
+                 "/root/children/0/inputs/0/name: expected a text, found number 5"},
+             Row{"children is a text", R"({"root":{"id":1,"children":"x"}})",
+                 "/root/children: expected an array, found string \"x\""},
+             Row{"float default", port(R"("type":"float","default":"5")"),
+                 "/root/children/0/inputs/0/default: expected a number, found string \"5\""},
+             Row{"int default", port(R"("type":"int","default":5.5)"),
+                 "/root/children/0/inputs/0/default: expected an integer, found number 5.5"},
+             Row{"int default too large", port(R"("type":"int","default":9223372036854775808)"),
+                 "/root/children/0/inputs/0/default: an integer beyond the signed 64 bits"},
+             Row{"boolean default", port(R"("type":"boolean","default":1)"),
+                 "/root/children/0/inputs/0/default: expected true or false, found number 1"},
+             Row{"vector default", port(R"("type":"vec2","default":[1,2,3])"),
+                 "/root/children/0/inputs/0/default: expected 2 numbers, found 3"},
+             Row{"vector element", port(R"("type":"vec2","default":[1,"2"])"),
+                 "/root/children/0/inputs/0/default/1: expected a number, found string \"2\""},
+             Row{"image default", port(R"("type":"image","default":0)"),
+                 "/root/children/0/inputs/0/default: the identifier 0 stands for nothing; "
+                 "identifiers "
+                 "start at 1"},
+             Row{"path instruction", port(R"("type":"path","default":[["jumpTo",1,2]])"),
+                 "/root/children/0/inputs/0/default/0/0: unknown path instruction \"jumpTo\""},
+             Row{"path coordinates", port(R"("type":"path","default":[["moveTo",1]])"),
+                 "/root/children/0/inputs/0/default/0: moveTo takes 2 coordinates"},
+             Row{"path element", port(R"("type":"path","default":[[]])"),
+                 "/root/children/0/inputs/0/default/0: a path element begins with its name"},
+             Row{"min", port(R"("type":"float","min":null,"max":[])"),
+                 "/root/children/0/inputs/0/max: expected a number, found array"},
+             Row{"attributes", document(R"({"id":2,"attributes":[]})"),
+                 "/root/children/0/attributes: expected an object, found array"},
+             Row{"model layer", R"({"root":{"id":1,"modelLayer":{"id":1,"children":[{}]}}})",
+                 "/root/modelLayer/children/0: \"id\" is missing"},
+             Row{"frame rate", R"({"framesPerSecond":0,"root":{"id":1}})",
+                 "/framesPerSecond: expected a number above 0"},
+             Row{"connection from no patch", document(float2, R"([{"from":[9,3],"to":[2,3]}])"),
+                 "/root/connections/0/from: there is no patch 9 beside the connection"},
+             Row{"connection from no port", document(float2, R"([{"from":[2,9],"to":[2,3]}])"),
+                 "/root/connections/0/from: patch 2 has no output port 9"},
+             Row{"connection to no port", document(float2, R"([{"from":[2,3],"to":[2,3]}])"),
+                 "/root/connections/0/to: patch 2 has no input port 3"},
+             Row{"connection's end", document(float2, R"([{"from":[2],"to":[2,3]}])"),
+                 "/root/connections/0/from: expected [patch, port]"},
+             Row{"a terminal's escape", R"({"root":{"id":1,"kind":"\u001b[31m\n"}})",
+                 "/root/kind: unknown kind \"\\x1b[31m\\n\""},
+             Row{"graph: nodes", R"({"nodes":{}})", "/nodes: expected an array, found object"},
+             Row{"graph: node", graph("[5]"), "/nodes/0: expected an object, found number 5"},
+             Row{"graph: no type", graph(R"([{"id":1}])"), "/nodes/0: \"type\" is missing"},
+             Row{"graph: identifier 0", graph(R"([{"id":0,"type":"x"}])"),
+                 "/nodes/0/id: the identifier 0 stands for nothing"},
+             Row{"graph: text identifier", graph(R"([{"id":"1","type":"x"}])"),
+                 "/nodes/0/id: expected an integer, found string \"1\""},
+             Row{"graph: duplicate", graph(R"([{"id":1,"type":"x"},{"id":1,"type":"x"}])"),
+                 "/nodes/1/id: the node identifier 1 is used twice"},
+             Row{"graph: properties", graph(R"([{"id":1,"type":"x","properties":[]}])"),
+                 "/nodes/0/properties: expected an object, found array"},
+             Row{"graph: order", graph(R"([{"id":1,"type":"x","order":"first"}])"),
+                 "/nodes/0/order: expected an integer, found string \"first\""},
+             Row{"graph: inputs", graph(R"([{"id":1,"type":"x","inputs":5}])"),
+                 "/nodes/0/inputs: expected an array, found number 5"},
+             Row{"graph: port type", graph(R"([{"id":1,"type":"x","inputs":[{"type":true}]}])"),
+                 "/nodes/0/inputs/0/type: expected a text, a number or a list"},
+             Row{"graph: link", graph("[]", "[[1,2]]"),
+                 "/links/0: expected [id, from node, from slot, to node, to slot, type]"},
+             Row{"graph: link's node", graph("[]", R"([[1,"2",0,3,0,"x"]])"),
+                 "/links/0/1: expected an integer, found string \"2\""},
+             Row{"graph: subgraph",
+                 graph(R"([{"id":1,"type":"x","subgraph":{"nodes":[{"id":5}]}}])"),
+                 "/nodes/0/subgraph/nodes/0: \"type\" is missing"},
+         }) {
+        SCOPED_TRACE(row.what);
+        std::string const file = write("bad.json", row.contents);
+        Outcome const outcome = run(file + " --debug");
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_EQ(outcome.errors, "document_road: " + file + ": " + row.line + "\n");
+    }
+}
+
+TEST_F(DocumentRoad, RefusesWhatIsNoFile) {
+    struct Row {
+        std::string file;
+        char const* line;
+    };
+    for (Row const& row : {
+             Row{(folder / "missing.json").string(), "there is no such file"},
+             Row{folder.string(), "it is a folder"},
+         }) {
+        Outcome const outcome = run(row.file);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_EQ(outcome.errors, "document_road: " + row.file + ": " + row.line + "\n");
+    }
+}
+
+TEST_F(DocumentRoad, RefusesAHundredMegabytesOfBracketsAtOnce) {
+    for (char bracket : {'[', '{'}) {
+        std::string const file = write("brackets.json", std::string(100 << 20, bracket));
+        Outcome const outcome = run(file);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_EQ(outcome.errors,
+                  "document_road: " + file + ": line 1, column 1001: nested deeper than 1000\n");
+    }
+}
+
+TEST_F(DocumentRoad, RefusesIdentifiersAndOptionsThatItDoesNotKnow) {
+    struct Row {
+        char const* arguments;
+        char const* line;
+    };
+    for (Row const& row : {
+             Row{"--patch 99", "no patch 99"},
+             Row{"--patch 0", "no patch 0"},
+             Row{"--port 99", "no port 99"},
+         }) {
+        Outcome const outcome = run(kDocuments + "small.json " + row.arguments);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_EQ(outcome.errors,
+                  "document_road: " + kDocuments + "small.json: " + row.line + "\n");
+    }
+    for (char const* arguments :
+         {"", "--frames -1 x.json", "--every 0 x.json", "--unknown x.json"}) {
+        SCOPED_TRACE(arguments);
+        Outcome const outcome = run(arguments);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_NE(outcome.errors, "");
+    }
+    Outcome const help = run("--help");
+    EXPECT_EQ(help.status, 0);
+    for (char const* option : {"FILE", "--debug", "--patch", "--port", "--frames", "--every"}) {
+        EXPECT_NE(help.output.find(option), std::string::npos) << option;
+    }
+}
+
+TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
+    std::string const file = write(
+        "graph.json",
+        graph(R"([{"id":5,"type":"basic/const","outputs":[{"name":"value","type":"number"}],
+                   "properties":{"value":"2.5"},"widgets":[1]},
+                  {"id":-3,"type":"odd","inputs":[{"type":0},{"type":-1,"shape":7}],"outputs":null},
+                  {"id":6,"type":"nested","subgraph":{"nodes":[{"id":5,"type":"x"}],"extra":1}}])",
+              R"([[1,5,0,-3,0,0],null,[2,5,1,-3,0,0],[3,5,0,-3,2,0],[4,8,0,5,0,0],[5,5,0,8,0,0],
+                  {"id":6,"origin_id":5,"origin_slot":-1,"target_id":-3,"target_slot":0}])"));
+    Outcome const outcome = run(file + " --frames 1 --patch 5 --port 3");
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.errors, "");
+    EXPECT_EQ(outcome.output, "read a node graph: 5 patches in 3 levels, 3 ports, 1 connections\n"
+                              "ports: 1 Numbers, 1 Pulses, 1 Unstructured\n"
+                              "not implemented, inputs' defaults handed on: odd x\n"
+                              "/links/2: link 2 left out: there is no output 1 of node 5\n"
+                              "/links/3: link 3 left out: there is no input 2 of node -3\n"
+                              "/links/4: link 4 left out: there is no node 8\n"
+                              "/links/5: link 5 left out: there is no node 8\n"
+                              "/links/6: link 6 left out: there is no output -1 of node 5\n"
+                              "\n"
+                              "patch 5 \"basic/const\", constant (basic/const)\n"
+                              "  in: patch 3 \"graph\", group\n"
+                              "  output port 1 \"value\", Number [type: float], default 2.5\n"
+                              "  children: 0\n"
+                              "  attributes: properties widgets\n"
+                              "  incoming:\n"
+                              "    none\n"
+                              "  outgoing:\n"
+                              "    [connection:1->2] from patch 5 to patch 1\n"
+                              "\n"
+                              "input port 3 \"\", Pulse [type: boolean], default 0\n"
+                              "  of: patch 1 \"odd\", unknown (odd)\n"
+                              "  tag: 2\n"
+                              "  attributes: shape type\n"
+                              "  incoming:\n"
+                              "    none\n"
+                              "\n"
+                              "frame\n"
+                              "0\n");
+}
+
+TEST_F(DocumentRoad, EvaluatesEveryKind) {
+    // The outputs of each kind from constant inputs, as the table of frame 3 shows them.
+    struct Row {
+        char const* kind;
+        char const* inputs;
+        char const* outputs;
+        char const* row;
+    };
+    for (
+        Row const& row : {
+            Row{"time", "", R"({"id":51,"type":"float"},{"id":52,"type":"int"})", "3  0.5  3"},
+            Row{"constant",
+                R"({"id":3,"type":"string","default":"a"},{"id":4,"type":"int","default":7})",
+                R"({"id":51,"type":"string"},{"id":52,"type":"int"})", "3  a  7"},
+            Row{"ease",
+                R"({"id":3,"type":"float","default":0},{"id":4,"type":"float","default":100},
+                    {"id":5,"type":"float","default":0.5},{"id":6,"type":"string","default":"Cubic Out"})",
+                R"({"id":51,"type":"float"})", "3  87.5"},
+            Row{"ease",
+                R"({"id":3,"type":"float","default":0},{"id":4,"type":"float","default":8},
+                    {"id":5,"type":"float","default":0.5},{"id":6,"type":"int","default":1})",
+                R"({"id":51,"type":"float"})", "3  2"},
+            Row{"ease",
+                R"({"id":3,"type":"float","default":0},{"id":4,"type":"float","default":8},
+                    {"id":5,"type":"float","default":5,"max":0.5},{"id":6,"type":"int","default":99})",
+                R"({"id":51,"type":"float"})", "3  4"},
+            Row{"oscillator",
+                R"({"id":3,"type":"float","default":3},{"id":4,"type":"float","default":1},
+                    {"id":5,"type":"float","default":0.25},{"id":6,"type":"float","default":0})",
+                R"({"id":51,"type":"float"})", "3  3"},
+            Row{"add",
+                R"({"id":3,"type":"vec2","default":[1,2]},{"id":4,"type":"float","default":10})",
+                R"({"id":51,"type":"vec2"})", "3  11, 12"},
+            Row{"multiply",
+                R"({"id":3,"type":"int","default":6},{"id":4,"type":"int","default":7})",
+                R"({"id":51,"type":"int"})", "3  42"},
+            Row{"compose",
+                R"({"id":3,"type":"float","default":1},{"id":4,"type":"float","default":2},
+                    {"id":5,"type":"float","default":3})",
+                R"({"id":51,"type":"vec4"})", "3  1, 2, 3, 0"},
+            Row{"split", R"({"id":3,"type":"vec3","default":[1,2,3]})",
+                R"({"id":51,"type":"float"},{"id":52,"type":"float"},{"id":53,"type":"float"},
+                    {"id":54,"type":"float"})",
+                "3  1  2  3  0"},
+            Row{"loop", R"({"id":3,"type":"int","default":4})",
+                R"({"id":51,"type":"int"},{"id":52,"type":"float"})",
+                "3  [0 | 1 | 2 | 3]  [0 | 0.25 | 0.5 | 0.75]"},
+            Row{"loop", R"({"id":3,"type":"int","default":-5})", R"({"id":51,"type":"int"})",
+                "3  0"},
+            Row{"loop", R"({"id":3,"type":"int","default":9000000000000})",
+                R"({"id":51,"type":"int"})", "3  [0 | 1 | 2 | 3 | 4 | 5 | 6 | 7 | 8 | ..."},
+            Row{"pulse", R"({"id":3,"type":"float","default":0.5})", R"({"id":51,"type":"pulse"})",
+                "3  1"},
+            Row{"pulse", R"({"id":3,"type":"float","default":0})", R"({"id":51,"type":"pulse"})",
+                "3  0"},
+            Row{"choose",
+                R"({"id":3,"type":"boolean","default":true},{"id":4,"type":"string","default":"yes"},
+                    {"id":5,"type":"string","default":"no"})",
+                R"({"id":51,"type":"string"})", "3  yes"},
+            Row{"circle", R"({"id":3,"type":"vec2"},{"id":4,"type":"float","default":1})",
+                R"({"id":51,"type":"path"})", "3  Path"},
+            Row{"ellipse", R"({"id":3,"type":"vec2"},{"id":4,"type":"vec2","default":[1,2]})",
+                R"({"id":51,"type":"path"})", "3  Path"},
+            Row{"roundRect", R"({"id":3,"type":"vec2"},{"id":4,"type":"vec2","default":[1,2]})",
+                R"({"id":51,"type":"path"})", "3  Path"},
+            Row{"hexaRect", R"({"id":3,"type":"vec2"},{"id":4,"type":"vec2","default":[1,2]})",
+                R"({"id":51,"type":"path"})", "3  Path"},
+            Row{"arc", R"({"id":3,"type":"vec2"},{"id":4,"type":"vec2","default":[1,2]})",
+                R"({"id":51,"type":"path"})", "3  Path"},
+            Row{"joinPaths", R"({"id":3,"type":"path"},{"id":4,"type":"path"})",
+                R"({"id":51,"type":"path"})", "3  Empty Path"},
+            Row{"layer", R"({"id":3,"type":"path"})", R"({"id":51,"type":"layer"})",
+                "3  unstructured"},
+            Row{"text",
+                R"({"id":3,"type":"string","default":"n = "},{"id":4,"type":"float","default":2.5})",
+                R"({"id":51,"type":"string"})", "3  n = 2.5"},
+            Row{"unknown", R"({"id":3,"type":"float","default":2.5})",
+                R"({"id":51,"type":"int"},{"id":52,"type":"int","default":9})", "3  2  9"},
+        }) {
+        SCOPED_TRACE(std::string(row.kind) + " " + row.inputs);
+        std::string const file = write(
+            "kind.json", R"({"framesPerSecond":6,"root":{"id":1,"children":[{"id":2,"kind":")" +
+                             std::string(row.kind) + R"(","inputs":[)" + row.inputs +
+                             R"(],"outputs":[)" + row.outputs + "]}]}}");
+        Outcome const outcome = run(file + " --frames 4 --every 3");
+        EXPECT_EQ(outcome.errors, "");
+        std::string last = outcome.output.substr(0, outcome.output.size() - 1);
+        last = last.substr(last.rfind('\n') + 1);
+        std::string squeezed;  // Columns are as wide as their headings.
+        for (std::size_t i = 0; i < last.size(); ++i) {
+            if (last.substr(i, 3) != "   ") squeezed += last[i];
+        }
+        EXPECT_EQ(squeezed, row.row);
+    }
+}
+
+TEST_F(DocumentRoad, EvaluatesCirclesOfConnectionsWithTheFrameBefore) {
+    std::string const counter = document(
+        R"({"id":2,"kind":"add","inputs":[{"id":21,"type":"int"},{"id":22,"type":"int","default":1}],
+            "outputs":[{"id":23,"type":"int"},{"id":24,"type":"int","tag":1}]})",
+        R"([{"from":[2,23],"to":[2,21]}])");
+    Outcome const outcome = run(write("circle.json", counter) + " --frames 4");
+    EXPECT_EQ(outcome.errors, "");
+    EXPECT_EQ(outcome.output, "read a document: 2 patches in 2 levels, 4 ports, 1 connections\n"
+                              "ports: 4 Numbers\n"
+                              "\n"
+                              "frame  2\n0      1\n1      2\n2      3\n3      4\n");
+}
+
+// Whatever stands in a file, the answer is a document or one line.
+TEST_F(DocumentRoad, SurvivesDamagedDocuments) {
+    tests::Random random(77);
+    std::string const original = contentsOf(kDocuments + "node_graph.json");
+    std::string const own = contentsOf(kDocuments + "small.json");
+    int refused = 0;
+    for (int i = 0; i < 150; ++i) {
+        std::string text = random.chance() ? original : own;
+        for (std::size_t n = random.below(3) + 1; n > 0; --n) {
+            std::size_t const at = random.below(text.size());
+            switch (random.below(4)) {
+                case 0: text.erase(at, random.below(20) + 1); break;
+                case 1: text.insert(at, 1, "[]{}\",:0-9e"[random.below(11)]); break;
+                case 2: text[at] = static_cast<char>(random.below(256)); break;
+                default: text.resize(at + 1); break;
+            }
+        }
+        Outcome const outcome = run(write("damaged.json", text) + " --frames 2 --debug");
+        ASSERT_TRUE(outcome.status == 0 || outcome.status == 2) << outcome.status << "\n" << text;
+        ASSERT_EQ(outcome.status == 2, !outcome.errors.empty());
+        ASSERT_EQ(outcome.status == 2, outcome.output.empty());
+        ASSERT_LE(std::count(outcome.errors.begin(), outcome.errors.end(), '\n'), 1);
+        refused += outcome.status == 2;
+    }
+    EXPECT_GT(refused, 50);
+}
