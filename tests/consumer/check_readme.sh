@@ -1,0 +1,35 @@
+#!/bin/sh
+# Builds the program of README.md with the CMakeLists.txt of README.md, as a stranger's project that
+# adds this one as a folder, and compares what it prints with what README.md says.
+#
+#     check_readme.sh SOURCE_DIR COMPILER
+set -eu
+
+root=$1
+compiler=$2
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+
+block() { awk -v start="\`\`\`$1" '$0 == start { on = 1; next } /^```/ { if (on) exit } on' "$root/README.md"; }
+block cpp > "$work/main.cpp"
+block cmake > "$work/CMakeLists.txt"
+block text > "$work/expected"
+ln -s "$root" "$work/tarn-engine-base"
+
+cmake -S "$work" -B "$work/build" -G Ninja -DCMAKE_CXX_COMPILER="$compiler" \
+    -DCMAKE_EXPORT_COMPILE_COMMANDS=ON > /dev/null
+cmake --build "$work/build" > "$work/log" || { cat "$work/log"; exit 1; }
+"$work/build/first_steps" > "$work/actual"
+diff "$work/expected" "$work/actual"
+[ -s "$work/expected" ]
+
+if grep -E -- '-W(all|extra|error)' "$work/build/compile_commands.json"; then
+    echo "our warnings reach those who use us"
+    exit 1
+fi
+if grep -E '_test\.cpp|document_road' "$work/build/compile_commands.json"; then
+    echo "tests or examples are built for those who use us"
+    exit 1
+fi
+lines=$(wc -l < "$work/main.cpp")
+echo "README.md: $lines lines compile and print what they say"
