@@ -327,6 +327,15 @@ TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
                               "0\n");
 }
 
+TEST_F(DocumentRoad, TellsTheOutputsOfTimeNodesApart) {
+    Outcome const outcome = run(write("time.json", graph(R"([{"id":1,"type":"basic/time","outputs":[
+        {"name":"in ms","type":"number"},{"name":"in sec","type":"number"}]}])")) +
+                                " --frames 31 --every 30");
+    EXPECT_EQ(outcome.errors, "");
+    EXPECT_EQ(outcome.output.substr(outcome.output.find("frame")),
+              "frame  1 in ms  1 in sec\n0      0        0\n30     500      0.5\n");
+}
+
 TEST_F(DocumentRoad, EvaluatesEveryKind) {
     // The outputs of each kind from constant inputs, as the table of frame 3 shows them.
     struct Row {
@@ -337,7 +346,9 @@ TEST_F(DocumentRoad, EvaluatesEveryKind) {
     };
     for (
         Row const& row : {
-            Row{"time", "", R"({"id":51,"type":"float"},{"id":52,"type":"int"})", "3  0.5  3"},
+            Row{"time", "",
+                R"({"id":51,"type":"float"},{"id":52,"type":"int"},{"id":53,"type":"float"})",
+                "3  0.5  3  500"},
             Row{"constant",
                 R"({"id":3,"type":"string","default":"a"},{"id":4,"type":"int","default":7})",
                 R"({"id":51,"type":"string"},{"id":52,"type":"int"})", "3  a  7"},

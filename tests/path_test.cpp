@@ -360,7 +360,7 @@ TEST(PathShapes, RoundRectKeepsElementsOfNoLength) {
     PathBuilder builder;
     builder.roundRect({0, 0}, {4, 4}, 0);
     ASSERT_EQ(builder.elements.size(), 10u);
-    for (std::size_t i : {2, 4, 6, 8}) {
+    for (std::size_t i : {2u, 4u, 6u, 8u}) {
         Points const& points = builder.elements[i].points;
         ASSERT_EQ(points.size(), 3u);
         EXPECT_EQ(points[0], points[2]);

@@ -17,6 +17,7 @@ constexpr double kTwoPi = 6.283185307179586;
 void time(Call const& call) {
     call.out(1, call.moment.seconds());
     call.out(2, call.moment.frame);
+    call.out(3, call.moment.seconds() * 1000.0);
 }
 
 void constant(Call const& call) {
@@ -150,7 +151,7 @@ std::vector<Kind> const& kinds() {
         {kGroupKind, "group", nullptr, "any ports; its children compute"},
         {kGroupInputKind, "input", nullptr, "out: those of the group's inputs with the same tags"},
         {kGroupOutputKind, "output", nullptr, "in: what the group's outputs of these tags give"},
-        {4, "time", time, "out: 1 seconds, 2 frame"},
+        {4, "time", time, "out: 1 seconds, 2 frame, 3 milliseconds"},
         {5, "constant", constant, "in: 1, 2, ...; out: 1, 2, ..."},
         {6, "ease", easeBetween, "in: 1 from, 2 to, 3 progress, 4 curve; out: 1"},
         {7, "oscillator", oscillator, "in: 1 amplitude, 2 hertz, 3 turns, 4 seconds; out: 1"},

@@ -131,6 +131,7 @@ private:
             field.has("properties") ? field.at("properties").object() : noProperties;
         patch.inputs = ports(field, "inputs", properties);
         patch.outputs = ports(field, "outputs", properties);
+        if (patch.builtin == kindByName("time")->number) retagTime(patch.outputs);
         if (patch.builtin == kGroupInputKind) retag(patch.outputs, *parent.inputs, properties);
         if (patch.builtin == kGroupOutputKind) retag(patch.inputs, *parent.outputs, properties);
         if (field.has("subgraph")) {
@@ -161,6 +162,16 @@ private:
             list.push_back(std::move(port));
         });
         return listOf(std::move(list));
+    }
+
+    // Editors give the same time in one unit or two; our kind knows them by tag.
+    static void retagTime(Array<Port>& outputs) {
+        std::vector<Port> changed = *outputs;
+        for (Port& port : changed) {
+            bool const milliseconds = lowerCase(port.name).find("ms") != std::string::npos;
+            port.tag = milliseconds ? 3 : 1;
+        }
+        outputs = listOf(std::move(changed));
     }
 
     // The ends of a group find the group's ports by name; here that is turned into tags.
