@@ -298,7 +298,9 @@ private:
     std::string number(double d) const { return (*this)(d); }
 };
 
+// Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
 bool contentsEqual(FloatMat4 const& a, FloatMat4 const& b) {
+    // NOLINTNEXTLINE(bugprone-suspicious-memory-comparison,cert-exp42-c,cert-flp37-c)
     return std::memcmp(&a, &b, sizeof(FloatMat4)) == 0;
 }
 template <class T>
