@@ -3,6 +3,7 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/graphs.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>
@@ -16,39 +17,11 @@
 #include <sstream>
 
 using namespace tarn::engine;
+using namespace tests;
 
 namespace {
 
 using Set = std::unordered_set<Connection>;
-
-template <class T>
-Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-
-Port port(unsigned long long id, unsigned long long tag = 0) {
-    Port result;
-    result.id = id;
-    result.tag = tag;
-    result.name = "p" + std::to_string(id);
-    return result;
-}
-
-Patch patch(unsigned long long id, std::vector<Patch> children = {},
-            std::vector<Connection> connections = {}) {
-    Patch result;
-    result.id = id;
-    result.name = "n" + std::to_string(id);
-    result.children = listOf(std::move(children));
-    result.connections = listOf(std::move(connections));
-    return result;
-}
-
-Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> outputs) {
-    base.inputs = listOf(std::move(inputs));
-    base.outputs = listOf(std::move(outputs));
-    return base;
-}
 
 // Three levels, with everything that the debug text shows.
 Patch document() {
@@ -574,48 +547,6 @@ TEST(GraphText, FlushesEveryLine) {
 }
 
 namespace {
-
-// A random tree with few identifiers, so that they occur often and in many places.
-Patch randomPatch(tests::Random& random, int depth) {
-    auto const ports = [&] {
-        std::vector<Port> list;
-        for (std::size_t n = random.below(3); n > 0; --n) {
-            list.push_back(port(random.below(12), random.below(3)));
-        }
-        return list;
-    };
-    Patch result = withPorts(patch(random.below(12)), ports(), ports());
-    std::vector<Connection> connections;
-    for (std::size_t n = random.below(5); n > 0; --n) {
-        connections.push_back(
-            {random.below(4), random.below(12), random.below(4), random.below(12)});
-    }
-    result.connections = listOf(std::move(connections));
-    std::vector<Patch> children;
-    for (std::size_t n = depth > 0 ? random.below(4) : 0; n > 0; --n) {
-        children.push_back(random.below(4) == 0 && !children.empty()
-                               ? children.back()  // Shares all its lists.
-                               : randomPatch(random, depth - 1));
-    }
-    result.children = listOf(std::move(children));
-    return result;
-}
-
-// All patches of the tree in the order in which a search looks at them, by an explicit stack.
-template <class AnyPatch>
-std::vector<AnyPatch const*> searchOrder(AnyPatch const& root) {
-    std::vector<AnyPatch const*> order{&root};
-    std::vector<AnyPatch const*> toEnter{&root};
-    while (!toEnter.empty()) {
-        AnyPatch const* const next = toEnter.back();
-        toEnter.pop_back();
-        for (AnyPatch const& child : *next->children) order.push_back(&child);
-        for (auto child = next->children->rbegin(); child != next->children->rend(); ++child) {
-            toEnter.push_back(&*child);
-        }
-    }
-    return order;
-}
 
 template <class AnyPatch>
 AnyPatch const* modelFind(AnyPatch const& root, unsigned long long id) {

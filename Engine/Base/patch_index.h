@@ -1,0 +1,137 @@
+// Engine/Base/patch_index.h: the queries over a graph, in constant time.
+//
+//     PatchIndex index(root);
+//     for (Connection const& c : index.outgoingConnections(portId)) { follow(c); }
+
+#ifndef TARN_ENGINE_BASE_PATCH_INDEX_H
+#define TARN_ENGINE_BASE_PATCH_INDEX_H
+
+#include <Engine/Base/export.h>
+#include <Engine/Base/patch.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <iterator>
+#include <memory>
+
+namespace tarn::engine {
+
+/// Some of the connections of one list, each once, in the order of the list. Nothing is copied: a
+/// view and its references live as long as the index that gave it.
+class ConnectionView {
+public:
+    class Iterator {
+    public:
+        using iterator_category = std::forward_iterator_tag;
+        using value_type = Connection;
+        using difference_type = std::ptrdiff_t;
+        using pointer = Connection const*;
+        using reference = Connection const&;
+
+        Iterator() = default;
+        Iterator(Connection const* connections, std::uint32_t const* at)
+            : list(connections), position(at) {}
+
+        reference operator*() const { return list[*position]; }
+        pointer operator->() const { return &list[*position]; }
+        Iterator& operator++() {
+            ++position;
+            return *this;
+        }
+        Iterator operator++(int) { return {list, position++}; }
+        friend bool operator==(Iterator a, Iterator b) { return a.position == b.position; }
+        friend bool operator!=(Iterator a, Iterator b) { return a.position != b.position; }
+
+    private:
+        Connection const* list = nullptr;
+        std::uint32_t const* position = nullptr;
+    };
+
+    ConnectionView() = default;
+    ConnectionView(Connection const* connections, std::uint32_t const* positions, std::size_t count)
+        : list(connections), first(positions), length(count) {}
+
+    Iterator begin() const { return {list, first}; }
+    Iterator end() const { return {list, first + length}; }
+    std::size_t size() const { return length; }
+    bool empty() const { return length == 0; }
+    Connection const& operator[](std::size_t i) const { return list[first[i]]; }
+
+private:
+    Connection const* list = nullptr;
+    std::uint32_t const* first = nullptr;
+    std::size_t length = 0;
+};
+
+/// Answers about a graph exactly as the walking queries of patch.h do, duplicate identifiers and
+/// identifier 0 included, in constant time and without an allocation. Building takes one pass over
+/// the patches, ports and connections.
+///
+/// An index shares the lists of its root, which never change: it and its answers stay valid for its
+/// own life, whatever happens to the caller's record. Copies share the tables; queries may run on
+/// any number of threads. One that was moved from is only to be assigned to or destroyed.
+class PatchIndex {
+public:
+    /// At most 2^32 - 2 patches, and as many connections in a patch; the stack does not grow with
+    /// the depth.
+    TARN_ENGINE_BASE_EXPORT explicit PatchIndex(Patch root);
+
+    /// The patch that the index was made of, in the place where its answers refer to it.
+    TARN_ENGINE_BASE_EXPORT Patch const& root() const;
+
+    /// As `findPatchRecursive(root(), id)`.
+    TARN_ENGINE_BASE_EXPORT Patch const* findPatch(unsigned long long id) const;
+    /// The patch whose `children` hold `findPatch(id)`; null for the root and for unknown ids.
+    TARN_ENGINE_BASE_EXPORT Patch const* parentOf(unsigned long long id) const;
+
+    /// The input (output) of this id anywhere in the graph: the first in the order in which
+    /// `findPatchRecursive` looks at patches; null where there is none.
+    TARN_ENGINE_BASE_EXPORT Port const* findInputPort(unsigned long long portId) const;
+    TARN_ENGINE_BASE_EXPORT Port const* findOutputPort(unsigned long long portId) const;
+    /// The patch of the first port of this id, in the same order, inputs before outputs.
+    TARN_ENGINE_BASE_EXPORT Patch const* ownerOfPort(unsigned long long portId) const;
+
+    /// The connections of `findOutgoingConnectionsFromPort(root(), portId)`.
+    TARN_ENGINE_BASE_EXPORT ConnectionView outgoingConnections(unsigned long long portId) const;
+    /// What `findIncomingConnectionToPort` finds in the parent of the port's owner, or null.
+    TARN_ENGINE_BASE_EXPORT Connection const* incomingConnection(unsigned long long portId) const;
+
+    /// What `findIncomingConnectionsToPatch` (`findOutgoingConnectionsFromPatch`) finds in
+    /// `parentOf(id)`; empty where that is null.
+    TARN_ENGINE_BASE_EXPORT ConnectionView incomingConnectionsToPatch(unsigned long long id) const;
+    TARN_ENGINE_BASE_EXPORT ConnectionView
+    outgoingConnectionsFromPatch(unsigned long long id) const;
+
+private:
+    struct Tables;
+    std::shared_ptr<Tables const> tables;
+};
+
+/// The same for the evaluation form, whose lists everyone who shares them may change. The index
+/// keeps the lists of its root alive, but it does not see a patch or a port that was added, removed
+/// or given another identifier: its answers dangle or are wrong until `rebuild()`. Values of ports
+/// may change freely.
+class EvalPatchIndex {
+public:
+    TARN_ENGINE_BASE_EXPORT explicit EvalPatchIndex(EvalPatch root);
+
+    /// Looks at the graph again. Afterwards the answers are those of the lists as they are now. A
+    /// failing allocation leaves the index as it was.
+    TARN_ENGINE_BASE_EXPORT void rebuild();
+
+    TARN_ENGINE_BASE_EXPORT EvalPatch const& root() const;
+    TARN_ENGINE_BASE_EXPORT EvalPatch const* findPatch(unsigned long long id) const;
+    TARN_ENGINE_BASE_EXPORT EvalPatch const* parentOf(unsigned long long id) const;
+    TARN_ENGINE_BASE_EXPORT EvalPort const* findInputPort(unsigned long long portId) const;
+    TARN_ENGINE_BASE_EXPORT EvalPort const* findOutputPort(unsigned long long portId) const;
+    TARN_ENGINE_BASE_EXPORT EvalPatch const* ownerOfPort(unsigned long long portId) const;
+
+private:
+    struct Tables;
+    std::shared_ptr<EvalPatch const> shared;
+    std::shared_ptr<Tables const> tables;
+};
+
+}  // namespace tarn::engine
+
+#endif

@@ -1,0 +1,283 @@
+#include <Engine/Base/patch_index.h>
+
+#include "support/allocations.h"
+#include "support/graphs.h"
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <climits>
+#include <iterator>
+
+using namespace tarn::engine;
+using namespace tests;
+
+namespace {
+
+using Set = std::unordered_set<Connection>;
+
+// The patch whose children hold the very object, by looking everywhere.
+template <class AnyPatch>
+AnyPatch const* modelParent(AnyPatch const& root, AnyPatch const* wanted) {
+    for (AnyPatch const* candidate : searchOrder(root)) {
+        for (AnyPatch const& child : *candidate->children) {
+            if (&child == wanted) return candidate;
+        }
+    }
+    return nullptr;
+}
+
+struct Found {
+    Port const* port = nullptr;
+    Patch const* owner = nullptr;
+};
+
+Found modelPort(Patch const& root, Array<Port> Patch::*ports, unsigned long long id) {
+    for (Patch const* candidate : searchOrder(root)) {
+        for (Port const& port : *(candidate->*ports)) {
+            if (port.id == id) return {&port, candidate};
+        }
+    }
+    return {};
+}
+
+Patch const* modelOwner(Patch const& root, unsigned long long id) {
+    for (Patch const* candidate : searchOrder(root)) {
+        for (auto const& list : {candidate->inputs, candidate->outputs}) {
+            for (Port const& port : *list) {
+                if (port.id == id) return candidate;
+            }
+        }
+    }
+    return nullptr;
+}
+
+// The connections of a list that are in the set, each once, in the order of the list, and the very
+// ones of the list.
+void expectView(ConnectionView const& view, Patch const* holder, Set expected) {
+    std::vector<Connection const*> wanted;
+    if (holder != nullptr) {
+        for (Connection const& connection : *holder->connections) {
+            if (expected.erase(connection) != 0) wanted.push_back(&connection);
+        }
+    }
+    ASSERT_TRUE(expected.empty());
+    ASSERT_EQ(view.size(), wanted.size());
+    ASSERT_EQ(view.empty(), wanted.empty());
+    ASSERT_EQ(std::distance(view.begin(), view.end()), static_cast<std::ptrdiff_t>(view.size()));
+    std::size_t i = 0;
+    for (Connection const& connection : view) {
+        ASSERT_EQ(&connection, wanted[i]);
+        ASSERT_EQ(&view[i], wanted[i]);
+        ++i;
+    }
+}
+
+Patch smallGraph() {
+    return withPorts(patch(1,
+                           {withPorts(patch(2, {withPorts(patch(4), {port(41)}, {port(42)})}),
+                                      {port(21)}, {port(22)}),
+                            withPorts(patch(3), {port(31)}, {port(32)})},
+                           {{2, 22, 3, 31}, {3, 32, 2, 21}, {2, 22, 3, 31}, {2, 22, 2, 21}}),
+                     {port(11)}, {port(12)});
+}
+
+}  // namespace
+
+TEST(PatchIndex, AnswersAboutASmallGraph) {
+    PatchIndex const index(smallGraph());
+    Patch const& root = index.root();
+    EXPECT_EQ(root, smallGraph());
+    EXPECT_EQ(index.findPatch(1), &root);
+    EXPECT_EQ(index.findPatch(4), &root.children->at(0).children->at(0));
+    EXPECT_EQ(index.findPatch(9), nullptr);
+    EXPECT_EQ(index.findPatch(0), nullptr);
+    EXPECT_EQ(index.parentOf(1), nullptr);
+    EXPECT_EQ(index.parentOf(2), &root);
+    EXPECT_EQ(index.parentOf(4), &root.children->at(0));
+    EXPECT_EQ(index.parentOf(9), nullptr);
+    EXPECT_EQ(index.parentOf(0), nullptr);
+    EXPECT_EQ(index.findInputPort(41), &root.children->at(0).children->at(0).inputs->at(0));
+    EXPECT_EQ(index.findInputPort(42), nullptr);
+    EXPECT_EQ(index.findOutputPort(42), &root.children->at(0).children->at(0).outputs->at(0));
+    EXPECT_EQ(index.ownerOfPort(11), &root);
+    EXPECT_EQ(index.ownerOfPort(32), &root.children->at(1));
+    EXPECT_EQ(index.ownerOfPort(99), nullptr);
+    Connection const* const connections = root.connections->data();
+    expectView(index.outgoingConnections(22), &root, {{2, 22, 3, 31}, {2, 22, 2, 21}});
+    EXPECT_EQ(index.outgoingConnections(22).begin()->toPortId, 31u);
+    EXPECT_EQ((*index.outgoingConnections(22).begin()++).toPortId, 31u);
+    EXPECT_TRUE(index.outgoingConnections(12).empty());
+    EXPECT_TRUE(index.outgoingConnections(99).empty());
+    EXPECT_EQ(index.incomingConnection(31), connections);
+    EXPECT_EQ(index.incomingConnection(21), connections + 1);
+    EXPECT_EQ(index.incomingConnection(41), nullptr);
+    EXPECT_EQ(index.incomingConnection(11), nullptr);
+    EXPECT_EQ(index.incomingConnection(99), nullptr);
+    EXPECT_EQ(index.incomingConnectionsToPatch(2).size(), 2u);
+    EXPECT_EQ(index.outgoingConnectionsFromPatch(2).size(), 2u);
+    EXPECT_TRUE(index.incomingConnectionsToPatch(1).empty());
+    EXPECT_TRUE(index.outgoingConnectionsFromPatch(9).empty());
+    EXPECT_TRUE(index.incomingConnectionsToPatch(0).empty());
+    EXPECT_TRUE(ConnectionView().empty());
+    EXPECT_TRUE(ConnectionView().begin() == ConnectionView().end());
+}
+
+TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {
+    tests::Random random(3);
+    for (int i = 0; i < 1500; ++i) {
+        PatchIndex const index(randomPatch(random, 4));
+        Patch const& root = index.root();
+        for (unsigned long long id : {0ULL, 1ULL, 2ULL, 3ULL, 4ULL, 5ULL, 6ULL, 7ULL, 8ULL, 9ULL,
+                                      10ULL, 11ULL, 12ULL, 1ULL << 32, ULLONG_MAX}) {
+            SCOPED_TRACE(testing::Message() << "tree " << i << ", id " << id);
+            Patch const* const found = findPatchRecursive(root, id);
+            ASSERT_EQ(index.findPatch(id), found);
+            Patch const* const parent = found == nullptr ? nullptr : modelParent(root, found);
+            ASSERT_EQ(index.parentOf(id), parent);
+            expectView(index.incomingConnectionsToPatch(id), parent,
+                       parent ? findIncomingConnectionsToPatch(*parent, id) : Set());
+            expectView(index.outgoingConnectionsFromPatch(id), parent,
+                       parent ? findOutgoingConnectionsFromPatch(*parent, id) : Set());
+
+            ASSERT_EQ(index.findInputPort(id), modelPort(root, &Patch::inputs, id).port);
+            ASSERT_EQ(index.findOutputPort(id), modelPort(root, &Patch::outputs, id).port);
+            Patch const* const owner = modelOwner(root, id);
+            ASSERT_EQ(index.ownerOfPort(id), owner);
+
+            Patch const* const ownersParent = owner ? modelParent(root, owner) : nullptr;
+            auto const incoming = ownersParent ? findIncomingConnectionToPort(*ownersParent, id)
+                                               : Optional<Connection>();
+            Connection const* const indexed = index.incomingConnection(id);
+            ASSERT_EQ(indexed != nullptr, incoming.hasValue());
+            if (incoming) {
+                ASSERT_EQ(*indexed, *incoming);
+                ASSERT_EQ(indexed, &*std::find(ownersParent->connections->begin(),
+                                               ownersParent->connections->end(), *incoming));
+            }
+
+            Set const outgoing = findOutgoingConnectionsFromPort(root, id);
+            ConnectionView const view = index.outgoingConnections(id);
+            ASSERT_EQ(Set(view.begin(), view.end()), outgoing);
+            ASSERT_EQ(view.size(), outgoing.size());
+            for (std::size_t n = 1; n < view.size(); ++n) ASSERT_LT(&view[n - 1], &view[n]);
+        }
+        if (HasFatalFailure()) return;
+    }
+}
+
+TEST(PatchIndex, KeepsEqualConnectionsApartFromThoseThatOnlyHashAlike) {
+    // {a, b, 0, 0} with any a and a b that makes up for it have one hash.
+    auto const hash = std::hash<Connection>();
+    Connection const first{1, 2, 3, 4};
+    auto const combine = [](std::uint64_t seed, std::uint64_t v) {
+        return seed ^ (v + 0x9e3779b9 + (seed << 6) + (seed >> 2));
+    };
+    std::uint64_t const afterThree = combine(combine(combine(0, 1), 2), 3);
+    std::uint64_t const other = combine(combine(combine(0, 1), 2), 5);
+    std::uint64_t const needed = combine(afterThree, 4);
+    Connection const second{1, 2, 5, (needed ^ other) - 0x9e3779b9 - (other << 6) - (other >> 2)};
+    ASSERT_EQ(hash(first), hash(second));
+    Connection const third{1, 2, 7, [&] {
+                               std::uint64_t const seed = combine(combine(combine(0, 1), 2), 7);
+                               return (needed ^ seed) - 0x9e3779b9 - (seed << 6) - (seed >> 2);
+                           }()};
+    ASSERT_EQ(hash(first), hash(third));
+    PatchIndex const index(patch(9, {withPorts(patch(1), {}, {port(2)})},
+                                 {first, second, first, third, second, third, second}));
+    expectView(index.outgoingConnections(2), &index.root(), {first, second, third});
+}
+
+TEST(PatchIndex, OutlivesTheCallersRecordAndMoves) {
+    auto root = std::make_unique<Patch>(smallGraph());
+    PatchIndex index(*root);
+    root.reset();
+    Patch const* const before = index.findPatch(1);
+    Port const* const port = index.findInputPort(41);
+    PatchIndex moved = std::move(index);
+    EXPECT_EQ(moved.findPatch(1), before);
+    EXPECT_EQ(&moved.root(), before);
+    EXPECT_EQ(moved.findInputPort(41), port);
+    EXPECT_EQ(port->id, 41u);
+    PatchIndex const copy = moved;
+    moved = PatchIndex(Patch());
+    EXPECT_EQ(copy.findPatch(1), before);
+    EXPECT_EQ(moved.findPatch(1), nullptr);
+}
+
+TEST(PatchIndex, QueriesAllocateNothing) {
+    PatchIndex const index(smallGraph());
+    std::size_t found = 0;
+    tests::AllocationCounter counter;
+    for (unsigned long long id = 0; id < 50; ++id) {
+        found += index.findPatch(id) != nullptr;
+        found += index.parentOf(id) != nullptr;
+        found += index.findInputPort(id) != nullptr;
+        found += index.findOutputPort(id) != nullptr;
+        found += index.ownerOfPort(id) != nullptr;
+        found += index.incomingConnection(id) != nullptr;
+        for (Connection const& c : index.outgoingConnections(id)) found += c.toPortId != 0;
+        for (Connection const& c : index.incomingConnectionsToPatch(id)) found += c.toPortId != 0;
+        for (Connection const& c : index.outgoingConnectionsFromPatch(id)) found += c.toPortId != 0;
+    }
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_EQ(found, 4u + 3u + 4u + 4u + 8u + 2u + 3u + 3u + 3u);
+}
+
+TEST(PatchIndex, SurvivesFailingAllocations) {
+    Patch const root = smallGraph();
+    EXPECT_GT(tests::failEachAllocation([&] { PatchIndex const index(root); },
+                                        [&] { EXPECT_EQ(root, smallGraph()); }),
+              5u);
+    EvalPatch const evaluated(root);
+    EvalPatchIndex index(evaluated);
+    evaluated.children->at(1).id = 7;
+    EXPECT_GT(tests::failEachAllocation([&] { index.rebuild(); },
+                                        [&] { EXPECT_EQ(index.findPatch(7), nullptr); }),
+              3u);
+    EXPECT_EQ(index.findPatch(7), &evaluated.children->at(1));
+}
+
+TEST(EvalPatchIndex, AgreesWithTheWalksOnRandomTrees) {
+    tests::Random random(4);
+    for (int i = 0; i < 500; ++i) {
+        EvalPatchIndex const index(EvalPatch(randomPatch(random, 4)));
+        EvalPatch const& root = index.root();
+        for (unsigned long long id = 0; id < 14; ++id) {
+            EvalPatch const* const found = findPatchRecursive(root, id);
+            ASSERT_EQ(index.findPatch(id), found);
+            ASSERT_EQ(index.parentOf(id), found ? modelParent(root, found) : nullptr);
+            EvalPort const* input = nullptr;
+            EvalPort const* output = nullptr;
+            EvalPatch const* owner = nullptr;
+            for (EvalPatch const* candidate : searchOrder(root)) {
+                for (EvalPort const& port : *candidate->inputs) {
+                    if (port.id != id) continue;
+                    if (owner == nullptr) owner = candidate;
+                    if (input == nullptr) input = &port;
+                }
+                for (EvalPort const& port : *candidate->outputs) {
+                    if (port.id != id) continue;
+                    if (owner == nullptr) owner = candidate;
+                    if (output == nullptr) output = &port;
+                }
+            }
+            ASSERT_EQ(index.findInputPort(id), input);
+            ASSERT_EQ(index.findOutputPort(id), output);
+            ASSERT_EQ(index.ownerOfPort(id), owner);
+        }
+    }
+}
+
+TEST(EvalPatchIndex, SeesChangesWhenItIsRebuilt) {
+    EvalPatch const evaluated{smallGraph()};
+    EvalPatchIndex index(evaluated);
+    EvalPatchIndex const asItWas = index;
+    EXPECT_EQ(index.findInputPort(31), &evaluated.children->at(1).inputs->at(0));
+    evaluated.children->at(1).inputs->push_back(EvalPort(port(77)));
+    EXPECT_EQ(index.findInputPort(77), nullptr);
+    index.rebuild();
+    EXPECT_EQ(index.findInputPort(77), &evaluated.children->at(1).inputs->at(1));
+    EXPECT_EQ(asItWas.findInputPort(77), nullptr);
+}
