@@ -261,8 +261,9 @@ TEST(Ease, OfVectorsIsThatOfTheirComponents) {
     for (int i = 0; i < 100000; ++i) {
         double from[4];
         double to[4];
-        for (double& d : from) d = random.number() / 3;
-        for (double& d : to) d = random.number() / 7;
+        bool const wild = random.below(4) == 0;
+        for (double& d : from) d = wild ? random.anyDouble() : random.number() / 3;
+        for (double& d : to) d = wild ? random.anyDouble() : random.number() / 7;
         double const t = randomProgress(random);
         int const f = static_cast<int>(random.below(kCurves));
         SCOPED_TRACE(testing::Message() << f << " at " << t);
@@ -304,6 +305,35 @@ TEST(Ease, PassesNaNProgressOn) {
         EXPECT_TRUE(std::isnan(ease(EF(f), 1.0, 2.0, double(NAN)))) << f;
         EXPECT_TRUE(std::isnan(ease(EF(f), FloatVec2{1, 2}, FloatVec2{3, 4}, double(NAN)).y)) << f;
         EXPECT_EQ(ease(EF(f), 1LL, 2LL, double(NAN)), 0) << f;
+    }
+}
+
+TEST(EaseValue, IsTheCurveOfItsType) {
+    tests::Random random(54);
+    for (int i = 0; i < 20000; ++i) {
+        double const t = randomProgress(random);
+        EF const f = EF(random.below(kCurves));
+        FloatVec4 const a{random.number(), random.number(), random.number(), random.number()};
+        FloatVec4 const b{random.number(), random.number(), random.number(), random.number()};
+        SCOPED_TRACE(testing::Message() << int(f) << " at " << t);
+        FloatVec3 const a3{a.x, a.y, a.z};
+        FloatVec3 const b3{b.x, b.y, b.z};
+        FloatVec4 const four = ease(f, Value(a), Value(b), t);
+        FloatVec4 const expected = ease(f, a, b, t);
+        expectSame(four.x, expected.x);
+        expectSame(four.w, expected.w);
+        expectSame(FloatVec3(ease(f, Value(a3), Value(b3), t)).z, expected.z);
+        expectSame(FloatVec2(ease(f, Value(a3), Value(FloatVec2{b.x, b.y}), t)).y, expected.y);
+        expectSame(double(ease(f, Value(a), Value(b.x), t)), expected.x);
+        long long const from = static_cast<long long>(a.x);
+        long long const to = static_cast<long long>(b.x);
+        EXPECT_EQ(static_cast<long long>(ease(f, Value(from), Value(to), t)), ease(f, from, to, t));
+        for (Value const& end : {Value(true), Value("9"), Value(Path()), Value(FloatMat4()),
+                                 Value::Image(9), Value(Unstructured(9.0))}) {
+            EXPECT_EQ(ease(f, Value(a), end, t), Value(0.0));
+            EXPECT_EQ(ease(f, end, end, t), Value(0.0));
+        }
+        if (HasFailure()) return;
     }
 }
 

@@ -1,5 +1,7 @@
 #include <Engine/Base/layers.h>
 
+#include "support/streams.h"
+
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -23,15 +25,6 @@ RenderLayerHierarchy hierarchy(unsigned long long id,
                                std::vector<RenderLayerHierarchy> children = {}) {
     return {{0, id}, std::move(leading), std::move(children)};
 }
-
-// Counts how often a stream is flushed.
-struct FlushCounter : std::stringbuf {
-    int flushes = 0;
-    int sync() override {
-        ++flushes;
-        return 0;
-    }
-};
 
 }  // namespace
 
@@ -112,7 +105,7 @@ TEST(RenderLayerHierarchy, EqualsDeeplyInOrder) {
 }
 
 TEST(LayerTexts, FollowTheStreamsFlagsAndFlushEachLine) {
-    FlushCounter buffer;
+    tests::FlushCounter buffer;
     std::ostream stream(&buffer);
     stream << std::hex << ModelLayer{255, {{16, {}, {}}}, {}};
     EXPECT_EQ(buffer.str(), "ff\n-10\n");
@@ -121,6 +114,14 @@ TEST(LayerTexts, FollowTheStreamsFlagsAndFlushEachLine) {
     EXPECT_EQ(buffer.str(), "ff\n-10\n-v1\n-ff\n--2\n");
     EXPECT_EQ(buffer.flushes, 5);
     EXPECT_EQ(&(stream << RenderLayer{0, 1}), &stream);
+}
+
+TEST(LayerTexts, EndLinesAsTheStreamDoes) {
+    std::ostringstream stream;
+    stream.imbue(tests::barForNewline());
+    EXPECT_EQ(&(stream << ModelLayer{1, {{2, {}, {}}}, {}}), &stream);
+    EXPECT_EQ(&(stream << hierarchy(3)), &stream);
+    EXPECT_EQ(stream.str(), "1|-2|-3|");
 }
 
 TEST(StrokeSettings, IsVisibleByItsThresholds) {

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <thread>
+
 using namespace tarn::engine;
 
 TEST(KeyboardTypes, AreOneListOfTwelve) {
@@ -91,4 +93,12 @@ TEST(MediaContainer, HasOneExtension) {
     for (int number : {0, 7, 255}) {
         EXPECT_EQ(extensionForMediaContainer(MediaContainer(number)), "") << number;
     }
+}
+
+TEST(KeyboardTypes, AreBuiltOnceByManyThreads) {
+    std::vector<std::vector<std::string> const*> seen(8);
+    std::vector<std::thread> threads;
+    for (auto& list : seen) threads.emplace_back([&list] { list = &keyboardTypes(); });
+    for (std::thread& thread : threads) thread.join();
+    for (auto const* list : seen) EXPECT_EQ(list, seen[0]);
 }

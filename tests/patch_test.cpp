@@ -5,6 +5,7 @@
 #include "support/allocations.h"
 #include "support/graphs.h"
 #include "support/random.h"
+#include "support/streams.h"
 
 #include <gtest/gtest.h>
 
@@ -139,6 +140,17 @@ TEST(Connection, EqualsAndHashesByAllFields) {
         EXPECT_EQ(std::hash<Connection>()(row.connection), row.hash);
     }
     EXPECT_EQ(Set().max_load_factor(), 1.0f);
+
+    tests::Random random(31);
+    for (int i = 0; i < 10000; ++i) {
+        unsigned long long const fields[] = {random.word(), random.word() >> random.below(64),
+                                             random.word(), ULLONG_MAX - random.below(2)};
+        std::uint64_t seed = 0;
+        for (unsigned long long v : fields) {
+            seed = seed ^ (v + 2654435769ULL + seed * 64 + seed / 4);
+        }
+        ASSERT_EQ(std::hash<Connection>()({fields[0], fields[1], fields[2], fields[3]}), seed);
+    }
 }
 
 TEST(Patch, EqualsFieldByField) {
@@ -172,6 +184,13 @@ TEST(Patch, EqualsFieldByField) {
                      changed.attributes["x"] = 0;
                      leaf.inputs = listOf<Port>({changed});
                      middle.children = listOf<Patch>({leaf, middle.children->at(1)});
+                     p.children = listOf<Patch>({middle, p.children->at(1)});
+                 },
+                 false},
+             Row{"grandchild's inputs in another order",
+                 [](Patch& p) {
+                     Patch middle = p.children->at(0);
+                     middle.inputs = listOf<Port>({middle.inputs->at(1), middle.inputs->at(0)});
                      p.children = listOf<Patch>({middle, p.children->at(1)});
                  },
                  false},
@@ -216,6 +235,9 @@ TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
     Patch attributes;
     attributes.attributes["a"] = double(NAN);
     EXPECT_FALSE(attributes == attributes);
+    Patch const parent = patch(1, {attributes});
+    EXPECT_TRUE(parent == Patch(parent));
+    EXPECT_FALSE(parent == patch(1, {attributes}));
 }
 
 TEST(Patch, CopiesShareTheirLists) {
@@ -322,10 +344,22 @@ TEST(EvalPatch, SharesListsWithCopiesAndNotWithOtherConversions) {
     EXPECT_NE(first.outputs, second.outputs);
     EXPECT_NE(first.children, second.children);
     EXPECT_EQ(copy.inputs, first.inputs);
+    EXPECT_EQ(copy.outputs, first.outputs);
     EXPECT_EQ(copy.children, first.children);
     copy.children->at(0).inputs->at(0).values[0] = 9.0;
     EXPECT_EQ(first.children->at(0).inputs->at(0).values, Loop{9.0});
     EXPECT_NE(first, second);
+}
+
+TEST(EvalPatch, TakesSharedListsForEqualAndNothingElse) {
+    Port nan = port(1);
+    nan.defaultValue = double(NAN);
+    for (Patch const& source : {withPorts(patch(1), {nan}, {}), withPorts(patch(1), {}, {nan}),
+                                patch(1, {withPorts(patch(2), {nan}, {})})}) {
+        EvalPatch const evaluated(source);
+        EXPECT_TRUE(evaluated == EvalPatch(evaluated));
+        EXPECT_FALSE(evaluated == EvalPatch(source));
+    }
 }
 
 TEST(EvalPatch, EqualsFieldByField) {
@@ -523,6 +557,28 @@ TEST(GraphText, OfPatches) {
     }
 }
 
+TEST(GraphText, FollowsTheStreamsFlagsAndItsNewline) {
+    Patch source = withPorts(patch(255), {port(16)}, {});
+    source.builtin = 17;
+    std::ostringstream stream;
+    stream.imbue(tests::barForNewline());
+    stream << std::hex << source;
+    EXPECT_EQ(stream.str(), "[patch:ff name: n255 builtin: 11  [p16:10 tag: 0 typeInfo: [type: "
+                            "float] defaultValue: 0]|");
+}
+
+TEST(Queries, GiveWhatLivesAsLongAsTheLists) {
+    Array<Patch> children;
+    Patch const* child = nullptr;
+    {
+        Patch const root = patch(1, {patch(2)});
+        children = root.children;
+        child = findPatchRecursive(root, 2);
+    }
+    EXPECT_EQ(child, children->data());
+    EXPECT_EQ(child->name, "n2");
+}
+
 TEST(GraphText, OfADocumentIsItsGoldenText) {
     std::ifstream file(TARN_TESTS_GOLDEN_DIR "/document.txt", std::ios::binary);
     ASSERT_TRUE(file);
@@ -531,13 +587,7 @@ TEST(GraphText, OfADocumentIsItsGoldenText) {
 }
 
 TEST(GraphText, FlushesEveryLine) {
-    struct FlushCounter : std::stringbuf {
-        int flushes = 0;
-        int sync() override {
-            ++flushes;
-            return 0;
-        }
-    } buffer;
+    tests::FlushCounter buffer;
     std::ostream stream(&buffer);
     EXPECT_EQ(&(stream << document()), &stream);
     std::string const text = buffer.str();

@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 
 using namespace tarn::engine;
@@ -241,11 +242,12 @@ TEST(PathShapes, ArcTo) {
 }
 
 TEST(PathShapes, ArcToMeetsTheEndsLineAtTheSumItComputed) {
-    // 0.1 + (1e17 - 0.1) is not 1e17 for all doubles; the sum is kept.
-    FloatVec2 const c{0.1, 0.7};
-    FloatVec2 const p{0.3, -1e-17};
+    // c + (p - c) is not p here, in either coordinate; the sum is kept.
+    FloatVec2 const c{0.7, 0.7};
+    FloatVec2 const p{-1e-17, -1e-17};
     FloatVec2 const d{p.x - c.x, p.y - c.y};
     ASSERT_NE(tests::bits(d.y + c.y), tests::bits(p.y));
+    ASSERT_NE(tests::bits(c.x + d.x), tests::bits(p.x));
     PathBuilder builder;
     builder.moveTo(c).arcTo(p, true).moveTo(c).arcTo(p, false);
     expectElements(builder.elements,
@@ -429,6 +431,15 @@ TEST(PathShapes, AgreeWithAModelOnRandomSizes) {
         PathBuilder ellipse;
         ellipse.ellipse({x, y}, {w, h});
         expectElements(ellipse.elements, round);
+
+        std::vector<PathElement> const cut{
+            move({x + radius, y}), line({R - radius, y}), line({R, y + radius}),
+            line({R, B - radius}), line({R - radius, B}), line({x + radius, B}),
+            line({x, B - radius}), line({x, y + radius}), closed(),
+        };
+        PathBuilder hexagon;
+        hexagon.hexaRect({x, y}, {w, h}, radius);
+        expectElements(hexagon.elements, cut);
         if (testing::Test::HasFatalFailure() || testing::Test::HasNonfatalFailure()) return;
     }
 }
@@ -473,5 +484,60 @@ TEST(PathBuilder, SurvivesFailingAllocations) {
         builder.elements.shrink_to_fit();
         EXPECT_GE(tests::failEachAllocation([&] { row.call(builder); }, untouched), 1u);
         EXPECT_EQ(builder.elements.size(), 3u);
+    }
+}
+
+TEST(PathBuilder, KeepsWhatAShapeAppendedBeforeAllocationFailed) {
+    struct Row {
+        char const* what;
+        void (*call)(PathBuilder&);
+        std::size_t elements;
+    };
+    for (Row const& row : {
+             Row{"arcTo",
+                 [](PathBuilder& b) {
+                     b.arcTo({9, 9}, true);
+                 },
+                 1},
+             Row{"ellipse",
+                 [](PathBuilder& b) {
+                     b.ellipse({1, 2}, {3, 4});
+                 },
+                 6},
+             Row{"circle",
+                 [](PathBuilder& b) {
+                     b.circle({1, 2}, 3);
+                 },
+                 6},
+             Row{"roundRect",
+                 [](PathBuilder& b) {
+                     b.roundRect({1, 2}, {30, 40}, 3);
+                 },
+                 10},
+             Row{"hexaRect",
+                 [](PathBuilder& b) {
+                     b.hexaRect({1, 2}, {30, 40}, 3);
+                 },
+                 9},
+         }) {
+        SCOPED_TRACE(row.what);
+        PathBuilder whole;
+        row.call(whole);
+        PathBuilder builder;
+        std::size_t most = 0;
+        tests::failEachAllocation(
+            [&] {
+                builder = PathBuilder();
+                row.call(builder);
+            },
+            [&] {
+                ASSERT_LT(builder.elements.size(), row.elements);
+                for (std::size_t i = 0; i < builder.elements.size(); ++i) {
+                    EXPECT_EQ(builder.elements[i], whole.elements[i]);
+                }
+                most = std::max(most, builder.elements.size());
+            });
+        EXPECT_GE(most + 2, row.elements);
+        EXPECT_EQ(builder.elements, whole.elements);
     }
 }

@@ -148,6 +148,34 @@ TEST(Unstructured, GivesItsContentInPlace) {
     EXPECT_EQ(counter.count(), 0u);
 }
 
+TEST(Unstructured, OrdersKeysByTheirBytes) {
+    Unstructured const data = Map{{"\xff", 1}, {"b", 2}, {"B", 3}, {"", 4}, {"\x80", 5}};
+    std::vector<std::string> keys;
+    for (auto const& entry : *data.ifMap()) keys.push_back(entry.first);
+    EXPECT_EQ(keys, (std::vector<std::string>{"", "B", "b", "\x80", "\xff"}));
+}
+
+TEST(Unstructured, HandsOutCopies) {
+    Unstructured const map = Map{{"a", 1}};
+    Unstructured const list = List{1};
+    Map mapCopy = map.asMap();
+    mapCopy["a"] = 2;
+    List listCopy = list.asArray();
+    listCopy[0] = 2;
+    EXPECT_EQ(map, Unstructured(Map{{"a", 1}}));
+    EXPECT_EQ(list, Unstructured(List{1}));
+}
+
+TEST(Unstructured, ComparesWithWhatItIsMadeFrom) {
+    Unstructured const five = 5;
+    EXPECT_TRUE(five == 5 && 5 == five && five != 5u && 5u != five && five != 5.0);
+    Unstructured const text = "text";
+    EXPECT_TRUE(text == "text" && "text" == text && text != "other" && "other" != text);
+    EXPECT_FALSE(five != 5 || 5 != five || text == "other" || "other" == text);
+    Unstructured const point = Map{{"X", 1}, {"Y", 2}};
+    EXPECT_TRUE(point == (FloatVec2{1, 2}) && (FloatVec2{1, 2}) == point);
+}
+
 TEST(Unstructured, EqualsTheSameAlternativeWithEqualContent) {
     struct Row {
         char const* what;
@@ -163,6 +191,10 @@ TEST(Unstructured, EqualsTheSameAlternativeWithEqualContent) {
              Row{"integer and double", 1, 1.0, false},
              Row{"integer and unsigned", 1, 1u, false},
              Row{"unsigned and double", 1u, 1.0, false},
+             Row{"integers that are one double", 9007199254740992, 9007199254740993, false},
+             Row{"unsigned that are one double", 9007199254740992u, 9007199254740993u, false},
+             Row{"strings up to a zero byte", std::string("a\0b", 3), std::string("a\0c", 3),
+                 false},
              Row{"other integers", 1, -1, false},
              Row{"unsigned", 1u, 1u, true},
              Row{"other unsigned", 1u, 2u, false},

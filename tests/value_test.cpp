@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cerrno>
 #include <climits>
 #include <cmath>
 #include <iomanip>
@@ -238,14 +239,76 @@ TEST(Value, DefaultsAreNeutral) {
         }
     }
     // A new payload at each call.
-    EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), Value::defaultValue(Type::Path).ifPath());
+    Value const path = Value::defaultValue(Type::Path);
+    EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), path.ifPath());
     EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), Path::EmptyPath().get());
+    Value const matrix = Value::defaultValue(Type::Mat4);
+    Value const text = Value::defaultValue(Type::String);
+    Value const data = Value::defaultValue(Type::Unstructured);
+    EXPECT_NE(Value::defaultValue(Type::Mat4).asFloatMat4(), matrix.asFloatMat4());
+    EXPECT_NE(Value::defaultValue(Type::String).ifString(), text.ifString());
+    EXPECT_NE(Value::defaultValue(Type::Unstructured).ifUnstructured(), data.ifUnstructured());
 }
 
 TEST(ValueDeathTest, OutOfRangeHasNoDefault) {
     EXPECT_DEATH(Value::defaultValue(outOfRange()),
                  "^Assertion failed: \\(0\\), function defaultValue, file Engine/Base/value, line "
                  "[0-9]+\\.\n$");
+}
+
+TEST(Value, AllocatesForPayloadsAloneAndOnce) {
+    struct Row {
+        char const* what;
+        Value (*make)();
+        std::size_t allocations;
+    };
+    for (Row const& row : {
+             Row{"nothing", [] { return Value(); }, 0},
+             Row{"double", [] { return Value(2.5); }, 0},
+             Row{"integer", [] { return Value(5); }, 0},
+             Row{"bool", [] { return Value(true); }, 0},
+             Row{"vector of 2",
+                 [] {
+                     return Value(FloatVec2{1, 2});
+                 },
+                 0},
+             Row{"vector of 3",
+                 [] {
+                     return Value(FloatVec3{1, 2, 3});
+                 },
+                 0},
+             Row{"vector of 4",
+                 [] {
+                     return Value(FloatVec4{1, 2, 3, 4});
+                 },
+                 0},
+             Row{"image", [] { return Value::Image(5); }, 0},
+             Row{"model", [] { return Value::Model(5); }, 0},
+             Row{"matrix", [] { return Value(FloatMat4()); }, 1},
+             Row{"short text", [] { return Value("text"); }, 1},
+             Row{"empty path", [] { return Value(Path()); }, 1},
+             Row{"null data", [] { return Value(Unstructured()); }, 1},
+         }) {
+        SCOPED_TRACE(row.what);
+        tests::AllocationCounter counter;
+        Value const value = row.make();
+        EXPECT_EQ(counter.count(), row.allocations);
+    }
+}
+
+TEST(Value, IsIndependentOfWhatItWasMadeFrom) {
+    std::string text = "text";
+    Path path = linePath();
+    FloatMat4 matrix = countingMatrix();
+    Value const ofText = text;
+    Value const ofPath = path;
+    Value const ofMatrix = matrix;
+    text = "changed";
+    path.elements.clear();
+    matrix.elements[0] = 99;
+    EXPECT_EQ(std::string(ofText), "text");
+    EXPECT_EQ(Path(ofPath), linePath());
+    EXPECT_TRUE(sameBytes(FloatMat4(ofMatrix), countingMatrix()));
 }
 
 TEST(Value, CopiesShareTheirPayload) {
@@ -324,6 +387,11 @@ TEST(Value, ReadsAsEveryScalar) {
              Row{"vector of 4, z alone", FloatVec4{0, 0, 1, 0}, 0, 0.0, true, 0},
              Row{"vector of 4, w alone", FloatVec4{0, 0, 0, 1}, 0, 0.0, true, 0},
              Row{"vector of 4, zeros", FloatVec4{}, 0, 0.0, false, 0},
+             Row{"vector of 2, x too large", FloatVec2{huge, 0}, LLONG_MAX, huge, true, 0},
+             Row{"vector of 2, x too small", FloatVec2{-huge, 0}, LLONG_MIN, -huge, true, 0},
+             Row{"vector of 3, x too large", FloatVec3{huge, 0, 0}, LLONG_MAX, huge, true, 0},
+             Row{"vector of 3, NaN", FloatVec3{0, 0, NAN}, 0, 0.0, true, 0},
+             Row{"vector of 4, NaN", FloatVec4{0, 0, 0, NAN}, 0, 0.0, true, 0},
              Row{"vector, x too large", FloatVec4{huge, 0, 0, 0}, LLONG_MAX, huge, true, 0},
              Row{"matrix", countingMatrix(), 0, 0.0, false, 0},
              Row{"null matrix", nullMatrix(), 0, 0.0, false, 0},
@@ -364,6 +432,9 @@ TEST(Value, ReadsAsEveryScalar) {
         EXPECT_EQ(static_cast<std::int64_t>(row.value), row.integer);
         EXPECT_EQ(static_cast<std::uint64_t>(row.value), row.id);
     }
+    EXPECT_EQ(static_cast<long long>(Value(FloatVec2{NAN, 0})), 0);
+    EXPECT_EQ(static_cast<long long>(Value(FloatVec3{NAN, 0, 0})), 0);
+    EXPECT_EQ(static_cast<long long>(Value(FloatVec4{NAN, 0, 0, 0})), 0);
     Value const nan = NAN;
     EXPECT_EQ(static_cast<long long>(nan), 0);
     EXPECT_TRUE(std::isnan(double(nan)));
@@ -410,6 +481,9 @@ TEST(Value, ReadsAStringAsTheNumberThatAllOfItIs) {
         EXPECT_EQ(static_cast<long long>(value), row.integer);
         EXPECT_EQ(bool(value), !row.text.empty());
     }
+    errno = 0;
+    EXPECT_EQ(double(Value("1e999")), INFINITY);
+    EXPECT_EQ(errno, 0);
     EXPECT_TRUE(std::isnan(double(Value("nan"))));
     EXPECT_EQ(static_cast<long long>(Value("nan")), 0);
 }
@@ -537,7 +611,9 @@ TEST(Value, ReadsAsAStringLikeItsTextButForData) {
         EXPECT_EQ(std::string(row.value), row.reading);
         EXPECT_EQ(to_string(row.value), row.text);
         std::ostringstream stream;
-        stream << "<" << row.value << ">";
+        stream << "<";
+        EXPECT_EQ(&(stream << row.value), &stream);
+        stream << ">";
         EXPECT_EQ(stream.str(), "<" + std::string(row.text) + ">");
     }
 }
@@ -670,6 +746,9 @@ TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
     };
     for (Row const& row : {
              Row{"integers", 1, 1, true},
+             Row{"integers that are one double", 9007199254740992, 9007199254740993, false},
+             Row{"strings up to a zero byte", std::string("a\0b", 3), std::string("a\0c", 3),
+                 false},
              Row{"other integers", 1, 2, false},
              Row{"integer and double", 1, 1.0, false},
              Row{"integer and bool", 1, true, false},
@@ -913,7 +992,7 @@ TEST(TypeInfo, EqualsFieldByField) {
 TEST(TypeInfo, WritesItsTypeAlone) {
     for (Type type : kAllTypes) {
         std::ostringstream stream;
-        stream << TypeInfo{type, 1, Value(0.0), Value(1.0), Value(2)};
+        EXPECT_EQ(&(stream << TypeInfo{type, 1, Value(0.0), Value(1.0), Value(2)}), &stream);
         EXPECT_EQ(stream.str(), "[type: " + typeToString(type) + "]");
     }
 }
@@ -952,6 +1031,21 @@ TEST(TypeInfo, NamesItsPort) {
         info.subtype = static_cast<unsigned char>(row.subtype);
         EXPECT_EQ(portNameForTypeInfo(info, true), row.plural);
         EXPECT_EQ(portNameForTypeInfo(info, false), row.singular);
+    }
+}
+
+TEST(TypeInfo, NamesItsPortByTheSubtypeOfTwoTypesAlone) {
+    for (Type type : kAllTypes) {
+        bool const marked = type == Type::Boolean || type == Type::Unstructured;
+        for (int subtype = 0; subtype < 256; ++subtype) {
+            TypeInfo info{type, static_cast<unsigned char>(subtype), {}, {}, {}};
+            TypeInfo const plain{type, 0, {}, {}, {}};
+            for (bool plural : {false, true}) {
+                EXPECT_EQ(portNameForTypeInfo(info, plural) == portNameForTypeInfo(plain, plural),
+                          !(marked && subtype == 1))
+                    << typeToString(type) << " " << subtype;
+            }
+        }
     }
 }
 
@@ -1089,4 +1183,27 @@ TEST(Value, SurvivesFailingAllocations) {
         tests::failEachAllocation([&] { value = Value(tree); }, [&] { EXPECT_EQ(value, before); }),
         3u);
     EXPECT_EQ(value, Value(tree));
+}
+
+TEST(Value, InBracesFillsAVectorsFirstNumber) {
+    EXPECT_EQ(FloatVec2(Value(0.5)), (FloatVec2{0.5, 0.5}));
+    EXPECT_EQ((FloatVec2{Value(0.5)}), (FloatVec2{0.5, 0}));
+}
+
+// In a program of its own under ctest, so that the first use is here.
+TEST(Statics, AreBuiltOnceByManyThreads) {
+    std::vector<std::thread> threads;
+    std::vector<std::pair<void const*, void const*>> seen(8);
+    std::vector<std::string> texts(8);
+    for (std::size_t i = 0; i < seen.size(); ++i) {
+        threads.emplace_back([&, i] {
+            texts[i] = to_string(Value(-0.0));
+            seen[i] = {Path::EmptyPath().get(), &nullLoop()};
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    for (std::size_t i = 0; i < seen.size(); ++i) {
+        EXPECT_EQ(seen[i], seen[0]);
+        EXPECT_EQ(texts[i], "0");
+    }
 }

@@ -10,6 +10,7 @@
 
 #include <cstdint>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 namespace tarn::engine {
@@ -37,9 +38,9 @@ TARN_ENGINE_BASE_EXPORT std::vector<std::string> easingFunctionNames();
 /// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
 /// `FloatVec3` and `FloatVec4`; other types do not compile.
 ///
-/// `t` is progress: 0 at `from`, 1 at `to`. Not clamped, so 1.5 overshoots. Exponential curves
-/// give exactly the ends there, since they are rescaled to meet them and tested for equality. A NaN
-/// gives NaN. An enumerator out of range gives `from`.
+/// `t` is progress: 0 at `from`, 1 at `to`. Not clamped, so 1.5 overshoots. The exponential curves
+/// are rescaled to meet their ends, and give the flat one exactly: in the start at 0, out the end
+/// at 1, in-out both. A NaN gives NaN. An enumerator out of range gives `from`.
 ///
 /// Vectors are eased component by component. Integers are eased in double precision, cut towards
 /// zero and kept in range (a NaN is 0); their difference wraps around modulo 2^64.
@@ -55,6 +56,12 @@ template <>
 TARN_ENGINE_BASE_EXPORT FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double);
 template <>
 TARN_ENGINE_BASE_EXPORT FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
+
+/// Two ends of different types: make them one, or one of them a `Value`. (The first parameter keeps
+/// `ease<double>(...)` out.)
+template <int = 0, class From, class To,
+          std::enable_if_t<!std::is_same_v<From, To> && !detail::isOneOf<Value, From, To>, int> = 0>
+void ease(EasingFunction function, From from, To to, double t) = delete;
 
 /// `EasingFunction::ExponentialInOut`, by itself, for the same types: the in curve up to the
 /// midpoint (for integers cut towards zero) and the out curve from there.

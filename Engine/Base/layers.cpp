@@ -1,6 +1,7 @@
 #include <Engine/Base/layers.h>
 
 #include <cmath>
+#include <cstddef>
 #include <functional>
 #include <limits>
 #include <ostream>

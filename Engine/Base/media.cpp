@@ -4,6 +4,7 @@
 #include <cctype>
 #include <cstddef>
 #include <string_view>
+#include <utility>
 
 namespace tarn::engine {
 

@@ -88,7 +88,7 @@ public:
     /// it was, not the end of `path`.
     TARN_ENGINE_BASE_EXPORT PathBuilder& append(Path path);
 
-    /// A quarter of an ellipse with its axes along x and y, as one cubic curve (at most 2.7e-4 of
+    /// A quarter of an ellipse with its axes along x and y, as one cubic curve (at most 2.8e-4 of
     /// the radius off). `verticalFirst`: leave along y and arrive along x; otherwise the reverse.
     /// Afterwards the current point is p.
     TARN_ENGINE_BASE_EXPORT PathBuilder& arcTo(FloatVec2 p, bool verticalFirst);

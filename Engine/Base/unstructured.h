@@ -23,9 +23,18 @@
 
 namespace tarn::engine {
 
+namespace detail {
+
+template <class T>
+using EnableIfDataSource = std::enable_if_t<
+    !isOneOf<T, Unstructured, Value> && std::is_convertible_v<T const&, Unstructured>, int>;
+
+}  // namespace detail
+
 /// A value in the manner of JSON, with two kinds of integers and no truth value of its own (truth
 /// is the integer 1 or 0). It owns its subtree: a copy is deep, a move takes constant time, cannot
 /// fail and leaves null behind. No reading fails: what has no answer is zero, false or empty.
+/// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
 class Unstructured {
 public:
     using Map = std::map<std::string, Unstructured>;
@@ -116,6 +125,15 @@ public:
     /// The same kind with equal content, deeply: 1, 1u and 1.0 are three different things.
     TARN_ENGINE_BASE_EXPORT bool operator==(Unstructured const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(Unstructured const& other) const;
+    /// With what data is made from on the left side, as it may stand on the right.
+    template <class Source, detail::EnableIfDataSource<Source> = 0>
+    friend bool operator==(Source const& source, Unstructured const& data) {
+        return data.operator==(source);
+    }
+    template <class Source, detail::EnableIfDataSource<Source> = 0>
+    friend bool operator!=(Source const& source, Unstructured const& data) {
+        return data.operator!=(source);
+    }
 
     /// A copy of `map` without its empty maps, arrays and strings. One level deep: what is kept is
     /// kept whole. Null and zero are not empty.

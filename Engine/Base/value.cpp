@@ -9,6 +9,7 @@
 #include <boost/variant/static_visitor.hpp>
 
 #include <array>
+#include <cerrno>
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
@@ -59,8 +60,10 @@ bool hasElements(std::shared_ptr<Path const> const& path) {
 // The number that the whole text is, else whether there is any text.
 double numberFromString(std::shared_ptr<std::string const> const& text) {
     if (!text) return 0.0;
+    int const errorBefore = errno;
     char* parsedTo = nullptr;
     double const number = std::strtod(text->c_str(), &parsedTo);
+    errno = errorBefore;
     if (parsedTo == text->c_str() + text->size()) return number;
     return text->empty() ? 0.0 : 1.0;
 }

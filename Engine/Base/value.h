@@ -270,17 +270,20 @@ public:
     template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
     operator Narrow() const = delete;
 
-    /// Vector readings; none allocates. A number or truth value fills every component, a shorter
-    /// vector is filled up with zeros and a longer one cut; data reads as `Unstructured` says;
-    /// everything else is zero.
+    /// Vector readings, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would fill the
+    /// record's first number and nothing else. None allocates. A number or truth value fills every
+    /// component, a shorter vector is filled up with zeros and a longer one cut; data reads as
+    /// `Unstructured` says; everything else is zero.
     TARN_ENGINE_BASE_EXPORT operator FloatVec2() const;
     TARN_ENGINE_BASE_EXPORT operator FloatVec3() const;
     TARN_ENGINE_BASE_EXPORT operator FloatVec4() const;
     /// The matrix held, else the identity.
     TARN_ENGINE_BASE_EXPORT operator FloatMat4() const;
-    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing.
+    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing. Its callers
+    /// include path.h, as those of `asUnstructured` include unstructured.h.
     TARN_ENGINE_BASE_EXPORT operator Path() const;
-    /// As `to_string`, but "??" for data that is no string.
+    /// As `to_string`, but "??" for data that is no string. Made, not assigned: `s = value` does
+    /// not compile, since a string is assigned a character too; `s = std::string(value)` does.
     TARN_ENGINE_BASE_EXPORT operator std::string() const;
     /// The data of this value: numbers, strings and trees as they are, a truth value as the integer
     /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
@@ -297,7 +300,7 @@ public:
     /// when this value has that type already. An enumerator out of range is an assertion failure.
     TARN_ENGINE_BASE_EXPORT Value asType(Type type) const;
 
-    /// The same alternative with equal content: 1 and 1.0 differ. Numbers and vectors compare as
+    /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
     /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
     TARN_ENGINE_BASE_EXPORT bool operator==(Value const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(Value const& other) const;
@@ -327,25 +330,27 @@ namespace detail {
 template <class T>
 constexpr bool isComparedByReading =
     std::is_arithmetic_v<T> || std::is_convertible_v<T const&, std::string> ||
-    isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, Unstructured>;
+    isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, std::shared_ptr<Path const>,
+            Unstructured>;
 template <>
 inline constexpr bool isComparedByReading<Value> = false;
 
-template <class T>
-using EnableIfComparedByReading = std::enable_if_t<isComparedByReading<T>, int>;
+// `V` is deduced, so that only a `Value` itself is meant and nothing that converts to one.
+template <class V, class Other>
+using EnableIfMixed = std::enable_if_t<std::is_same_v<V, Value> && isComparedByReading<Other>, int>;
 
 }  // namespace detail
 
 /// A value is compared with a value: whether the other side becomes one, or this one is read as
 /// the other kind, is for the caller to write.
-template <class Other, detail::EnableIfComparedByReading<Other> = 0>
-bool operator==(Value const&, Other const&) = delete;
-template <class Other, detail::EnableIfComparedByReading<Other> = 0>
-bool operator==(Other const&, Value const&) = delete;
-template <class Other, detail::EnableIfComparedByReading<Other> = 0>
-bool operator!=(Value const&, Other const&) = delete;
-template <class Other, detail::EnableIfComparedByReading<Other> = 0>
-bool operator!=(Other const&, Value const&) = delete;
+template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
+bool operator==(V const&, Other const&) = delete;
+template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
+bool operator==(Other const&, V const&) = delete;
+template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
+bool operator!=(V const&, Other const&) = delete;
+template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
+bool operator!=(Other const&, V const&) = delete;
 
 /// A list of values; indices wrap around it (`indexLoopCasting`).
 using Loop = std::vector<Value>;
