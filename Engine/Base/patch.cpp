@@ -12,17 +12,33 @@ bool listsEqual(List const& a, List const& b) {
     return a == b || *a == *b;
 }
 
+// Walks wait for memory: the list of a child that is a few places ahead is asked for early.
+constexpr std::size_t kAhead = 6;
+void askFor([[maybe_unused]] void const* address) {
+#if defined(__GNUC__)
+    __builtin_prefetch(address);
+#endif
+}
+
+// Below a patch that is not the one itself.
+template <class AnyPatch>
+AnyPatch const* findBelow(AnyPatch const& root, unsigned long long id) {
+    auto const& children = *root.children;
+    for (AnyPatch const& child : children) {
+        if (child.id == id) return &child;
+    }
+    for (std::size_t i = 0; i < children.size(); ++i) {
+        if (i + kAhead < children.size()) askFor(children[i + kAhead].children.get());
+        if (children[i].children->empty()) continue;
+        if (AnyPatch const* found = findBelow(children[i], id)) return found;
+    }
+    return nullptr;
+}
+
 template <class AnyPatch>
 AnyPatch const* findPatch(AnyPatch const& root, unsigned long long id) {
     if (id == 0) return nullptr;
-    if (root.id == id) return &root;
-    for (AnyPatch const& child : *root.children) {
-        if (child.id == id) return &child;
-    }
-    for (AnyPatch const& child : *root.children) {
-        if (AnyPatch const* found = findPatch(child, id)) return found;
-    }
-    return nullptr;
+    return root.id == id ? &root : findBelow(root, id);
 }
 
 // The first element of the list whose `field` is `wanted`.
@@ -53,6 +69,21 @@ std::unordered_set<Connection> connectionsByField(Patch const& patch,
         if (connection.*field == wanted) found.insert(connection);
     }
     return found;
+}
+
+// The first patch of the subtree, depth first, with a child that has the port among its outputs.
+Patch const* parentOfOutput(Patch const& root, unsigned long long portId) {
+    std::vector<Patch> const& children = *root.children;
+    for (std::size_t i = 0; i < children.size(); ++i) {
+        if (i + kAhead < children.size()) askFor(children[i + kAhead].outputs.get());
+        if (findByField(*children[i].outputs, &Port::id, portId) != nullptr) return &root;
+    }
+    for (std::size_t i = 0; i < children.size(); ++i) {
+        if (i + kAhead < children.size()) askFor(children[i + kAhead].children.get());
+        if (children[i].children->empty()) continue;
+        if (Patch const* parent = parentOfOutput(children[i], portId)) return parent;
+    }
+    return nullptr;
 }
 
 }  // namespace
@@ -147,16 +178,9 @@ std::unordered_set<Connection> findOutgoingConnectionsFromPatch(Patch const& pat
 
 Optional<std::unordered_set<Connection>>
 _findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId) {
-    for (Patch const& child : *root.children) {
-        if (findByField(*child.outputs, &Port::id, portId) != nullptr) {
-            return connectionsByField(root, &Connection::fromPortId, portId);
-        }
-    }
-    for (Patch const& child : *root.children) {
-        auto found = _findOutgoingConnectionsFromPort(child, portId);
-        if (found) return found;
-    }
-    return std::nullopt;
+    Patch const* const parent = parentOfOutput(root, portId);
+    if (parent == nullptr) return std::nullopt;
+    return connectionsByField(*parent, &Connection::fromPortId, portId);
 }
 
 std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,

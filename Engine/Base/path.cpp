@@ -59,9 +59,16 @@ std::shared_ptr<Path const> Path::EmptyPath() {
     return emptyPathSharedPtr;
 }
 
-PathBuilder& PathBuilder::add(PathInstruction instruction, std::vector<FloatVec2> points) {
-    elements.push_back({instruction, std::move(points)});
+PathBuilder& PathBuilder::add(PathInstruction instruction,
+                              std::initializer_list<FloatVec2> points) {
+    elements.push_back({instruction, points});
     return *this;
+}
+
+// Growth stays geometric over many calls.
+void PathBuilder::reserve(std::size_t more) {
+    std::size_t const needed = elements.size() + more;
+    if (needed > elements.capacity()) elements.reserve(std::max(needed, 2 * elements.capacity()));
 }
 
 PathBuilder& PathBuilder::moveTo(FloatVec2 p) {
@@ -91,9 +98,7 @@ PathBuilder& PathBuilder::quadCurveTo(FloatVec2 c, FloatVec2 p) {
 PathBuilder& PathBuilder::close() { return add(PathInstruction::close, {}); }
 
 PathBuilder& PathBuilder::append(Path path) {
-    std::size_t const needed = elements.size() + path.elements.size();
-    // All that can fail comes first. Growth stays geometric over many appends.
-    if (needed > elements.capacity()) elements.reserve(std::max(needed, 2 * elements.capacity()));
+    reserve(path.elements.size());  // All that can fail comes first.
     elements.insert(elements.end(), std::make_move_iterator(path.elements.begin()),
                     std::make_move_iterator(path.elements.end()));
     return *this;
@@ -113,6 +118,7 @@ PathBuilder& PathBuilder::ellipse(FloatVec2 center, FloatVec2 radii) {
     auto const [x, y] = center;
     auto const [rx, ry] = radii;
     FloatVec2 const start{x + rx, y + 0.0};  // Deliberate: the sums with 0.0 lose a -0.0.
+    reserve(6);
     return moveTo(start)
         .arcTo({0.0 + x, y + ry}, true)
         .arcTo({x - rx, y}, false)
@@ -132,6 +138,7 @@ PathBuilder& PathBuilder::roundRect(FloatVec2 origin, FloatVec2 size, double rad
     double const bottom = h + y;
     double const largest = h * 0.5 < w * 0.5 ? h * 0.5 : w * 0.5;
     double const r = radius < largest ? radius : largest;
+    reserve(10);
     return moveTo({r + x, y})
         .lineTo({right - r, y})
         .arcTo({right, r + y}, false)
@@ -149,6 +156,7 @@ PathBuilder& PathBuilder::hexaRect(FloatVec2 origin, FloatVec2 size, double cut)
     auto const [w, h] = size;
     double const right = w + x;
     double const bottom = h + y;
+    reserve(9);
     return moveTo({x + cut, y})
         .lineTo({right - cut, y})
         .lineTo({right, y + cut})

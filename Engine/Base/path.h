@@ -7,8 +7,11 @@
 #define TARN_ENGINE_BASE_PATH_H
 
 #include <Engine/Base/export.h>
+#include <Engine/Base/points.h>
 #include <Engine/Base/value.h>
 
+#include <cstddef>
+#include <initializer_list>
 #include <memory>
 #include <string>
 #include <type_traits>
@@ -35,7 +38,8 @@ TARN_ENGINE_BASE_EXPORT PathInstruction stringToPathInstruction(std::string cons
 /// One instruction with its points. Their number is not checked against the instruction.
 struct PathElement {
     PathInstruction instruction = PathInstruction::moveTo;
-    std::vector<FloatVec2> points;
+    /// Up to three of them allocate nothing.
+    Points points;
 
     /// Equal instructions, and as many points, equal as floating-point numbers are: with a NaN
     /// in it an element is unequal to itself.
@@ -93,8 +97,7 @@ public:
     /// Afterwards the current point is p.
     TARN_ENGINE_BASE_EXPORT PathBuilder& arcTo(FloatVec2 p, bool verticalFirst);
 
-    /// Closed outlines. None checks its sizes; negative ones turn the outline over. A failing
-    /// allocation keeps the elements that were appended before it.
+    /// Closed outlines. None checks its sizes; negative ones turn the outline over.
 
     /// `radii` are half the width and half the height. Starts at the largest x and runs through
     /// the largest y. Afterwards the current point is that start.
@@ -116,7 +119,8 @@ public:
     TARN_ENGINE_BASE_EXPORT bool operator!=(PathBuilder const& other) const;
 
 private:
-    PathBuilder& add(PathInstruction instruction, std::vector<FloatVec2> points);
+    PathBuilder& add(PathInstruction instruction, std::initializer_list<FloatVec2> points);
+    void reserve(std::size_t more);
 };
 
 }  // namespace tarn::engine

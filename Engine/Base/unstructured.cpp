@@ -4,6 +4,7 @@
 
 #include <boost/variant/get.hpp>
 
+#include <algorithm>
 #include <array>
 
 namespace tarn::engine {
@@ -24,6 +25,23 @@ double component(Unstructured const& tree, std::size_t i) {
     return tree.asFloat();
 }
 
+// Numbers, the most of what arrays hold, are compared without a call.
+bool elementsEqual(Unstructured const& a, Unstructured const& b) {
+    bool const numbers = a.type() == Unstructured::Type::Float && b.type() == a.type();
+    return numbers ? a.asFloat() == b.asFloat() : a == b;
+}
+
+bool mapsEqual(Unstructured::Map const& a, Unstructured::Map const& b) {
+    return a.size() == b.size() &&
+           std::equal(a.begin(), a.end(), b.begin(), [](auto const& x, auto const& y) {
+               return x.first == y.first && elementsEqual(x.second, y.second);
+           });
+}
+
+bool arraysEqual(Unstructured::Array const& a, Unstructured::Array const& b) {
+    return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin(), elementsEqual);
+}
+
 bool isEmptyContainer(Unstructured const& tree) {
     if (auto const* map = tree.ifMap()) return map->empty();
     if (auto const* array = tree.ifArray()) return array->empty();
@@ -33,39 +51,52 @@ bool isEmptyContainer(Unstructured const& tree) {
 
 }  // namespace
 
-Unstructured::Unstructured() : storage(nullptr) {}
-Unstructured::Unstructured(Map const& map) : storage(Box<Map>(map)) {}
-Unstructured::Unstructured(Map&& map) : storage(Box<Map>(std::move(map))) {}
-Unstructured::Unstructured(Array const& array) : storage(Box<Array>(array)) {}
-Unstructured::Unstructured(Array&& array) : storage(Box<Array>(std::move(array))) {}
-Unstructured::Unstructured(std::string const& text) : storage(Box<std::string>(text)) {}
-Unstructured::Unstructured(std::string&& text) : storage(Box<std::string>(std::move(text))) {}
+Unstructured::Unstructured(Map const& map) : storage(new Map(map)) {}
+Unstructured::Unstructured(Map&& map) : storage(new Map(std::move(map))) {}
+Unstructured::Unstructured(Array const& array) : storage(new Array(array)) {}
+Unstructured::Unstructured(Array&& array) : storage(new Array(std::move(array))) {}
+Unstructured::Unstructured(std::string const& text) : storage(new std::string(text)) {}
+Unstructured::Unstructured(std::string&& text) : storage(new std::string(std::move(text))) {}
 Unstructured::Unstructured(char const* text)
-    : storage(Box<std::string>(text == nullptr ? "" : text)) {}
-Unstructured::Unstructured(long long const& integer) : storage(integer) {}
-Unstructured::Unstructured(double const& number) : storage(number) {}
-Unstructured::Unstructured(unsigned long long const& integer) : storage(integer) {}
+    : storage(new std::string(text == nullptr ? "" : text)) {}
 Unstructured::Unstructured(Value const& value) : Unstructured(value.asUnstructured()) {}
 
-Unstructured::Unstructured(Unstructured const& other) = default;
-Unstructured::Unstructured(Unstructured&& other) noexcept : storage(std::move(other.storage)) {
-    other.storage = nullptr;
-}
 Unstructured& Unstructured::operator=(Unstructured const& other) {
     return *this = Unstructured(other);
 }
 Unstructured& Unstructured::operator=(Unstructured&& other) noexcept {
     // First out of `other`, which may be this or a part of it.
     Unstructured taken(std::move(other));
-    storage = std::move(taken.storage);
-    taken.storage = nullptr;
+    if (ownsContent()) destroyContent();
+    ::new (static_cast<void*>(&storage)) Storage(taken.storage);
+    taken.forget();
     return *this;
 }
-Unstructured::~Unstructured() = default;
 
-Unstructured Unstructured::Undefined() { return Unstructured(); }
+Unstructured::Storage Unstructured::copiedContent() const {
+    switch (type()) {
+        case Type::Map: return new Map(*ifMap());
+        case Type::Array: return new Array(*ifArray());
+        case Type::String: return new std::string(*ifString());
+        case Type::Null:
+        case Type::Float:
+        case Type::Integer:
+        case Type::UnsignedInteger: break;
+    }
+    return storage;
+}
 
-Unstructured::Type Unstructured::type() const { return Type(storage.which()); }
+void Unstructured::destroyContent() noexcept {
+    switch (type()) {
+        case Type::Map: delete ifMap(); break;
+        case Type::Array: delete ifArray(); break;
+        case Type::String: delete ifString(); break;
+        case Type::Null:
+        case Type::Float:
+        case Type::Integer:
+        case Type::UnsignedInteger: break;
+    }
+}
 
 Unstructured::Map Unstructured::asMap() const { return ifMap() ? *ifMap() : Map(); }
 Unstructured::Array Unstructured::asArray() const { return ifArray() ? *ifArray() : Array(); }
@@ -75,12 +106,6 @@ long long Unstructured::asInteger() const {
     if (auto const* integer = boost::get<long long>(&storage)) return *integer;
     if (auto const* number = boost::get<double>(&storage)) return truncate<long long>(*number);
     return 0;
-}
-
-double Unstructured::asFloat() const {
-    if (auto const* number = boost::get<double>(&storage)) return *number;
-    if (auto const* integer = boost::get<long long>(&storage)) return static_cast<double>(*integer);
-    return 0.0;
 }
 
 bool Unstructured::asBool() const {
@@ -107,19 +132,6 @@ unsigned long long Unstructured::asId() const {
     return 0;
 }
 
-Unstructured::Map const* Unstructured::ifMap() const {
-    auto const* box = boost::get<Box<Map>>(&storage);
-    return box ? box->get() : nullptr;
-}
-Unstructured::Array const* Unstructured::ifArray() const {
-    auto const* box = boost::get<Box<Array>>(&storage);
-    return box ? box->get() : nullptr;
-}
-std::string const* Unstructured::ifString() const {
-    auto const* box = boost::get<Box<std::string>>(&storage);
-    return box ? box->get() : nullptr;
-}
-
 Unstructured::operator FloatVec2() const { return {component(*this, 0), component(*this, 1)}; }
 Unstructured::operator FloatVec3() const {
     return {component(*this, 0), component(*this, 1), component(*this, 2)};
@@ -132,8 +144,8 @@ bool Unstructured::operator==(Unstructured const& other) const {
     if (type() != other.type()) return false;
     switch (type()) {
         case Type::Null: return true;
-        case Type::Map: return *ifMap() == *other.ifMap();
-        case Type::Array: return *ifArray() == *other.ifArray();
+        case Type::Map: return mapsEqual(*ifMap(), *other.ifMap());
+        case Type::Array: return arraysEqual(*ifArray(), *other.ifArray());
         case Type::Float: return asFloat() == other.asFloat();
         case Type::Integer:
         case Type::UnsignedInteger: return asId() == other.asId();

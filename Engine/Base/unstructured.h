@@ -11,11 +11,12 @@
 #include <Engine/Base/export.h>
 #include <Engine/Base/value.h>
 
+#include <boost/variant/get.hpp>
 #include <boost/variant/variant.hpp>
 
 #include <cstddef>
 #include <map>
-#include <memory>
+#include <new>
 #include <string>
 #include <type_traits>
 #include <utility>
@@ -51,7 +52,7 @@ public:
     };
 
     /// Null.
-    TARN_ENGINE_BASE_EXPORT Unstructured();
+    Unstructured() : storage(nullptr) {}
     TARN_ENGINE_BASE_EXPORT Unstructured(Map const& map);
     TARN_ENGINE_BASE_EXPORT Unstructured(Map&& map);
     TARN_ENGINE_BASE_EXPORT Unstructured(Array const& array);
@@ -60,9 +61,9 @@ public:
     TARN_ENGINE_BASE_EXPORT Unstructured(std::string&& text);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
     TARN_ENGINE_BASE_EXPORT Unstructured(char const* text);
-    TARN_ENGINE_BASE_EXPORT Unstructured(long long const& integer);
-    TARN_ENGINE_BASE_EXPORT Unstructured(double const& number);
-    TARN_ENGINE_BASE_EXPORT Unstructured(unsigned long long const& integer);
+    Unstructured(long long const& integer) : storage(integer) {}
+    Unstructured(double const& number) : storage(number) {}
+    Unstructured(unsigned long long const& integer) : storage(integer) {}
     /// Every other integer type, by its sign; a truth value or a character is neither.
     template <class Integer, std::enable_if_t<(detail::isSignedInteger<Integer> ||
                                                detail::isUnsignedInteger<Integer>)&&!detail::
@@ -80,17 +81,20 @@ public:
     Unstructured(Source) = delete;
     Unstructured(std::nullptr_t) = delete;
 
-    TARN_ENGINE_BASE_EXPORT Unstructured(Unstructured const& other);
-    TARN_ENGINE_BASE_EXPORT Unstructured(Unstructured&& other) noexcept;
+    Unstructured(Unstructured const& other)
+        : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
+    Unstructured(Unstructured&& other) noexcept : storage(other.storage) { other.forget(); }
     /// A failing allocation leaves this as it was; either side may be part of the other.
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured const& other);
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT ~Unstructured();
+    ~Unstructured() {
+        if (ownsContent()) destroyContent();
+    }
 
     /// Null, by name.
-    TARN_ENGINE_BASE_EXPORT static Unstructured Undefined();
+    static Unstructured Undefined() { return Unstructured(); }
 
-    TARN_ENGINE_BASE_EXPORT Type type() const;
+    Type type() const { return Type(storage.which()); }
 
     /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy
     /// nothing.
@@ -101,7 +105,13 @@ public:
     /// The signed number, or the floating-point one (towards zero and kept in range, NaN as 0, for
     /// an integer). Deliberate: an unsigned number is an identifier and reads as 0 in both.
     TARN_ENGINE_BASE_EXPORT long long asInteger() const;
-    TARN_ENGINE_BASE_EXPORT double asFloat() const;
+    double asFloat() const {
+        if (double const* number = boost::get<double>(&storage)) return *number;
+        if (long long const* integer = boost::get<long long>(&storage)) {
+            return static_cast<double>(*integer);
+        }
+        return 0.0;
+    }
     /// Deliberate: every map and every array is true, empty ones included; a string when it is not
     /// empty, a number when it is not zero.
     TARN_ENGINE_BASE_EXPORT bool asBool() const;
@@ -111,9 +121,9 @@ public:
 
     /// The content in place, or null for every other kind. Lives until this is assigned to,
     /// moved from or destroyed.
-    TARN_ENGINE_BASE_EXPORT Map const* ifMap() const;
-    TARN_ENGINE_BASE_EXPORT Array const* ifArray() const;
-    TARN_ENGINE_BASE_EXPORT std::string const* ifString() const;
+    Map const* ifMap() const { return content<Map>(); }
+    Array const* ifArray() const { return content<Array>(); }
+    std::string const* ifString() const { return content<std::string>(); }
 
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
     /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
@@ -140,27 +150,26 @@ public:
     TARN_ENGINE_BASE_EXPORT static Map removeEmptyValues(Map const& map);
 
 private:
-    /// One `T` on the heap, copied deeply; it keeps the union at two words, which arrays of
-    /// numbers pay for each element. Null only once moved from, which no `Unstructured` shows.
+    // Maps, arrays and strings are on the heap and owned: that keeps the union at two words, which
+    // arrays of numbers pay for each element, and moving it a plain copy.
+    using Storage = boost::variant<std::nullptr_t, Map*, Array*, double, long long,
+                                   unsigned long long, std::string*>;
+
+    bool ownsContent() const {
+        constexpr unsigned kOwning =
+            1u << unsigned(Type::Map) | 1u << unsigned(Type::Array) | 1u << unsigned(Type::String);
+        return (kOwning >> unsigned(storage.which()) & 1u) != 0;
+    }
     template <class T>
-    class Box {
-    public:
-        explicit Box(T made) : content(std::make_unique<T>(std::move(made))) {}
-        Box(Box const& other) : content(std::make_unique<T>(*other.content)) {}
-        Box(Box&& other) noexcept = default;
-        Box& operator=(Box const& other) = delete;
-        Box& operator=(Box&& other) noexcept = default;
-        ~Box() = default;
+    T const* content() const {
+        T* const* pointer = boost::get<T*>(&storage);
+        return pointer == nullptr ? nullptr : *pointer;
+    }
+    // Afterwards this is null. Whoever calls it has taken the content over.
+    void forget() noexcept { ::new (static_cast<void*>(&storage)) Storage(nullptr); }
+    TARN_ENGINE_BASE_EXPORT Storage copiedContent() const;
+    TARN_ENGINE_BASE_EXPORT void destroyContent() noexcept;
 
-        T const& operator*() const { return *content; }
-        T const* get() const { return content.get(); }
-
-    private:
-        std::unique_ptr<T> content;
-    };
-
-    using Storage = boost::variant<std::nullptr_t, Box<Map>, Box<Array>, double, long long,
-                                   unsigned long long, Box<std::string>>;
     Storage storage;
 };
 

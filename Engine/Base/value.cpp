@@ -10,7 +10,9 @@
 
 #include <array>
 #include <cerrno>
+#include <cfenv>
 #include <cmath>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -18,6 +20,8 @@
 #include <locale>
 #include <string_view>
 #include <utility>
+
+#include <langinfo.h>
 
 namespace tarn::engine {
 
@@ -67,25 +71,6 @@ double numberFromString(std::shared_ptr<std::string const> const& text) {
     if (parsedTo == text->c_str() + text->size()) return number;
     return text->empty() ? 0.0 : 1.0;
 }
-
-struct TypeOf : boost::static_visitor<Type> {
-    Type operator()(long long) const { return Type::Int; }
-    Type operator()(double) const { return Type::Float; }
-    Type operator()(FloatVec2 const&) const { return Type::Vec2; }
-    Type operator()(FloatVec3 const&) const { return Type::Vec3; }
-    Type operator()(FloatVec4 const&) const { return Type::Vec4; }
-    Type operator()(std::shared_ptr<FloatMat4 const> const&) const { return Type::Mat4; }
-    Type operator()(bool) const { return Type::Boolean; }
-    Type operator()(Value::ImageID) const { return Type::Image; }
-    Type operator()(Value::VideoID) const { return Type::Video; }
-    Type operator()(Value::SoundID) const { return Type::Sound; }
-    Type operator()(Value::ModelID) const { return Type::Model; }
-    Type operator()(std::shared_ptr<Path const> const&) const { return Type::Path; }
-    Type operator()(std::shared_ptr<Unstructured const> const&) const { return Type::Unstructured; }
-    Type operator()(std::shared_ptr<std::string const> const&) const { return Type::String; }
-    template <class T>
-    Type operator()(T const&) const = delete;
-};
 
 struct AsInteger : boost::static_visitor<long long> {
     long long operator()(long long i) const { return i; }
@@ -248,14 +233,58 @@ std::string const& negativeZero() {
     return text;
 }
 
+// Whether the C library formats as everyone expects: to the nearest, ties to even, with a point.
+bool formatsPlainly() {
+    char const* const radix = nl_langinfo(RADIXCHAR);
+    return std::fegetround() == FE_TONEAREST && radix[0] == '.' && radix[1] == '\0';
+}
+
+// The number text of a double below 1000 without the C library: the mantissa times 100, shifted
+// down, is exact in 64 bits, and so is its rounding.
+std::string shortText(double d) {
+    std::uint64_t bits = 0;
+    std::memcpy(&bits, &d, sizeof bits);
+    int const biased = static_cast<int>(bits >> 52 & 0x7ff);
+    std::uint64_t const fraction = bits & 0xfffffffffffff;
+    std::uint64_t const mantissa = biased == 0 ? fraction : fraction | std::uint64_t(1) << 52;
+    int const shift = 1075 - (biased == 0 ? 1 : biased);  // At least 43, for a number below 1000.
+    std::uint64_t hundredths = 0;
+    if (shift < 62) {  // Further down it is less than half of a hundredth.
+        std::uint64_t const product = mantissa * 100;  // Below 2^60.
+        std::uint64_t const half = std::uint64_t(1) << (shift - 1);
+        hundredths = product >> shift;
+        std::uint64_t const rest = product - (hundredths << shift);
+        hundredths += rest > half || (rest == half && hundredths % 2 != 0) ? 1 : 0;
+    }
+    if (hundredths == 0) return "0";
+
+    char buffer[8];
+    char* const end = buffer + sizeof buffer;
+    char* begin = end;
+    std::uint64_t whole = hundredths / 100;
+    auto const digit = [](std::uint64_t value) { return static_cast<char>('0' + value); };
+    if (std::uint64_t const decimals = hundredths % 100; decimals != 0) {
+        if (decimals % 10 != 0) *--begin = digit(decimals % 10);
+        *--begin = digit(decimals / 10);
+        *--begin = '.';
+    }
+    do {
+        *--begin = digit(whole % 10);
+        whole /= 10;
+    } while (whole != 0);
+    if (bits >> 63 != 0) *--begin = '-';
+    return std::string(begin, end);
+}
+
 struct ToStringVisitor : boost::static_visitor<std::string> {
     std::string operator()(long long i) const { return std::to_string(i); }
 
     std::string operator()(double d) const {
+        char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
+        if (std::abs(d) < 1000.0 && point == '.' && formatsPlainly()) return shortText(d);
         char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
         std::snprintf(buffer, sizeof buffer, std::abs(d) >= 1000.0 ? "%.1f" : "%.2f", d);
         std::string text = buffer;
-        char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
         if (std::size_t const position = text.find(point); position != std::string::npos) {
             while (text.size() > position + 1 && text.back() == '0') text.pop_back();
             if (text.size() == position + 1) text.pop_back();
@@ -311,20 +340,23 @@ bool contentsEqual(T const& a, T const& b) {
     return a == b;
 }
 
-// Compares two values that hold the same alternative.
-struct AreEqual : boost::static_visitor<bool> {
+// Compares with another union, which holds the same alternative.
+template <class Storage>
+struct EqualsContent : boost::static_visitor<bool> {
+    explicit EqualsContent(Storage const& other) : right(other) {}
+
     template <class T>
-    bool operator()(T const& a, T const& b) const {
-        return a == b;
+    bool operator()(T const& left) const {
+        return left == *boost::get<T>(&right);
     }
     template <class T>
-    bool operator()(std::shared_ptr<T const> const& a, std::shared_ptr<T const> const& b) const {
-        return a == b || (a && b && contentsEqual(*a, *b));
+    bool operator()(std::shared_ptr<T const> const& left) const {
+        T const* const a = left.get();
+        T const* const b = boost::get<std::shared_ptr<T const>>(&right)->get();
+        return a == b || (a != nullptr && b != nullptr && contentsEqual(*a, *b));
     }
-    template <class T, class U>
-    bool operator()(T const&, U const&) const {
-        return false;
-    }
+
+    Storage const& right;
 };
 
 }  // namespace
@@ -345,13 +377,6 @@ bool typeIsResource(Type type) { return contains(kResourceTypes, type); }
 
 bool typeShouldCopyAcrossDeletedConnections(Type type) { return contains(kCopiedTypes, type); }
 
-Value::Value() : storage(0.0) {}
-Value::Value(double number) : storage(number) {}
-Value::Value(long long integer) : storage(integer) {}
-Value::Value(bool truth) : storage(truth) {}
-Value::Value(FloatVec2 vector) : storage(vector) {}
-Value::Value(FloatVec3 vector) : storage(vector) {}
-Value::Value(FloatVec4 vector) : storage(vector) {}
 Value::Value(FloatMat4 const& matrix) : storage(std::make_shared<FloatMat4 const>(matrix)) {}
 Value::Value(char const* text)
     : storage(std::make_shared<std::string const>(text == nullptr ? "" : text)) {}
@@ -407,10 +432,8 @@ Value Value::defaultValue(Type type, unsigned char qualifier) {
     assertionFailed("0", __func__, kModule, __LINE__);
 }
 
-Type Value::type() const { return boost::apply_visitor(TypeOf(), storage); }
-
 Value::operator long long() const { return boost::apply_visitor(AsInteger(), storage); }
-Value::operator double() const { return boost::apply_visitor(AsDouble(), storage); }
+double Value::readDouble() const { return boost::apply_visitor(AsDouble(), storage); }
 Value::operator bool() const { return boost::apply_visitor(IsTrue(), storage); }
 Value::operator unsigned long long() const { return boost::apply_visitor(AsId(), storage); }
 Value::operator FloatVec2() const { return boost::apply_visitor(AsVector<FloatVec2>(), storage); }
@@ -478,10 +501,9 @@ Value Value::asType(Type type) const {
     assertionFailed("0", __func__, kModule, __LINE__);
 }
 
-bool Value::operator==(Value const& other) const {
-    return boost::apply_visitor(AreEqual(), storage, other.storage);
+bool Value::contentEquals(Value const& other) const {
+    return boost::apply_visitor(EqualsContent<Storage>(other.storage), storage);
 }
-bool Value::operator!=(Value const& other) const { return !(*this == other); }
 
 std::string to_string(Value const& value) {
     return boost::apply_visitor(ToStringVisitor(), value.storage);
@@ -517,22 +539,14 @@ std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural) {
     assertionFailed("0", __func__, kModule, __LINE__);
 }
 
-Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) {
-    if (typeInfo.type != Type::Float) return value;
-    if (typeInfo.min && double(*typeInfo.min) > double(value)) return *typeInfo.min;
-    if (typeInfo.max && double(value) > double(*typeInfo.max)) return *typeInfo.max;
-    return value;
-}
-
 // Deliberate: the value is copied, not moved from.
 Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
     Value const& named = value;
     return castValueToType(named, typeInfo);
 }
 
-Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
-                              unsigned long long index) {
-    return castValueToType(loop.empty() ? nullValue() : loop[index % loop.size()], typeInfo);
+Value const& detail::castNullValue(TypeInfo const& typeInfo) {
+    return castValueToType(nullValue(), typeInfo);
 }
 
 Loop const& nullLoop() {

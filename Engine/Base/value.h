@@ -11,6 +11,7 @@
 #include <Engine/Base/export.h>
 #include <Engine/Base/optional.h>
 
+#include <boost/variant/get.hpp>
 #include <boost/variant/variant.hpp>
 
 #include <cstddef>
@@ -209,16 +210,16 @@ public:
     using ModelID = ResourceID<Type::Model>;
 
     /// The double 0.0.
-    TARN_ENGINE_BASE_EXPORT Value();
-    TARN_ENGINE_BASE_EXPORT Value(double number);
-    TARN_ENGINE_BASE_EXPORT Value(long long integer);
+    Value() : storage(0.0) {}
+    Value(double number) : storage(number) {}
+    Value(long long integer) : storage(integer) {}
     /// Every other signed integer type; `char` is not one.
     template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
     Value(Integer integer) : Value(static_cast<long long>(integer)) {}
-    TARN_ENGINE_BASE_EXPORT Value(bool truth);
-    TARN_ENGINE_BASE_EXPORT Value(FloatVec2 vector);
-    TARN_ENGINE_BASE_EXPORT Value(FloatVec3 vector);
-    TARN_ENGINE_BASE_EXPORT Value(FloatVec4 vector);
+    Value(bool truth) : storage(truth) {}
+    Value(FloatVec2 vector) : storage(vector) {}
+    Value(FloatVec3 vector) : storage(vector) {}
+    Value(FloatVec4 vector) : storage(vector) {}
     TARN_ENGINE_BASE_EXPORT Value(FloatMat4 const& matrix);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
     TARN_ENGINE_BASE_EXPORT Value(char const* text);
@@ -246,7 +247,7 @@ public:
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type);
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
 
-    TARN_ENGINE_BASE_EXPORT Type type() const;
+    Type type() const { return kTypes[storage.which()]; }
 
     /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
     /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
@@ -255,7 +256,10 @@ public:
     /// its truth is not being empty. A double becomes an integer towards zero, kept in range, and
     /// 0 for a NaN.
     TARN_ENGINE_BASE_EXPORT operator long long() const;
-    TARN_ENGINE_BASE_EXPORT operator double() const;
+    operator double() const {
+        double const* number = boost::get<double>(&storage);
+        return number != nullptr ? *number : readDouble();
+    }
     TARN_ENGINE_BASE_EXPORT operator bool() const;
     /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
     TARN_ENGINE_BASE_EXPORT operator unsigned long long() const;
@@ -302,8 +306,10 @@ public:
 
     /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
     /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Value const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Value const& other) const;
+    bool operator==(Value const& other) const {
+        return storage.which() == other.storage.which() && contentEquals(other);
+    }
+    bool operator!=(Value const& other) const { return !(*this == other); }
 
 private:
     friend std::string to_string(Value const& value);
@@ -313,6 +319,16 @@ private:
                        std::shared_ptr<FloatMat4 const>, bool, ImageID, VideoID, SoundID, ModelID,
                        std::shared_ptr<Path const>, std::shared_ptr<Unstructured const>,
                        std::shared_ptr<std::string const>>;
+    // By alternative: the only place where the two numberings meet.
+    static constexpr Type kTypes[] = {Type::Int,          Type::Float, Type::Vec2,    Type::Vec3,
+                                      Type::Vec4,         Type::Mat4,  Type::Boolean, Type::Image,
+                                      Type::Video,        Type::Sound, Type::Model,   Type::Path,
+                                      Type::Unstructured, Type::String};
+
+    TARN_ENGINE_BASE_EXPORT double readDouble() const;
+    // For values of the same alternative.
+    TARN_ENGINE_BASE_EXPORT bool contentEquals(Value const& other) const;
+
     Storage storage;
 };
 static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they grow");
@@ -377,7 +393,7 @@ TARN_ENGINE_BASE_EXPORT std::string portNameForTypeInfo(TypeInfo typeInfo, bool 
 /// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
 /// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
 /// refers into one of the arguments and lives no longer than both.
-TARN_ENGINE_BASE_EXPORT Value const& castValueToType(Value const& value, TypeInfo const& typeInfo);
+inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo);
 
 /// The same decision, as a copy of the value chosen.
 TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typeInfo);
@@ -385,8 +401,8 @@ TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typ
 /// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as
 /// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
 /// a value that lives to program exit.
-TARN_ENGINE_BASE_EXPORT Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
-                                                      unsigned long long index);
+inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                                     unsigned long long index);
 
 /// The empty loop that everyone shares; lives to program exit.
 TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();
@@ -396,6 +412,28 @@ TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Value con
 
 /// Writes the type alone: "[type: float]".
 TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
+
+// Implementation
+
+namespace detail {
+
+// What an empty loop counts as, cast to the port.
+TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo);
+
+}  // namespace detail
+
+inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) {
+    if (typeInfo.type != Type::Float) return value;
+    if (typeInfo.min && double(*typeInfo.min) > double(value)) return *typeInfo.min;
+    if (typeInfo.max && double(value) > double(*typeInfo.max)) return *typeInfo.max;
+    return value;
+}
+
+inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                                     unsigned long long index) {
+    if (loop.empty()) return detail::castNullValue(typeInfo);
+    return castValueToType(loop[index % loop.size()], typeInfo);
+}
 
 }  // namespace tarn::engine
 

@@ -1,0 +1,199 @@
+// Engine/Base/points.h: a list of points that does not allocate for the few that most elements
+// have.
+//
+//     Points points{{1, 2}, {3, 4}};
+//     points.push_back({5, 6});
+
+#ifndef TARN_ENGINE_BASE_POINTS_H
+#define TARN_ENGINE_BASE_POINTS_H
+
+#include <Engine/Base/value.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <initializer_list>
+#include <iterator>
+#include <stdexcept>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+namespace tarn::engine {
+
+/// A `std::vector<FloatVec2>` in its interface, its guarantees and its costs, but for two things:
+/// up to three points are held in place, without an allocation, and so a move invalidates iterators
+/// and takes longer for those. Made from a vector and convertible to one, at the cost of a copy.
+class Points {
+public:
+    using value_type = FloatVec2;
+    using size_type = std::size_t;
+    using difference_type = std::ptrdiff_t;
+    using reference = FloatVec2&;
+    using const_reference = FloatVec2 const&;
+    using pointer = FloatVec2*;
+    using const_pointer = FloatVec2 const*;
+    using iterator = FloatVec2*;
+    using const_iterator = FloatVec2 const*;
+    using reverse_iterator = std::reverse_iterator<iterator>;
+    using const_reverse_iterator = std::reverse_iterator<const_iterator>;
+
+    Points() = default;
+    explicit Points(size_type count) { resize(count); }
+    Points(size_type count, FloatVec2 point) { resize(count, point); }
+    Points(std::initializer_list<FloatVec2> points) { append(points.begin(), points.size()); }
+    Points(std::vector<FloatVec2> const& points) { append(points.data(), points.size()); }
+    template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
+    Points(Iterator first, Iterator last) {
+        for (; first != last; ++first) push_back(*first);
+    }
+    Points(Points const& other) { append(other.data(), other.length); }
+    Points(Points&& other) noexcept { take(other); }
+    ~Points() { delete[] many; }
+
+    Points& operator=(Points const& other) {
+        if (this != &other) *this = Points(other);
+        return *this;
+    }
+    Points& operator=(Points&& other) noexcept {
+        if (this == &other) return *this;
+        delete[] many;
+        take(other);
+        return *this;
+    }
+    Points& operator=(std::initializer_list<FloatVec2> points) { return *this = Points(points); }
+
+    operator std::vector<FloatVec2>() const { return {begin(), end()}; }
+
+    FloatVec2* data() { return many != nullptr ? many : few; }
+    FloatVec2 const* data() const { return many != nullptr ? many : few; }
+    size_type size() const { return length; }
+    size_type capacity() const { return room; }
+    size_type max_size() const { return static_cast<size_type>(-1) / (2 * sizeof(FloatVec2)); }
+    bool empty() const { return length == 0; }
+
+    iterator begin() { return data(); }
+    iterator end() { return data() + length; }
+    const_iterator begin() const { return data(); }
+    const_iterator end() const { return data() + length; }
+    const_iterator cbegin() const { return begin(); }
+    const_iterator cend() const { return end(); }
+    reverse_iterator rbegin() { return reverse_iterator(end()); }
+    reverse_iterator rend() { return reverse_iterator(begin()); }
+    const_reverse_iterator rbegin() const { return const_reverse_iterator(end()); }
+    const_reverse_iterator rend() const { return const_reverse_iterator(begin()); }
+    const_reverse_iterator crbegin() const { return rbegin(); }
+    const_reverse_iterator crend() const { return rend(); }
+
+    FloatVec2& operator[](size_type i) { return data()[i]; }
+    FloatVec2 const& operator[](size_type i) const { return data()[i]; }
+    FloatVec2& at(size_type i) { return data()[checked(i)]; }
+    FloatVec2 const& at(size_type i) const { return data()[checked(i)]; }
+    FloatVec2& front() { return *begin(); }
+    FloatVec2 const& front() const { return *begin(); }
+    FloatVec2& back() { return end()[-1]; }
+    FloatVec2 const& back() const { return end()[-1]; }
+
+    void reserve(size_type wanted) {
+        if (wanted > room) moveTo(wanted);
+    }
+    void shrink_to_fit() {
+        if (many != nullptr && length < room) *this = Points(*this);
+    }
+    void clear() { length = 0; }
+    void push_back(FloatVec2 point) {
+        if (length == room) moveTo(2 * room);
+        data()[length++] = point;
+    }
+    template <class... Coordinates>
+    FloatVec2& emplace_back(Coordinates... coordinates) {
+        push_back(FloatVec2{coordinates...});
+        return back();
+    }
+    void pop_back() { --length; }
+    void resize(size_type count, FloatVec2 point = FloatVec2()) {
+        reserve(count);
+        if (count > length) std::fill(data() + length, data() + count, point);
+        length = count;
+    }
+
+    iterator insert(const_iterator position, FloatVec2 point) {
+        return insert(position, &point, &point + 1);
+    }
+    iterator insert(const_iterator position, size_type count, FloatVec2 point) {
+        Points const points(count, point);
+        return insert(position, points.begin(), points.end());
+    }
+    iterator insert(const_iterator position, std::initializer_list<FloatVec2> points) {
+        return insert(position, points.begin(), points.end());
+    }
+    template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
+    iterator insert(const_iterator position, Iterator first, Iterator last) {
+        auto const at = static_cast<size_type>(position - begin());
+        auto const before = static_cast<difference_type>(length);
+        Points const added(first, last);  // What is inserted may be a part of this.
+        append(added.data(), added.length);
+        std::rotate(begin() + at, begin() + before, end());
+        return begin() + at;
+    }
+    template <class... Coordinates>
+    iterator emplace(const_iterator position, Coordinates... coordinates) {
+        return insert(position, FloatVec2{coordinates...});
+    }
+    iterator erase(const_iterator position) { return erase(position, position + 1); }
+    iterator erase(const_iterator first, const_iterator last) {
+        iterator const to = begin() + (first - begin());
+        length = static_cast<size_type>(std::copy(last, cend(), to) - begin());
+        return to;
+    }
+    void assign(size_type count, FloatVec2 point) { *this = Points(count, point); }
+    void assign(std::initializer_list<FloatVec2> points) { *this = points; }
+    template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
+    void assign(Iterator first, Iterator last) {
+        *this = Points(first, last);
+    }
+    void swap(Points& other) noexcept { std::swap(*this, other); }
+    friend void swap(Points& a, Points& b) noexcept { a.swap(b); }
+
+    /// As many points, equal as floating-point numbers are.
+    friend bool operator==(Points const& a, Points const& b) {
+        return a.length == b.length && std::equal(a.begin(), a.end(), b.begin());
+    }
+    friend bool operator!=(Points const& a, Points const& b) { return !(a == b); }
+
+private:
+    static constexpr size_type kInPlace = 3;
+
+    size_type checked(size_type i) const {
+        if (i >= length) throw std::out_of_range("Points::at");
+        return i;
+    }
+    void append(FloatVec2 const* points, size_type count) {
+        reserve(length + count);
+        std::copy(points, points + count, data() + length);
+        length += count;
+    }
+    void moveTo(size_type newRoom) {
+        auto* const larger = new FloatVec2[newRoom];
+        std::copy(begin(), end(), larger);
+        delete[] many;
+        many = larger;
+        room = newRoom;
+    }
+    // Without a look at what this held. Afterwards `other` is empty.
+    void take(Points& other) noexcept {
+        std::copy(other.few, other.few + kInPlace, few);
+        many = std::exchange(other.many, nullptr);
+        length = std::exchange(other.length, 0);
+        room = std::exchange(other.room, kInPlace);
+    }
+
+    FloatVec2 few[kInPlace];
+    FloatVec2* many = nullptr;
+    size_type length = 0;
+    size_type room = kInPlace;
+};
+static_assert(std::is_nothrow_move_constructible_v<Points>, "elements move when paths grow");
+
+}  // namespace tarn::engine
+
+#endif

@@ -1,0 +1,195 @@
+#include <Engine/Base/points.h>
+
+#include "support/allocations.h"
+#include "support/random.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <stdexcept>
+
+using tarn::engine::FloatVec2;
+using tarn::engine::Points;
+
+namespace {
+
+std::vector<FloatVec2> counted(std::size_t count) {
+    std::vector<FloatVec2> list;
+    for (std::size_t i = 0; i < count; ++i) {
+        list.push_back({static_cast<double>(i), static_cast<double>(i) / 2});
+    }
+    return list;
+}
+
+void expectSame(Points const& points, std::vector<FloatVec2> const& expected) {
+    ASSERT_EQ(points.size(), expected.size());
+    ASSERT_EQ(points.empty(), expected.empty());
+    ASSERT_GE(points.capacity(), points.size());
+    ASSERT_TRUE(std::equal(points.begin(), points.end(), expected.begin(), expected.end()));
+    ASSERT_TRUE(std::equal(points.rbegin(), points.rend(), expected.rbegin(), expected.rend()));
+    ASSERT_EQ(std::vector<FloatVec2>(points), expected);
+    ASSERT_EQ(points, Points(expected));
+    for (std::size_t i = 0; i < expected.size(); ++i) {
+        ASSERT_EQ(points[i], expected[i]);
+        ASSERT_EQ(points.at(i), expected[i]);
+    }
+}
+
+}  // namespace
+
+TEST(Points, AreMadeLikeAVector) {
+    expectSame(Points(), {});
+    expectSame(Points(2), {{0, 0}, {0, 0}});
+    expectSame(Points(2, {1, 2}), {{1, 2}, {1, 2}});
+    expectSame({{1, 2}}, {{1, 2}});
+    expectSame({{1, 2}, {3, 4}, {5, 6}, {7, 8}}, {{1, 2}, {3, 4}, {5, 6}, {7, 8}});
+    for (std::size_t size = 0; size < 9; ++size) {
+        std::vector<FloatVec2> const list = counted(size);
+        expectSame(list, list);
+        expectSame(Points(list.begin(), list.end()), list);
+        Points points = list;
+        Points copy = points;
+        expectSame(copy, list);
+        Points moved = std::move(copy);
+        expectSame(moved, list);
+        expectSame(copy, {});  // NOLINT(bugprone-use-after-move)
+        copy = moved;
+        expectSame(copy, list);
+        moved = std::move(copy);
+        expectSame(moved, list);
+        moved = *&moved;
+        expectSame(moved, list);
+        Points other{{9, 9}};
+        swap(moved, other);
+        expectSame(moved, {{9, 9}});
+        expectSame(other, list);
+    }
+}
+
+TEST(Points, OfUpToThreeAllocateNothing) {
+    tests::AllocationCounter counter;
+    Points points{{1, 2}, {3, 4}, {5, 6}};
+    Points copy = points;
+    Points const moved = std::move(copy);
+    points = {{7, 8}};
+    points.push_back({9, 10});
+    points.insert(points.begin(), {11, 12});
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_EQ(moved.size(), 3u);
+    points.push_back({13, 14});
+    EXPECT_EQ(counter.count(), 1u);
+    static_assert(sizeof(Points) <= 72);
+}
+
+TEST(Points, CompareAsFloatingPointNumbersDo) {
+    EXPECT_TRUE((Points{{0.0, 1}} == Points{{-0.0, 1}}));
+    EXPECT_TRUE((Points{{NAN, 1}} != Points{{NAN, 1}}));
+    EXPECT_TRUE((Points{{1, 1}} != Points{{1, 1}, {1, 1}}));
+}
+
+TEST(Points, RefuseAnIndexOutOfRange) {
+    Points points{{1, 2}};
+    Points const& constant = points;
+    EXPECT_THROW(points.at(1), std::out_of_range);
+    EXPECT_THROW(constant.at(static_cast<std::size_t>(-1)), std::out_of_range);
+}
+
+TEST(Points, StayAsTheyWereWhenAllocationFails) {
+    Points points = counted(3);
+    auto const untouched = [&] { expectSame(points, counted(3)); };
+    EXPECT_EQ(tests::failEachAllocation([&] { points.push_back({9, 9}); }, untouched), 1u);
+    points = counted(3);
+    EXPECT_EQ(tests::failEachAllocation([&] { points.reserve(100); }, untouched), 1u);
+    EXPECT_EQ(points.capacity(), 100u);
+    Points const more = counted(50);
+    EXPECT_EQ(tests::failEachAllocation([&] { points = more; }, untouched), 1u);
+    expectSame(points, counted(50));
+}
+
+TEST(Points, DoWhatAVectorDoes) {
+    tests::Random random(42);
+    for (int round = 0; round < 300; ++round) {
+        Points points;
+        std::vector<FloatVec2> model;
+        for (int step = 0; step < 60; ++step) {
+            FloatVec2 const p{random.number(), random.number()};
+            std::size_t const at = random.below(model.size() + 1);
+            auto const offset = static_cast<std::ptrdiff_t>(at);
+            switch (random.below(16)) {
+                case 0:
+                    points.emplace_back(p.x, p.y);
+                    model.push_back(p);
+                    break;
+                case 1:
+                    points.insert(points.begin() + offset, p);
+                    model.insert(model.begin() + offset, p);
+                    break;
+                case 2:
+                    points.insert(points.begin() + offset, at, p);
+                    model.insert(model.begin() + offset, at, p);
+                    break;
+                case 3:
+                    points.insert(points.begin() + offset, {p, p});
+                    model.insert(model.begin() + offset, {p, p});
+                    break;
+                case 4:
+                    if (at == model.size()) break;
+                    points.erase(points.begin() + offset);
+                    model.erase(model.begin() + offset);
+                    break;
+                case 5:
+                    points.erase(points.cbegin() + offset, points.cend());
+                    model.erase(model.begin() + offset, model.end());
+                    break;
+                case 6:
+                    points.resize(at, p);
+                    model.resize(at, p);
+                    break;
+                case 7:
+                    points.resize(model.size() + 2, p);
+                    model.resize(model.size() + 2, p);
+                    break;
+                case 8:
+                    points.assign(3, p);
+                    model.assign(3, p);
+                    break;
+                case 9:
+                    points.assign({p, p});
+                    model.assign({p, p});
+                    break;
+                case 10: points.shrink_to_fit(); break;
+                case 11:
+                    if (model.empty()) break;
+                    points.pop_back();
+                    model.pop_back();
+                    break;
+                case 12:
+                    if (model.empty()) break;
+                    points.front() = p;
+                    model.front() = p;
+                    ASSERT_EQ(points.back(), model.back());
+                    break;
+                case 13: {  // Of its own points.
+                    std::vector<FloatVec2> const own = model;
+                    points.insert(points.begin() + offset, points.begin(), points.end());
+                    model.insert(model.begin() + offset, own.begin(), own.end());
+                    if (model.size() > 40) {
+                        points.clear();
+                        model.clear();
+                    }
+                    break;
+                }
+                case 14:
+                    points.emplace(points.begin() + offset, p.x, p.y);
+                    model.insert(model.begin() + offset, p);
+                    break;
+                default:
+                    points.push_back(p);
+                    model.push_back(p);
+                    break;
+            }
+            expectSame(points, model);
+            if (HasFatalFailure()) return;
+        }
+    }
+}
