@@ -32,10 +32,14 @@ inline void agree(bool same, char const* what) {
     std::exit(1);
 }
 
+/// Puts the operation in its place in the table: that of its first mention.
+void announce(std::string const& operation);
+
 /// Registers `work`, which is timed, on what `prepare` makes, which is not. `work` returns what it
 /// made, so that its destruction is not timed either.
 template <class Prepare, class Work>
 void measure(std::string const& operation, std::string const& who, Prepare prepare, Work work) {
+    announce(operation);
     benchmark::RegisterBenchmark((operation + "|" + who).c_str(),
                                  [=](benchmark::State& state) {
                                      for (auto _ : state) {

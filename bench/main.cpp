@@ -34,15 +34,18 @@ std::vector<Operation>& operations() {
     return list;
 }
 
-std::vector<double>& timesOf(std::string const& operation, std::string const& who) {
+Operation& operationNamed(std::string const& name) {
     auto found = std::find_if(operations().begin(), operations().end(),
-                              [&](Operation const& o) { return o.name == operation; });
-    if (found == operations().end()) {
-        operations().push_back({operation, {}, {}});
-        found = std::prev(operations().end());
-    }
-    if (found->times.count(who) == 0) found->order.push_back(who);
-    return found->times[who];
+                              [&](Operation const& o) { return o.name == name; });
+    if (found != operations().end()) return *found;
+    operations().push_back({name, {}, {}});
+    return operations().back();
+}
+
+std::vector<double>& timesOf(std::string const& operation, std::string const& who) {
+    Operation& named = operationNamed(operation);
+    if (named.times.count(who) == 0) named.order.push_back(who);
+    return named.times[who];
 }
 
 double median(std::vector<double> values) {
@@ -105,6 +108,8 @@ void printOperation(Operation const& operation) {
 void target(std::string operation, double atMost, std::string against) {
     targets().push_back({std::move(operation), atMost, std::move(against)});
 }
+
+void announce(std::string const& operation) { operationNamed(operation); }
 
 void record(std::string operation, std::string who, double figure) {
     timesOf(operation, who).push_back(figure);

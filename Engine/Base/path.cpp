@@ -59,9 +59,12 @@ std::shared_ptr<Path const> Path::EmptyPath() {
     return emptyPathSharedPtr;
 }
 
+// Nothing but the list itself can fail to grow: the points fit in place.
 PathBuilder& PathBuilder::add(PathInstruction instruction,
                               std::initializer_list<FloatVec2> points) {
-    elements.push_back({instruction, points});
+    PathElement& element = elements.emplace_back();
+    element.instruction = instruction;
+    for (FloatVec2 const& point : points) element.points.push_back(point);
     return *this;
 }
 

@@ -307,7 +307,9 @@ public:
     /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
     /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
     bool operator==(Value const& other) const {
-        return storage.which() == other.storage.which() && contentEquals(other);
+        if (storage.which() != other.storage.which()) return false;
+        double const* number = boost::get<double>(&storage);
+        return number != nullptr ? *number == double(other) : contentEquals(other);
     }
     bool operator!=(Value const& other) const { return !(*this == other); }
 

@@ -16,10 +16,12 @@ work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 
 cat > "$work/prelude.h" <<'CPP'
+#include <Engine/Base/fwd.h>
 #include <Engine/Base/easing.h>
 #include <Engine/Base/layers.h>
 #include <Engine/Base/media.h>
 #include <Engine/Base/patch.h>
+#include <Engine/Base/patch_index.h>
 #include <Engine/Base/path.h>
 #include <Engine/Base/unstructured.h>
 #include <Engine/Base/value.h>
