@@ -9,6 +9,9 @@
 
 #include <climits>
 #include <cmath>
+#include <functional>
+
+#include <pthread.h>
 
 using namespace tarn::engine;
 
@@ -382,6 +385,127 @@ TEST(Unstructured, SurvivesFailingAllocations) {
                   [&] { target = Unstructured(Unstructured::removeEmptyValues(*source.ifMap())); },
                   [&] { EXPECT_EQ(target, source); }),
               8u);
+    EXPECT_EQ(target, source);
+}
+
+namespace {
+
+// Levels around `leaf`, of arrays (`kind` 0), of maps (1), or of both in turn, with something
+// beside each of them.
+Unstructured nested(std::size_t levels, int kind, Unstructured leaf) {
+    for (std::size_t i = 0; i < levels; ++i) {
+        if (kind == 0 || (kind == 2 && i % 2 == 0)) {
+            List list;
+            list.push_back("before");
+            list.push_back(std::move(leaf));
+            list.push_back(1);
+            leaf = std::move(list);
+        } else {
+            Map map;
+            map["a"] = List{1};
+            map["b"] = std::move(leaf);
+            map["c"] = "after";
+            leaf = std::move(map);
+        }
+    }
+    return leaf;
+}
+
+// Runs `work` on a thread with so many bytes of stack.
+void onStackOf(std::size_t bytes, std::function<void()> work) {
+    pthread_attr_t attributes;
+    ASSERT_EQ(pthread_attr_init(&attributes), 0);
+    ASSERT_EQ(pthread_attr_setstacksize(&attributes, bytes), 0);
+    pthread_t thread;
+    auto const run = [](void* argument) -> void* {
+        (*static_cast<std::function<void()>*>(argument))();
+        return nullptr;
+    };
+    ASSERT_EQ(pthread_create(&thread, &attributes, run, &work), 0);
+    ASSERT_EQ(pthread_join(thread, nullptr), 0);
+    pthread_attr_destroy(&attributes);
+}
+
+}  // namespace
+
+TEST(Unstructured, SurvivesAMillionLevelsOnASmallStack) {
+    constexpr std::size_t kLevels = 1000000;
+    struct Row {
+        char const* what;
+        Unstructured (*around)(Unstructured inner);
+    };
+    for (Row const& row : {
+             Row{"arrays",
+                 [](Unstructured inner) {
+                     List list;
+                     list.push_back(std::move(inner));
+                     return Unstructured(std::move(list));
+                 }},
+             Row{"maps",
+                 [](Unstructured inner) {
+                     Map map;
+                     map.emplace("", std::move(inner));
+                     return Unstructured(std::move(map));
+                 }},
+         }) {
+        SCOPED_TRACE(row.what);
+        onStackOf(512 * 1024, [&row] {
+            auto const built = [&row](Unstructured leaf) {
+                for (std::size_t i = 0; i < kLevels; ++i) leaf = row.around(std::move(leaf));
+                return leaf;
+            };
+            Unstructured tree = built(7);
+            Unstructured copy = tree;
+            EXPECT_TRUE(copy == tree);
+            EXPECT_TRUE(built(8) != tree);
+            EXPECT_FALSE(row.around(copy) == tree);
+            Unstructured moved = std::move(copy);
+            copy = moved;
+            EXPECT_TRUE(copy == moved);
+            copy = List{1};
+            moved = copy;
+            Value const value = tree;
+            EXPECT_TRUE(value.asUnstructured() == tree);
+            Map map;
+            map.emplace("kept", std::move(tree));
+            map.emplace("empty", Map{});
+            EXPECT_EQ(Unstructured::removeEmptyValues(map).size(), 1u);
+        });
+    }
+}
+
+TEST(Unstructured, HandlesEveryDepthAlike) {
+    for (std::size_t levels : {1u, 2u, 255u, 256u, 257u, 258u, 300u, 520u}) {
+        for (int kind : {0, 1, 2}) {
+            SCOPED_TRACE(testing::Message() << levels << " levels of kind " << kind);
+            Unstructured const tree = nested(levels, kind, "leaf");
+            Unstructured const copy = tree;
+            EXPECT_EQ(copy, tree);
+            EXPECT_NE(tree, nested(levels, kind, "Leaf"));
+            EXPECT_NE(tree, nested(levels + 1, kind, "leaf"));
+            EXPECT_NE(nested(levels + 1, kind, "leaf"), tree);
+            if (levels > 1) {
+                EXPECT_NE(tree, nested(levels, (kind + 1) % 3, "leaf"));
+            }
+        }
+    }
+    // Deep on several branches.
+    auto const bushy = [](char const* leaf) {
+        return Unstructured(List{nested(400, 0, 1), Map{{"x", nested(300, 1, leaf)}, {"y", 5}},
+                                 nested(300, 2, leaf), List{}});
+    };
+    EXPECT_EQ(bushy("a"), bushy("a"));
+    EXPECT_NE(bushy("a"), bushy("b"));
+    Unstructured const copy = bushy("c");
+    EXPECT_EQ(Unstructured(copy), bushy("c"));
+}
+
+TEST(Unstructured, OfDeepTreesSurvivesFailingAllocations) {
+    Unstructured const source = nested(300, 2, "a leaf that is long enough to be allocated");
+    Unstructured target = 5;
+    EXPECT_GT(tests::failEachAllocation([&] { target = source; },
+                                        [&] { EXPECT_EQ(target, Unstructured(5)); }),
+              300u);
     EXPECT_EQ(target, source);
 }
 

@@ -6,10 +6,17 @@
 
 #include <algorithm>
 #include <array>
+#include <iterator>
 
 namespace tarn::engine {
 
 namespace {
+
+// Trees of no more levels are handled by plain recursion, of some hundred bytes of stack a level.
+constexpr std::uint32_t kDeepestRecursion = 256;
+
+Unstructured const& elementOf(Unstructured const& element) { return element; }
+Unstructured const& elementOf(Unstructured::Map::value_type const& entry) { return entry.second; }
 
 constexpr std::array<char const*, 4> kComponentKeys{"X", "Y", "Z", "W"};
 
@@ -51,10 +58,10 @@ bool isEmptyContainer(Unstructured const& tree) {
 
 }  // namespace
 
-Unstructured::Unstructured(Map const& map) : storage(new Map(map)) {}
-Unstructured::Unstructured(Map&& map) : storage(new Map(std::move(map))) {}
-Unstructured::Unstructured(Array const& array) : storage(new Array(array)) {}
-Unstructured::Unstructured(Array&& array) : storage(new Array(std::move(array))) {}
+Unstructured::Unstructured(Map const& map) : storage(made(Map(map))) {}
+Unstructured::Unstructured(Map&& map) : storage(made(std::move(map))) {}
+Unstructured::Unstructured(Array const& array) : storage(made(Array(array))) {}
+Unstructured::Unstructured(Array&& array) : storage(made(std::move(array))) {}
 Unstructured::Unstructured(std::string const& text) : storage(new std::string(text)) {}
 Unstructured::Unstructured(std::string&& text) : storage(new std::string(std::move(text))) {}
 Unstructured::Unstructured(char const* text)
@@ -73,10 +80,38 @@ Unstructured& Unstructured::operator=(Unstructured&& other) noexcept {
     return *this;
 }
 
+std::uint32_t Unstructured::height() const {
+    if (Node<Map> const* map = node<Map>()) return map->height;
+    if (Node<Array> const* array = node<Array>()) return array->height;
+    return 0;
+}
+
+bool Unstructured::isDeep() const { return height() > kDeepestRecursion; }
+
+template <class T>
+Unstructured::Storage Unstructured::made(T content) {
+    std::uint32_t height = 0;
+    for (auto const& element : content) height = std::max(height, elementOf(element).height());
+    height = std::max(height, height + 1);  // Stays at the largest there is.
+    return new Node<T>{std::move(content), height};
+}
+
+template <class T>
+Unstructured::Storage Unstructured::copied(Node<T> const& node) {
+    return new Node<T>{node.content, node.height};
+}
+
 Unstructured::Storage Unstructured::copiedContent() const {
+    if (isDeep()) {
+        Unstructured copy;
+        copyDeep(*this, copy);
+        Storage const taken = copy.storage;
+        copy.forget();
+        return taken;
+    }
     switch (type()) {
-        case Type::Map: return new Map(*ifMap());
-        case Type::Array: return new Array(*ifArray());
+        case Type::Map: return copied(*node<Map>());
+        case Type::Array: return copied(*node<Array>());
         case Type::String: return new std::string(*ifString());
         case Type::Null:
         case Type::Float:
@@ -86,10 +121,121 @@ Unstructured::Storage Unstructured::copiedContent() const {
     return storage;
 }
 
+// Deep trees are copied container by container: each is made with null in the place of its deep
+// elements, whose turn comes later. Whatever is there when memory fails is a tree, and goes.
+void Unstructured::copyDeep(Unstructured const& from, Unstructured& to) {
+    std::vector<std::pair<Unstructured const*, Unstructured*>> waiting{{&from, &to}};
+    auto const put = [&waiting](Unstructured const& element, Unstructured& place) {
+        if (element.isDeep()) {
+            waiting.emplace_back(&element, &place);
+        } else {
+            place = element;
+        }
+    };
+    while (!waiting.empty()) {
+        auto const [source, target] = waiting.back();
+        waiting.pop_back();
+        if (Node<Array> const* array = source->node<Array>()) {
+            auto* const made = new Node<Array>{Array(), array->height};
+            ::new (static_cast<void*>(&target->storage)) Storage(made);
+            made->content.resize(array->content.size());
+            for (std::size_t i = 0; i < array->content.size(); ++i) {
+                put(array->content[i], made->content[i]);
+            }
+        } else {
+            Node<Map> const* const map = source->node<Map>();
+            auto* const made = new Node<Map>{Map(), map->height};
+            ::new (static_cast<void*>(&target->storage)) Storage(made);
+            for (auto const& [key, element] : map->content) {
+                put(element, made->content.try_emplace(made->content.end(), key)->second);
+            }
+        }
+    }
+}
+
+// For two containers of one kind, at least one of which is deep.
+bool Unstructured::equalDeep(Unstructured const& a, Unstructured const& b) {
+    std::vector<std::pair<Unstructured const*, Unstructured const*>> waiting{{&a, &b}};
+    auto const differ = [&waiting](Unstructured const& x, Unstructured const& y) {
+        if (x.type() != y.type() || !x.isDeep() || !y.isDeep()) return x != y;
+        waiting.emplace_back(&x, &y);
+        return false;
+    };
+    while (!waiting.empty()) {
+        auto const [x, y] = waiting.back();
+        waiting.pop_back();
+        if (Array const* array = x->ifArray()) {
+            Array const& other = *y->ifArray();
+            if (array->size() != other.size()) return false;
+            for (std::size_t i = 0; i < array->size(); ++i) {
+                if (differ((*array)[i], other[i])) return false;
+            }
+        } else {
+            Map const& other = *y->ifMap();
+            if (x->ifMap()->size() != other.size()) return false;
+            auto entry = other.begin();
+            for (auto const& [key, element] : *x->ifMap()) {
+                if (key != entry->first || differ(element, entry->second)) return false;
+                ++entry;
+            }
+        }
+    }
+    return true;
+}
+
+Unstructured* Unstructured::lastElement() const {
+    if (Node<Array>* array = node<Array>()) {
+        return array->content.empty() ? nullptr : &array->content.back();
+    }
+    Map& map = node<Map>()->content;
+    return map.empty() ? nullptr : &std::prev(map.end())->second;
+}
+
+void Unstructured::dropLastElement() {
+    if (Node<Array>* array = node<Array>()) {
+        array->content.pop_back();
+    } else {
+        Map& map = node<Map>()->content;
+        map.erase(std::prev(map.end()));
+    }
+}
+
+// Takes every element out of a deep container without recursion, and without memory, which may be
+// short: on the way down each container's last place keeps the container above it.
+void Unstructured::emptyDeep() noexcept {
+    Unstructured current;
+    std::swap(current.storage, storage);
+    Unstructured above;
+    for (;;) {
+        Unstructured* const last = current.lastElement();
+        if (last != nullptr && !last->isDeep()) {
+            current.dropLastElement();
+        } else if (last != nullptr) {
+            Unstructured below(std::move(*last));
+            *last = std::move(above);
+            above = std::move(current);
+            current = std::move(below);
+        } else if (above.type() == Type::Null) {
+            break;
+        } else {
+            delete current.node<Map>();
+            delete current.node<Array>();
+            current.forget();
+            current = std::move(above);
+            Unstructured* const link = current.lastElement();
+            above = std::move(*link);
+            current.dropLastElement();
+        }
+    }
+    storage = current.storage;
+    current.forget();
+}
+
 void Unstructured::destroyContent() noexcept {
+    if (isDeep()) emptyDeep();
     switch (type()) {
-        case Type::Map: delete ifMap(); break;
-        case Type::Array: delete ifArray(); break;
+        case Type::Map: delete node<Map>(); break;
+        case Type::Array: delete node<Array>(); break;
         case Type::String: delete ifString(); break;
         case Type::Null:
         case Type::Float:
@@ -142,6 +288,7 @@ Unstructured::operator FloatVec4() const {
 
 bool Unstructured::operator==(Unstructured const& other) const {
     if (type() != other.type()) return false;
+    if (isDeep() && other.isDeep()) return equalDeep(*this, other);
     switch (type()) {
         case Type::Null: return true;
         case Type::Map: return mapsEqual(*ifMap(), *other.ifMap());

@@ -15,6 +15,7 @@
 #include <boost/variant/variant.hpp>
 
 #include <cstddef>
+#include <cstdint>
 #include <map>
 #include <new>
 #include <string>
@@ -35,6 +36,9 @@ using EnableIfDataSource = std::enable_if_t<
 /// A value in the manner of JSON, with two kinds of integers and no truth value of its own (truth
 /// is the integer 1 or 0). It owns its subtree: a copy is deep, a move takes constant time, cannot
 /// fail and leaves null behind. No reading fails: what has no answer is zero, false or empty.
+/// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons of
+/// trees of more than 256 levels allocate a list of what is still to do; destruction never does.
+///
 /// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
 class Unstructured {
 public:
@@ -123,7 +127,10 @@ public:
     /// moved from or destroyed.
     Map const* ifMap() const { return content<Map>(); }
     Array const* ifArray() const { return content<Array>(); }
-    std::string const* ifString() const { return content<std::string>(); }
+    std::string const* ifString() const {
+        std::string* const* text = boost::get<std::string*>(&storage);
+        return text == nullptr ? nullptr : *text;
+    }
 
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
     /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
@@ -150,9 +157,17 @@ public:
     TARN_ENGINE_BASE_EXPORT static Map removeEmptyValues(Map const& map);
 
 private:
+    // A map or array with the number of levels from it downwards. Content never changes once it
+    // is here, so neither does the number; with it, deep trees are known before they are entered.
+    template <class T>
+    struct Node {
+        T content;
+        std::uint32_t height;
+    };
+
     // Maps, arrays and strings are on the heap and owned: that keeps the union at two words, which
     // arrays of numbers pay for each element, and moving it a plain copy.
-    using Storage = boost::variant<std::nullptr_t, Map*, Array*, double, long long,
+    using Storage = boost::variant<std::nullptr_t, Node<Map>*, Node<Array>*, double, long long,
                                    unsigned long long, std::string*>;
 
     bool ownsContent() const {
@@ -161,10 +176,26 @@ private:
         return (kOwning >> unsigned(storage.which()) & 1u) != 0;
     }
     template <class T>
-    T const* content() const {
-        T* const* pointer = boost::get<T*>(&storage);
+    Node<T>* node() const {
+        Node<T>* const* pointer = boost::get<Node<T>*>(&storage);
         return pointer == nullptr ? nullptr : *pointer;
     }
+    template <class T>
+    T const* content() const {
+        Node<T> const* const found = node<T>();
+        return found == nullptr ? nullptr : &found->content;
+    }
+    std::uint32_t height() const;
+    bool isDeep() const;
+    template <class T>
+    static Storage made(T content);
+    template <class T>
+    static Storage copied(Node<T> const& node);
+    static void copyDeep(Unstructured const& from, Unstructured& to);
+    static bool equalDeep(Unstructured const& a, Unstructured const& b);
+    Unstructured* lastElement() const;
+    void dropLastElement();
+    void emptyDeep() noexcept;
     // Afterwards this is null. Whoever calls it has taken the content over.
     void forget() noexcept { ::new (static_cast<void*>(&storage)) Storage(nullptr); }
     TARN_ENGINE_BASE_EXPORT Storage copiedContent() const;
