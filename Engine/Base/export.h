@@ -20,4 +20,14 @@
 #define TARN_ENGINE_BASE_EXPORT
 #endif
 
+/// The same for public functions that headers define, so that callers compile them in place: the
+/// library has each of them too, for those who find functions by name.
+#if defined(__GNUC__) && !defined(_WIN32) && defined(TARN_ENGINE_BASE_BUILDING)
+#define TARN_ENGINE_BASE_EXPORT_INLINE __attribute__((visibility("default"), used))
+#elif defined(_WIN32)
+#define TARN_ENGINE_BASE_EXPORT_INLINE
+#else
+#define TARN_ENGINE_BASE_EXPORT_INLINE TARN_ENGINE_BASE_EXPORT
+#endif
+
 #endif

@@ -36,8 +36,8 @@ using EnableIfDataSource = std::enable_if_t<
 /// A value in the manner of JSON, with two kinds of integers and no truth value of its own (truth
 /// is the integer 1 or 0). It owns its subtree: a copy is deep, a move takes constant time, cannot
 /// fail and leaves null behind. No reading fails: what has no answer is zero, false or empty.
-/// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons of
-/// trees of more than 256 levels allocate a list of what is still to do; destruction never does.
+/// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons
+/// of trees of more than 256 levels allocate a list of what is still to do; destruction never does.
 ///
 /// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
 class Unstructured {
@@ -56,7 +56,7 @@ public:
     };
 
     /// Null.
-    Unstructured() : storage(nullptr) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured() : storage(nullptr) {}
     TARN_ENGINE_BASE_EXPORT Unstructured(Map const& map);
     TARN_ENGINE_BASE_EXPORT Unstructured(Map&& map);
     TARN_ENGINE_BASE_EXPORT Unstructured(Array const& array);
@@ -65,9 +65,10 @@ public:
     TARN_ENGINE_BASE_EXPORT Unstructured(std::string&& text);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
     TARN_ENGINE_BASE_EXPORT Unstructured(char const* text);
-    Unstructured(long long const& integer) : storage(integer) {}
-    Unstructured(double const& number) : storage(number) {}
-    Unstructured(unsigned long long const& integer) : storage(integer) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(long long const& integer) : storage(integer) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(double const& number) : storage(number) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(unsigned long long const& integer)
+        : storage(integer) {}
     /// Every other integer type, by its sign; a truth value or a character is neither.
     template <class Integer, std::enable_if_t<(detail::isSignedInteger<Integer> ||
                                                detail::isUnsignedInteger<Integer>)&&!detail::
@@ -85,20 +86,23 @@ public:
     Unstructured(Source) = delete;
     Unstructured(std::nullptr_t) = delete;
 
-    Unstructured(Unstructured const& other)
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured const& other)
         : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
-    Unstructured(Unstructured&& other) noexcept : storage(other.storage) { other.forget(); }
+    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured&& other) noexcept
+        : storage(other.storage) {
+        other.forget();
+    }
     /// A failing allocation leaves this as it was; either side may be part of the other.
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured const& other);
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured&& other) noexcept;
-    ~Unstructured() {
+    TARN_ENGINE_BASE_EXPORT_INLINE ~Unstructured() {
         if (ownsContent()) destroyContent();
     }
 
     /// Null, by name.
-    static Unstructured Undefined() { return Unstructured(); }
+    TARN_ENGINE_BASE_EXPORT_INLINE static Unstructured Undefined() { return Unstructured(); }
 
-    Type type() const { return Type(storage.which()); }
+    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return Type(storage.which()); }
 
     /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy
     /// nothing.
@@ -109,7 +113,7 @@ public:
     /// The signed number, or the floating-point one (towards zero and kept in range, NaN as 0, for
     /// an integer). Deliberate: an unsigned number is an identifier and reads as 0 in both.
     TARN_ENGINE_BASE_EXPORT long long asInteger() const;
-    double asFloat() const {
+    TARN_ENGINE_BASE_EXPORT_INLINE double asFloat() const {
         if (double const* number = boost::get<double>(&storage)) return *number;
         if (long long const* integer = boost::get<long long>(&storage)) {
             return static_cast<double>(*integer);
@@ -125,9 +129,9 @@ public:
 
     /// The content in place, or null for every other kind. Lives until this is assigned to,
     /// moved from or destroyed.
-    Map const* ifMap() const { return content<Map>(); }
-    Array const* ifArray() const { return content<Array>(); }
-    std::string const* ifString() const {
+    TARN_ENGINE_BASE_EXPORT_INLINE Map const* ifMap() const { return content<Map>(); }
+    TARN_ENGINE_BASE_EXPORT_INLINE Array const* ifArray() const { return content<Array>(); }
+    TARN_ENGINE_BASE_EXPORT_INLINE std::string const* ifString() const {
         std::string* const* text = boost::get<std::string*>(&storage);
         return text == nullptr ? nullptr : *text;
     }

@@ -210,16 +210,16 @@ public:
     using ModelID = ResourceID<Type::Model>;
 
     /// The double 0.0.
-    Value() : storage(0.0) {}
-    Value(double number) : storage(number) {}
-    Value(long long integer) : storage(integer) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value() : storage(0.0) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(double number) : storage(number) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(long long integer) : storage(integer) {}
     /// Every other signed integer type; `char` is not one.
     template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
     Value(Integer integer) : Value(static_cast<long long>(integer)) {}
-    Value(bool truth) : storage(truth) {}
-    Value(FloatVec2 vector) : storage(vector) {}
-    Value(FloatVec3 vector) : storage(vector) {}
-    Value(FloatVec4 vector) : storage(vector) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(bool truth) : storage(truth) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec2 vector) : storage(vector) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec3 vector) : storage(vector) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec4 vector) : storage(vector) {}
     TARN_ENGINE_BASE_EXPORT Value(FloatMat4 const& matrix);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
     TARN_ENGINE_BASE_EXPORT Value(char const* text);
@@ -247,7 +247,7 @@ public:
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type);
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
 
-    Type type() const { return kTypes[storage.which()]; }
+    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return kTypes[storage.which()]; }
 
     /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
     /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
@@ -256,7 +256,7 @@ public:
     /// its truth is not being empty. A double becomes an integer towards zero, kept in range, and
     /// 0 for a NaN.
     TARN_ENGINE_BASE_EXPORT operator long long() const;
-    operator double() const {
+    TARN_ENGINE_BASE_EXPORT_INLINE operator double() const {
         double const* number = boost::get<double>(&storage);
         return number != nullptr ? *number : readDouble();
     }
@@ -306,12 +306,14 @@ public:
 
     /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
     /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
-    bool operator==(Value const& other) const {
+    TARN_ENGINE_BASE_EXPORT_INLINE bool operator==(Value const& other) const {
         if (storage.which() != other.storage.which()) return false;
         double const* number = boost::get<double>(&storage);
         return number != nullptr ? *number == double(other) : contentEquals(other);
     }
-    bool operator!=(Value const& other) const { return !(*this == other); }
+    TARN_ENGINE_BASE_EXPORT_INLINE bool operator!=(Value const& other) const {
+        return !(*this == other);
+    }
 
 private:
     friend std::string to_string(Value const& value);
@@ -395,7 +397,8 @@ TARN_ENGINE_BASE_EXPORT std::string portNameForTypeInfo(TypeInfo typeInfo, bool 
 /// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
 /// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
 /// refers into one of the arguments and lives no longer than both.
-inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo);
+TARN_ENGINE_BASE_EXPORT_INLINE inline Value const& castValueToType(Value const& value,
+                                                                   TypeInfo const& typeInfo);
 
 /// The same decision, as a copy of the value chosen.
 TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typeInfo);
@@ -403,8 +406,8 @@ TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typ
 /// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as
 /// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
 /// a value that lives to program exit.
-inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
-                                     unsigned long long index);
+TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
+indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long index);
 
 /// The empty loop that everyone shares; lives to program exit.
 TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();

@@ -10,8 +10,10 @@ if echo "$symbols" | grep -v "$allowed"; then
     echo "exported, and not part of the interface"
     exit 1
 fi
-for name in 'Value::Value(char const*)' 'PathBuilder::hexaRect(' '_helper(' \
-    '_findOutgoingConnectionsFromPort(' 'Path::~Path()' 'double tarn::engine::ease<double>(' \
+for name in 'Value::Value(double)' 'Value::type() const' 'PathBuilder::hexaRect(' '_helper(' \
+    'castValueToType(tarn::engine::Value const&' 'indexLoopCasting(' 'Unstructured::ifMap' \
+    'Unstructured::~Unstructured()' '_findOutgoingConnectionsFromPort(' 'Path::~Path()' \
+    'PatchIndex::findPatch' 'double tarn::engine::ease<double>(' \
     'std::hash<tarn::engine::Connection>::operator()('; do
     echo "$symbols" | grep -qF "$name" || { echo "not exported: $name"; exit 1; }
 done
