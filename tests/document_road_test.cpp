@@ -327,6 +327,21 @@ TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
                               "0\n");
 }
 
+TEST_F(DocumentRoad, ReadsTheDocumentThatItsFormIsExplainedWith) {
+    std::string const page = contentsOf(kDocuments + "README.md");
+    std::string const open = "```json\n";
+    std::size_t const begin = page.find(open);
+    ASSERT_NE(begin, std::string::npos);
+    std::size_t const start = begin + open.size();
+    Outcome const outcome = run(
+        write("page.json", page.substr(start, page.find("```", start) - start)) + " --frames 1");
+    EXPECT_EQ(outcome.errors, "");
+    EXPECT_EQ(outcome.output, "read a document: 3 patches in 2 levels, 4 ports, 1 connections\n"
+                              "ports: 4 Numbers\n"
+                              "\n"
+                              "frame  radius\n0      0\n");
+}
+
 TEST_F(DocumentRoad, TellsTheOutputsOfTimeNodesApart) {
     Outcome const outcome = run(write("time.json", graph(R"([{"id":1,"type":"basic/time","outputs":[
         {"name":"in ms","type":"number"},{"name":"in sec","type":"number"}]}])")) +

@@ -12,6 +12,7 @@
 
 #include <array>
 #include <cerrno>
+#include <cfenv>
 #include <climits>
 #include <cmath>
 #include <iomanip>
@@ -937,6 +938,29 @@ TEST(NumberText, AgreesWithTheModelUnderEveryPairOfDecimalPoints) {
             ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, ',', cout))
                 << std::hexfloat << number << " with " << cout;
         }
+    }
+}
+
+TEST(NumberText, FollowsTheRoundingMode) {
+    struct Row {
+        char const* what;
+        int mode;
+        char const* text;
+        char const* negative;
+    };
+    for (Row const& row : {
+             Row{"to the nearest", FE_TONEAREST, "0.12", "-0.12"},
+             Row{"up", FE_UPWARD, "0.13", "-0.12"},
+             Row{"down", FE_DOWNWARD, "0.12", "-0.13"},
+             Row{"towards zero", FE_TOWARDZERO, "0.12", "-0.12"},
+         }) {
+        SCOPED_TRACE(row.what);
+        ASSERT_EQ(std::fesetround(row.mode), 0);
+        std::string const text = to_string(Value(0.125));
+        std::string const negative = to_string(Value(-0.125));
+        std::fesetround(FE_TONEAREST);
+        EXPECT_EQ(text, row.text);
+        EXPECT_EQ(negative, row.negative);
     }
 }
 
