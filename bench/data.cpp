@@ -20,10 +20,11 @@ using namespace tarn::engine;
 namespace {
 
 // What a document is built with, for each library: leaves first.
-struct Ours {
-    using Node = Unstructured;
-    using Map = Unstructured::Map;
-    using List = Unstructured::Array;
+template <class NodeType, class MapType, class ListType>
+struct ByMove {
+    using Node = NodeType;
+    using Map = MapType;
+    using List = ListType;
     static Node number(double d) { return d; }
     static Node text(std::string s) { return Node(std::move(s)); }
     static Node integer(long long i) { return i; }
@@ -33,34 +34,22 @@ struct Ours {
     static void add(List& list, Node node) { list.push_back(std::move(node)); }
     static Node map(Map&& m) { return Node(std::move(m)); }
     static Node list(List&& l) { return Node(std::move(l)); }
-    static Node const* at(Node const& node, char const* key) {
-        Map const* map = node.ifMap();
+    static Node const* in(Map const* map, char const* key) {
         if (map == nullptr) return nullptr;
         auto const found = map->find(key);
         return found == map->end() ? nullptr : &found->second;
     }
+};
+
+struct Ours : ByMove<Unstructured, Unstructured::Map, Unstructured::Array> {
+    static Node const* at(Node const& node, char const* key) { return in(node.ifMap(), key); }
     static List const* elements(Node const& node) { return node.ifArray(); }
     static double numberOf(Node const& node) { return node.asFloat(); }
 };
 
-struct Nlohmann {
-    using Node = nlohmann::json;
-    using Map = nlohmann::json::object_t;
-    using List = nlohmann::json::array_t;
-    static Node number(double d) { return d; }
-    static Node text(std::string s) { return Node(std::move(s)); }
-    static Node integer(long long i) { return i; }
-    static void put(Map& map, std::string const& key, Node node) {
-        map.emplace(key, std::move(node));
-    }
-    static void add(List& list, Node node) { list.push_back(std::move(node)); }
-    static Node map(Map&& m) { return Node(std::move(m)); }
-    static Node list(List&& l) { return Node(std::move(l)); }
+struct Nlohmann : ByMove<nlohmann::json, nlohmann::json::object_t, nlohmann::json::array_t> {
     static Node const* at(Node const& node, char const* key) {
-        auto const* map = node.get_ptr<Map const*>();
-        if (map == nullptr) return nullptr;
-        auto const found = map->find(key);
-        return found == map->end() ? nullptr : &found->second;
+        return in(node.get_ptr<Map const*>(), key);
     }
     static List const* elements(Node const& node) { return node.get_ptr<List const*>(); }
     static double numberOf(Node const& node) { return node.get<double>(); }
