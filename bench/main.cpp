@@ -4,6 +4,8 @@
 
 #include "bench.h"
 
+#include <malloc.h>
+
 #include <algorithm>
 #include <atomic>
 #include <cstdio>
@@ -118,6 +120,11 @@ void record(std::string operation, std::string who, double figure) {
 }  // namespace bench
 
 int main(int argc, char** argv) {
+    // As in a process that has run for a while: memory that was given back is there, and the
+    // kernel has no part in what is measured.
+    mallopt(M_MMAP_THRESHOLD, 1 << 30);
+    mallopt(M_TRIM_THRESHOLD, 1 << 30);
+
     // The C++ library counts references without atomics while a program has one thread.
     std::atomic<bool> done{false};
     std::thread second([&done] {

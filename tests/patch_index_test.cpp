@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstdint>
 #include <iterator>
 
 using namespace tarn::engine;
@@ -122,6 +123,31 @@ TEST(PatchIndex, AnswersAboutASmallGraph) {
     EXPECT_TRUE(index.incomingConnectionsToPatch(0).empty());
     EXPECT_TRUE(ConnectionView().empty());
     EXPECT_TRUE(ConnectionView().begin() == ConnectionView().end());
+}
+
+// A connection with the first fields as given, and a port to lead to that makes its hash `hash`.
+Connection withHash(unsigned long long fromPatchId, unsigned long long fromPortId,
+                    unsigned long long toPatchId, std::uint64_t hash) {
+    std::uint64_t seed = 0;
+    for (std::uint64_t const field : {fromPatchId, fromPortId, toPatchId}) {
+        seed ^= field + 0x9e3779b9 + (seed << 6) + (seed >> 2);
+    }
+    return {fromPatchId, fromPortId, toPatchId,
+            (hash ^ seed) - 0x9e3779b9 - (seed << 6) - (seed >> 2)};
+}
+
+TEST(PatchIndex, TellsConnectionsOfOneHashApart) {
+    std::vector<Connection> connections;
+    for (unsigned long long i = 0; i < 40; ++i) {
+        connections.push_back(withHash(2, 22, i % 15, i < 30 ? 77 : 78));
+        ASSERT_EQ(std::hash<Connection>()(connections.back()), i < 30 ? 77u : 78u);
+    }
+    Patch child = withPorts(patch(2), {}, {port(22)});
+    PatchIndex const index(patch(1, {child}, connections));
+    Set const expected = findOutgoingConnectionsFromPort(index.root(), 22);
+    ASSERT_EQ(expected.size(), 25u);
+    expectView(index.outgoingConnections(22), &index.root(), expected);
+    expectView(index.outgoingConnectionsFromPatch(2), &index.root(), expected);
 }
 
 TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {

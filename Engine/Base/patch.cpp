@@ -1,5 +1,7 @@
 #include <Engine/Base/patch.h>
 
+#include <Engine/Base/prefetch.h>
+
 #include <cstdint>
 #include <ostream>
 
@@ -14,11 +16,6 @@ bool listsEqual(List const& a, List const& b) {
 
 // Walks wait for memory: the list of a child that is a few places ahead is asked for early.
 constexpr std::size_t kAhead = 6;
-void askFor([[maybe_unused]] void const* address) {
-#if defined(__GNUC__)
-    __builtin_prefetch(address);
-#endif
-}
 
 // Below a patch that is not the one itself.
 template <class AnyPatch>
@@ -28,7 +25,7 @@ AnyPatch const* findBelow(AnyPatch const& root, unsigned long long id) {
         if (child.id == id) return &child;
     }
     for (std::size_t i = 0; i < children.size(); ++i) {
-        if (i + kAhead < children.size()) askFor(children[i + kAhead].children.get());
+        if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].children.get());
         if (children[i].children->empty()) continue;
         if (AnyPatch const* found = findBelow(children[i], id)) return found;
     }
@@ -75,11 +72,11 @@ std::unordered_set<Connection> connectionsByField(Patch const& patch,
 Patch const* parentOfOutput(Patch const& root, unsigned long long portId) {
     std::vector<Patch> const& children = *root.children;
     for (std::size_t i = 0; i < children.size(); ++i) {
-        if (i + kAhead < children.size()) askFor(children[i + kAhead].outputs.get());
+        if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].outputs.get());
         if (findByField(*children[i].outputs, &Port::id, portId) != nullptr) return &root;
     }
     for (std::size_t i = 0; i < children.size(); ++i) {
-        if (i + kAhead < children.size()) askFor(children[i + kAhead].children.get());
+        if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].children.get());
         if (children[i].children->empty()) continue;
         if (Patch const* parent = parentOfOutput(children[i], portId)) return parent;
     }

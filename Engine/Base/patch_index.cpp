@@ -1,5 +1,9 @@
 #include <Engine/Base/patch_index.h>
 
+#include <Engine/Base/prefetch.h>
+
+#include <algorithm>
+#include <cstdint>
 #include <limits>
 #include <unordered_map>
 #include <utility>
@@ -20,25 +24,39 @@ std::uint64_t mixed(std::uint64_t key) {
     return key;
 }
 
-// A hash table with room for a known number of keys, in one block, probed in a line. A `Slot` has
-// a `key` and says itself whether it is free. The first value that comes for a key stays.
+// Tables and documents are larger than caches: what is needed a few steps on is asked for early.
+constexpr std::size_t kAhead = 8;
+
+// A hash table in one block, made from all its slots at once and probed in a line. A `Slot` has a
+// `key` and says itself whether it is free. The first slot that comes for a key stays.
 template <class Slot>
 class Table {
 public:
     // A quarter more slots than keys keeps the probes short, and one is always free.
-    explicit Table(std::size_t keys) : slots(keys + keys / 4 + 1) {}
+    explicit Table(std::vector<Slot> const& filled) : slots(filled.size() + filled.size() / 4 + 1) {
+        for (std::size_t i = 0; i < filled.size(); ++i) {
+            if (i + kAhead < filled.size()) prefetch(filled[i + kAhead].key);
+            Slot& slot = at(filled[i].key);
+            if (slot.isFree()) slot = filled[i];
+        }
+    }
 
     // The slot of the key, or the free one where it would be.
     Slot const& at(std::uint64_t key) const { return slots[positionOf(key)]; }
     Slot& at(std::uint64_t key) { return slots[positionOf(key)]; }
 
+    void prefetch(std::uint64_t key) const { detail::prefetch(&slots[startOf(key)]); }
+
     typename std::vector<Slot>::iterator begin() { return slots.begin(); }
     typename std::vector<Slot>::iterator end() { return slots.end(); }
 
 private:
+    // The upper half of the hash, scaled to the number of slots.
+    std::size_t startOf(std::uint64_t key) const {
+        return static_cast<std::size_t>((mixed(key) >> 32) * slots.size() >> 32);
+    }
     std::size_t positionOf(std::uint64_t key) const {
-        // The upper half of the hash, scaled to the number of slots.
-        std::size_t i = static_cast<std::size_t>((mixed(key) >> 32) * slots.size() >> 32);
+        std::size_t i = startOf(key);
         while (!slots[i].isFree() && slots[i].key != key) i = i + 1 == slots.size() ? 0 : i + 1;
         return i;
     }
@@ -77,17 +95,9 @@ template <class AnyPatch, class AnyPort>
 struct Graph {
     explicit Graph(AnyPatch const& root)
         : records(inSearchOrder(root)),
-          patches(records.size()),
-          inputs(count(&AnyPatch::inputs)),
-          outputs(count(&AnyPatch::outputs)) {
-        for (std::uint32_t i = 0; i < records.size(); ++i) {
-            AnyPatch const& patch = *records[i].patch;
-            PatchSlot& slot = patches.at(patch.id);
-            if (slot.isFree() && patch.id != 0) slot = {patch.id, i};
-            insert(inputs, *patch.inputs, i);
-            insert(outputs, *patch.outputs, i);
-        }
-    }
+          patches(patchSlots()),
+          inputs(portSlots(&AnyPatch::inputs)),
+          outputs(portSlots(&AnyPatch::outputs)) {}
 
     static std::vector<Record<AnyPatch>> inSearchOrder(AnyPatch const& root) {
         std::vector<Record<AnyPatch>> found{{&root, kNone}};
@@ -107,19 +117,26 @@ struct Graph {
         return found;
     }
 
-    template <class List>
-    std::size_t count(List AnyPatch::*ports) const {
-        std::size_t sum = 0;
-        for (Record<AnyPatch> const& record : records) sum += (record.patch->*ports)->size();
-        return sum;
+    std::vector<PatchSlot> patchSlots() const {
+        std::vector<PatchSlot> slots;
+        slots.reserve(records.size());
+        for (std::uint32_t i = 0; i < records.size(); ++i) {
+            if (records[i].patch->id != 0) slots.push_back({records[i].patch->id, i});
+        }
+        return slots;
     }
 
-    static void insert(Table<PortSlot<AnyPort>>& table, std::vector<AnyPort> const& ports,
-                       std::uint32_t owner) {
-        for (AnyPort const& port : ports) {
-            PortSlot<AnyPort>& slot = table.at(port.id);
-            if (slot.isFree()) slot = {port.id, &port, owner};
+    template <class List>
+    std::vector<PortSlot<AnyPort>> portSlots(List AnyPatch::*ports) const {
+        auto const listOf = [&](std::size_t i) { return (records[i].patch->*ports).get(); };
+        std::vector<PortSlot<AnyPort>> slots;
+        slots.reserve(records.size());
+        for (std::uint32_t i = 0; i < records.size(); ++i) {
+            if (i + 2 * kAhead < records.size()) detail::prefetch(listOf(i + 2 * kAhead));
+            if (i + kAhead < records.size()) detail::prefetch(listOf(i + kAhead)->data());
+            for (AnyPort const& port : *listOf(i)) slots.push_back({port.id, &port, i});
         }
+        return slots;
     }
 
     std::uint32_t recordOf(unsigned long long id) const { return patches.at(id).record; }
@@ -147,28 +164,40 @@ struct Graph {
     Table<PortSlot<AnyPort>> outputs;
 };
 
-// For each connection of a list, whether it is the first of its like.
-std::vector<bool> firstOfTheirLike(std::vector<Connection> const& connections) {
+// A connection, and where it stands.
+struct Place {
+    Connection const* connection;
+    std::uint32_t parent;
+    std::uint32_t position;
+};
+
+// Appends the connections of the list, each once.
+void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
+                std::vector<Place>& places) {
+    constexpr std::size_t kFew = 16;
     struct Slot {
         std::uint64_t key = 0;
         std::uint32_t position = kNone;
         bool isFree() const { return position == kNone; }
     };
-    std::vector<bool> isFirst(connections.size(), true);
-    Table<Slot> seen(connections.size());
-    std::unordered_map<std::size_t, std::unordered_set<Connection>> collisions;
-    for (std::uint32_t i = 0; i < connections.size(); ++i) {
-        std::uint64_t const hash = std::hash<Connection>()(connections[i]);
-        Slot& slot = seen.at(hash);
-        if (slot.isFree()) {
-            slot = {hash, i};
-        } else if (connections[slot.position] == connections[i]) {
-            isFirst[i] = false;
-        } else {
-            isFirst[i] = collisions[hash].insert(connections[i]).second;
+    std::vector<Slot> slots;
+    if (list.size() > kFew) {
+        slots.reserve(list.size());
+        for (std::uint32_t i = 0; i < list.size(); ++i) {
+            slots.push_back({std::hash<Connection>()(list[i]), i});
         }
     }
-    return isFirst;
+    Table<Slot> const firstOfHash(slots);
+    std::unordered_map<std::size_t, std::unordered_set<Connection>> collisions;
+    for (std::uint32_t i = 0; i < list.size(); ++i) {
+        bool isFirst = true;
+        if (slots.empty()) {
+            isFirst = std::find(list.begin(), list.begin() + i, list[i]) == list.begin() + i;
+        } else if (std::uint32_t const first = firstOfHash.at(slots[i].key).position; first != i) {
+            isFirst = list[first] != list[i] && collisions[slots[i].key].insert(list[i]).second;
+        }
+        if (isFirst) places.push_back({&list[i], parent, i});
+    }
 }
 
 }  // namespace
@@ -176,11 +205,19 @@ std::vector<bool> firstOfTheirLike(std::vector<Connection> const& connections) {
 struct PatchIndex::Tables {
     explicit Tables(Patch patch) : root(std::move(patch)), graph(root) { groupConnections(); }
 
+    // A connection's membership in a group.
+    struct Member {
+        std::uint32_t* group;
+        std::uint32_t position;
+    };
+
     // Groups are laid out behind one another: how many there are, then their positions in the
     // list. Counted first, so that each has its place.
     void groupConnections() {
-        forEachConnection(
-            [](std::uint32_t& group, std::uint32_t) { group = group == kNone ? 1 : group + 1; });
+        std::vector<Member> const members = findMembers();
+        for (Member const& member : members) {
+            *member.group = *member.group == kNone ? 1 : *member.group + 1;
+        }
         std::size_t size = 0;
         auto const place = [&](std::uint32_t& group) {
             if (group == kNone) return;
@@ -194,47 +231,68 @@ struct PatchIndex::Tables {
         }
         for (auto& slot : graph.outputs) place(slot.link);
         positions.assign(size, 0);
-        forEachConnection([this](std::uint32_t& group, std::uint32_t i) {
-            std::uint32_t& count = positions[group];
-            positions[group + ++count] = i;
-        });
-    }
-
-    // Calls `add(group, position)` for every group that a connection belongs to.
-    template <class Add>
-    void forEachConnection(Add add) {
-        for (std::uint32_t parent = 0; parent < graph.records.size(); ++parent) {
-            std::vector<Connection> const& list = *graph.records[parent].patch->connections;
-            if (list.empty()) continue;
-            std::vector<bool> const isFirst = firstOfTheirLike(list);
-            for (std::uint32_t i = 0; i < list.size(); ++i) {
-                if (isFirst[i]) addConnection(list[i], parent, i, add);
-            }
+        for (Member const& member : members) {
+            std::uint32_t& count = positions[*member.group];
+            positions[*member.group + ++count] = member.position;
         }
     }
 
-    template <class Add>
-    void addConnection(Connection const& connection, std::uint32_t parent, std::uint32_t i,
-                       Add add) {
-        auto const isChild = [&](std::uint32_t record) {
-            return record != kNone && graph.records[record].parent == parent;
+    std::vector<Place> placesOfConnections() const {
+        auto const listOf = [&](std::size_t i) {
+            return graph.records[i].patch->connections.get();
         };
+        std::size_t const size = graph.records.size();
+        std::vector<Place> places;
+        places.reserve(size);
+        for (std::uint32_t parent = 0; parent < size; ++parent) {
+            if (parent + 2 * kAhead < size) detail::prefetch(listOf(parent + 2 * kAhead));
+            if (parent + kAhead < size) detail::prefetch(listOf(parent + kAhead)->data());
+            if (!listOf(parent)->empty()) appendOnce(*listOf(parent), parent, places);
+        }
+        return places;
+    }
+
+    std::vector<Member> findMembers() {
+        std::vector<Place> const places = placesOfConnections();
+        std::vector<Member> members;
+        members.reserve(3 * places.size());
+        for (std::size_t i = 0; i < places.size(); ++i) {
+            if (i + kAhead < places.size()) {
+                Connection const& next = *places[i + kAhead].connection;
+                graph.patches.prefetch(next.toPatchId);
+                graph.outputs.prefetch(next.fromPortId);
+                graph.outputs.prefetch(next.toPortId);
+                graph.inputs.prefetch(next.toPortId);
+            }
+            addMembers(places[i], members);
+        }
+        return members;
+    }
+
+    void addMembers(Place const& place, std::vector<Member>& members) {
+        Connection const& connection = *place.connection;
+        auto const isChild = [&](std::uint32_t record) {
+            return record != kNone && graph.records[record].parent == place.parent;
+        };
+        auto const add = [&](std::uint32_t& group) { members.push_back({&group, place.position}); };
+
         std::uint32_t const from =
             connection.fromPatchId == 0 ? kNone : graph.recordOf(connection.fromPatchId);
-        if (isChild(from)) add(graph.records[from].outgoing, i);
+        if (isChild(from)) add(graph.records[from].outgoing);
         std::uint32_t const to =
             connection.toPatchId == 0 ? kNone : graph.recordOf(connection.toPatchId);
-        if (isChild(to)) add(graph.records[to].incoming, i);
+        if (isChild(to)) add(graph.records[to].incoming);
 
         auto& output = graph.outputs.at(connection.fromPortId);
-        if (isChild(innerOwner(output))) add(output.link, i);
+        if (isChild(innerOwner(output))) add(output.link);
 
-        if (!isChild(graph.ownerOfPort(connection.toPortId))) return;
+        std::uint32_t const owner = graph.ownerOfPort(connection.toPortId);
+        if (!isChild(owner)) return;
         auto& input = graph.inputs.at(connection.toPortId);
-        if (graph.ownerOfPort(connection.toPortId) == input.owner) {
-            if (input.link == kNone) input.link = i;
+        if (owner == input.owner) {
+            if (input.link == kNone) input.link = place.position;
         } else {
-            incomingToOutputs.emplace(connection.toPortId, i);
+            incomingToOutputs.emplace(connection.toPortId, place.position);
         }
     }
 

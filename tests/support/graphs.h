@@ -59,7 +59,7 @@ inline Patch randomPatch(Random& random, int depth) {
     };
     Patch result = withPorts(patch(random.below(12)), ports(), ports());
     std::vector<Connection> connections;
-    for (std::size_t n = random.below(5); n > 0; --n) {
+    for (std::size_t n = random.below(random.below(8) == 0 ? 60 : 5); n > 0; --n) {
         connections.push_back(
             {random.below(4), random.below(12), random.below(4), random.below(12)});
     }
