@@ -288,11 +288,14 @@ Unstructured::operator FloatVec4() const {
 
 bool Unstructured::operator==(Unstructured const& other) const {
     if (type() != other.type()) return false;
-    if (isDeep() && other.isDeep()) return equalDeep(*this, other);
     switch (type()) {
         case Type::Null: return true;
-        case Type::Map: return mapsEqual(*ifMap(), *other.ifMap());
-        case Type::Array: return arraysEqual(*ifArray(), *other.ifArray());
+        case Type::Map:
+            if (isDeep() && other.isDeep()) return equalDeep(*this, other);
+            return mapsEqual(*ifMap(), *other.ifMap());
+        case Type::Array:
+            if (isDeep() && other.isDeep()) return equalDeep(*this, other);
+            return arraysEqual(*ifArray(), *other.ifArray());
         case Type::Float: return asFloat() == other.asFloat();
         case Type::Integer:
         case Type::UnsignedInteger: return asId() == other.asId();
