@@ -1,9 +1,11 @@
 #include <Engine/Base/layers.h>
 
+#include "support/stack.h"
 #include "support/streams.h"
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <iomanip>
 #include <limits>
@@ -170,5 +172,54 @@ TEST(StrokeSettings, EqualsFieldByField) {
           StrokeSettings{1, 2, 3, 4, 5, 6, 9, true}, StrokeSettings{1, 2, 3, 4, 5, 6, 7, false}}) {
         EXPECT_NE(base, other);
         EXPECT_FALSE(base == other);
+    }
+}
+
+// The innermost layer of `kDeepest`, each the only one in the other's `list`.
+template <class Layer>
+Layer nested(std::vector<Layer> Layer::*list, Layer innermost) {
+    for (std::size_t i = 1; i < tests::kDeepest; ++i) {
+        Layer outer;
+        (outer.*list).push_back(std::move(innermost));
+        innermost = std::move(outer);
+    }
+    return innermost;
+}
+
+TEST(ModelLayer, NestsTenThousandLevelsDeep) {
+    struct Row {
+        char const* list;
+        std::vector<ModelLayer> ModelLayer::*layers;
+        std::size_t lines;
+    };
+    for (Row const& row : {Row{"children", &ModelLayer::children, tests::kDeepest},
+                           Row{"additional layers", &ModelLayer::additionalLayers, 1}}) {
+        SCOPED_TRACE(row.list);
+        tests::onStackOf(tests::kStack, [&row] {
+            ModelLayer const layer = nested(row.layers, ModelLayer{7, {}, {}});
+            ModelLayer copy = layer;
+            EXPECT_TRUE(copy == layer);
+            EXPECT_TRUE(layer != nested(row.layers, ModelLayer{8, {}, {}}));
+            std::string const text = written(layer);
+            EXPECT_EQ(std::count(text.begin(), text.end(), '\n'),
+                      static_cast<std::ptrdiff_t>(row.lines));
+            copy = ModelLayer();
+        });
+    }
+}
+
+TEST(RenderLayerHierarchy, NestsTenThousandLevelsDeep) {
+    for (auto const list :
+         {&RenderLayerHierarchy::children, &RenderLayerHierarchy::leadingLayers}) {
+        tests::onStackOf(tests::kStack, [list] {
+            RenderLayerHierarchy const layers = nested(list, hierarchy(7));
+            RenderLayerHierarchy copy = layers;
+            EXPECT_TRUE(copy == layers);
+            EXPECT_TRUE(layers != nested(list, hierarchy(8)));
+            std::string const text = written(layers);
+            EXPECT_EQ(std::count(text.begin(), text.end(), '\n'),
+                      static_cast<std::ptrdiff_t>(tests::kDeepest));
+            copy = RenderLayerHierarchy();
+        });
     }
 }

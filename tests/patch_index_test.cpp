@@ -1,8 +1,10 @@
 #include <Engine/Base/patch_index.h>
 
 #include "support/allocations.h"
+#include "support/graph_model.h"
 #include "support/graphs.h"
 #include "support/random.h"
+#include "support/stack.h"
 
 #include <gtest/gtest.h>
 
@@ -17,42 +19,6 @@ using namespace tests;
 namespace {
 
 using Set = std::unordered_set<Connection>;
-
-// The patch whose children hold the very object, by looking everywhere.
-template <class AnyPatch>
-AnyPatch const* modelParent(AnyPatch const& root, AnyPatch const* wanted) {
-    for (AnyPatch const* candidate : searchOrder(root)) {
-        for (AnyPatch const& child : *candidate->children) {
-            if (&child == wanted) return candidate;
-        }
-    }
-    return nullptr;
-}
-
-struct Found {
-    Port const* port = nullptr;
-    Patch const* owner = nullptr;
-};
-
-Found modelPort(Patch const& root, Array<Port> Patch::*ports, unsigned long long id) {
-    for (Patch const* candidate : searchOrder(root)) {
-        for (Port const& port : *(candidate->*ports)) {
-            if (port.id == id) return {&port, candidate};
-        }
-    }
-    return {};
-}
-
-Patch const* modelOwner(Patch const& root, unsigned long long id) {
-    for (Patch const* candidate : searchOrder(root)) {
-        for (auto const& list : {candidate->inputs, candidate->outputs}) {
-            for (Port const& port : *list) {
-                if (port.id == id) return candidate;
-            }
-        }
-    }
-    return nullptr;
-}
 
 // The connections of a list that are in the set, each once, in the order of the list, and the very
 // ones of the list.
@@ -193,28 +159,6 @@ TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {
     }
 }
 
-TEST(PatchIndex, KeepsEqualConnectionsApartFromThoseThatOnlyHashAlike) {
-    // {a, b, 0, 0} with any a and a b that makes up for it have one hash.
-    auto const hash = std::hash<Connection>();
-    Connection const first{1, 2, 3, 4};
-    auto const combine = [](std::uint64_t seed, std::uint64_t v) {
-        return seed ^ (v + 0x9e3779b9 + (seed << 6) + (seed >> 2));
-    };
-    std::uint64_t const afterThree = combine(combine(combine(0, 1), 2), 3);
-    std::uint64_t const other = combine(combine(combine(0, 1), 2), 5);
-    std::uint64_t const needed = combine(afterThree, 4);
-    Connection const second{1, 2, 5, (needed ^ other) - 0x9e3779b9 - (other << 6) - (other >> 2)};
-    ASSERT_EQ(hash(first), hash(second));
-    Connection const third{1, 2, 7, [&] {
-                               std::uint64_t const seed = combine(combine(combine(0, 1), 2), 7);
-                               return (needed ^ seed) - 0x9e3779b9 - (seed << 6) - (seed >> 2);
-                           }()};
-    ASSERT_EQ(hash(first), hash(third));
-    PatchIndex const index(patch(9, {withPorts(patch(1), {}, {port(2)})},
-                                 {first, second, first, third, second, third, second}));
-    expectView(index.outgoingConnections(2), &index.root(), {first, second, third});
-}
-
 TEST(PatchIndex, OutlivesTheCallersRecordAndMoves) {
     auto root = std::make_unique<Patch>(smallGraph());
     PatchIndex index(*root);
@@ -306,4 +250,23 @@ TEST(EvalPatchIndex, SeesChangesWhenItIsRebuilt) {
     index.rebuild();
     EXPECT_EQ(index.findInputPort(77), &evaluated.children->at(1).inputs->at(1));
     EXPECT_EQ(asItWas.findInputPort(77), nullptr);
+}
+
+TEST(PatchIndex, OfADeepGraphNeedsNoDeepStack) {
+    onStackOf(kStack, [] {
+        Patch root = withPorts(patch(kDeepest), {port(1)}, {port(2)});
+        for (unsigned long long id = kDeepest - 1; id > 0; --id) {
+            root = patch(id, {std::move(root)}, {{id + 1, 2, id + 1, 1}});
+        }
+        PatchIndex const index(root);
+        EXPECT_EQ(index.findPatch(kDeepest), findPatchRecursive(index.root(), kDeepest));
+        EXPECT_EQ(index.parentOf(kDeepest)->id, kDeepest - 1);
+        EXPECT_EQ(index.ownerOfPort(2)->id, kDeepest);
+        EXPECT_EQ(index.outgoingConnections(2).size(), 1u);
+        EXPECT_EQ(index.incomingConnection(1)->toPortId, 1u);
+        EvalPatchIndex evaluated{EvalPatch(root)};
+        EXPECT_EQ(evaluated.findPatch(kDeepest)->id, kDeepest);
+        evaluated.rebuild();
+        EXPECT_EQ(evaluated.parentOf(kDeepest)->id, kDeepest - 1);
+    });
 }

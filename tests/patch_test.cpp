@@ -3,8 +3,10 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/graph_model.h"
 #include "support/graphs.h"
 #include "support/random.h"
+#include "support/stack.h"
 #include "support/streams.h"
 
 #include <gtest/gtest.h>
@@ -596,50 +598,6 @@ TEST(GraphText, FlushesEveryLine) {
     EXPECT_EQ(&(stream << Connection()), &stream);
 }
 
-namespace {
-
-template <class AnyPatch>
-AnyPatch const* modelFind(AnyPatch const& root, unsigned long long id) {
-    for (AnyPatch const* candidate : searchOrder(root)) {
-        if (id != 0 && candidate->id == id) return candidate;
-    }
-    return nullptr;
-}
-
-// The parents that a search for an output port enters, in order: depth first.
-std::vector<Patch const*> depthFirst(Patch const& root) {
-    std::vector<Patch const*> order;
-    std::vector<Patch const*> stack{&root};
-    while (!stack.empty()) {
-        Patch const* const next = stack.back();
-        stack.pop_back();
-        order.push_back(next);
-        for (auto child = next->children->rbegin(); child != next->children->rend(); ++child) {
-            stack.push_back(&*child);
-        }
-    }
-    return order;
-}
-
-Optional<Set> modelOutgoing(Patch const& root, unsigned long long portId) {
-    for (Patch const* parent : depthFirst(root)) {
-        bool const holds = std::any_of(
-            parent->children->begin(), parent->children->end(), [&](Patch const& child) {
-                return std::any_of(child.outputs->begin(), child.outputs->end(),
-                                   [&](Port const& p) { return p.id == portId; });
-            });
-        if (!holds) continue;
-        Set found;
-        std::copy_if(parent->connections->begin(), parent->connections->end(),
-                     std::inserter(found, found.end()),
-                     [&](Connection const& c) { return c.fromPortId == portId; });
-        return found;
-    }
-    return std::nullopt;
-}
-
-}  // namespace
-
 TEST(Queries, AgreeWithAModelOnRandomTrees) {
     tests::Random random(33);
     for (int i = 0; i < 2000; ++i) {
@@ -690,4 +648,39 @@ TEST(Patch, SurvivesFailingAllocations) {
     EXPECT_GT(tests::failEachAllocation([&] { EvalPatch const evaluated(source); },
                                         [&] { EXPECT_EQ(source, document()); }),
               20u);
+}
+
+TEST(Patch, NestsTenThousandLevelsDeep) {
+    onStackOf(kStack, [] {
+        auto const chain = [](unsigned long long leafId) {
+            Patch result = withPorts(patch(leafId), {port(1)}, {port(2)});
+            for (unsigned long long id = kDeepest - 1; id > 0; --id) {
+                result = withPorts(patch(id, {std::move(result)}, {{id + 1, 2, id + 1, 1}}),
+                                   {port(10 * kDeepest + id)}, {port(20 * kDeepest + id)});
+            }
+            return result;
+        };
+        Patch root = chain(kDeepest);
+        EXPECT_TRUE(root == chain(kDeepest));
+        EXPECT_TRUE(root != chain(kDeepest + 1));
+        Patch const copy = root;
+        EXPECT_TRUE(copy == root);
+        EXPECT_EQ(findPatchRecursive(root, kDeepest)->outputs->at(0).id, 2u);
+        EXPECT_EQ(findPatchRecursive(root, kDeepest + 1), nullptr);
+        EXPECT_EQ(findOutgoingConnectionsFromPort(root, 2).size(), 1u);
+        EXPECT_TRUE(findOutgoingConnectionsFromPort(root, 3).empty());
+        std::ostringstream text;
+        text << root;
+        EXPECT_NE(text.str().find("[patch:" + std::to_string(kDeepest) + " "), std::string::npos);
+        EXPECT_EQ(text.str().find("[patch:" + std::to_string(kDeepest + 1) + " "),
+                  std::string::npos);
+
+        EvalPatch evaluated(root);
+        EXPECT_TRUE(evaluated == EvalPatch(root));
+        EXPECT_TRUE(evaluated != EvalPatch(chain(kDeepest + 1)));
+        EXPECT_EQ(findPatchRecursive(evaluated, kDeepest)->outputs->at(0).id, 2u);
+        EXPECT_EQ(findPatchRecursive(evaluated, kDeepest + 1), nullptr);
+        root = Patch();
+        evaluated = EvalPatch();
+    });
 }

@@ -4,14 +4,13 @@
 
 #include "support/allocations.h"
 #include "support/random.h"
+#include "support/stack.h"
 
 #include <gtest/gtest.h>
 
 #include <climits>
 #include <cmath>
 #include <functional>
-
-#include <pthread.h>
 
 using namespace tarn::engine;
 
@@ -411,21 +410,6 @@ Unstructured nested(std::size_t levels, int kind, Unstructured leaf) {
     return leaf;
 }
 
-// Runs `work` on a thread with so many bytes of stack.
-void onStackOf(std::size_t bytes, std::function<void()> work) {
-    pthread_attr_t attributes;
-    ASSERT_EQ(pthread_attr_init(&attributes), 0);
-    ASSERT_EQ(pthread_attr_setstacksize(&attributes, bytes), 0);
-    pthread_t thread;
-    auto const run = [](void* argument) -> void* {
-        (*static_cast<std::function<void()>*>(argument))();
-        return nullptr;
-    };
-    ASSERT_EQ(pthread_create(&thread, &attributes, run, &work), 0);
-    ASSERT_EQ(pthread_join(thread, nullptr), 0);
-    pthread_attr_destroy(&attributes);
-}
-
 }  // namespace
 
 TEST(Unstructured, SurvivesAMillionLevelsOnASmallStack) {
@@ -449,7 +433,7 @@ TEST(Unstructured, SurvivesAMillionLevelsOnASmallStack) {
                  }},
          }) {
         SCOPED_TRACE(row.what);
-        onStackOf(512 * 1024, [&row] {
+        tests::onStackOf(512 * 1024, [&row] {
             auto const built = [&row](Unstructured leaf) {
                 for (std::size_t i = 0; i < kLevels; ++i) leaf = row.around(std::move(leaf));
                 return leaf;

