@@ -1,5 +1,7 @@
 #include <Engine/Base/optional.h>
 
+#include "support/death.h"
+
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -54,9 +56,8 @@ TEST(Optional, ComparesEmptinessThenValues) {
 TEST(OptionalDeathTest, ReadingAnEmptyOneStopsTheProgram) {
     Optional<std::string> empty;
     Optional<std::string> const constant;
-    char const line[] =
-        "^Assertion failed: \\(hasValue\\(\\)\\), function value, file Engine/Base/optional, line "
-        "[0-9]+\\.\n$";
+    std::string const line =
+        tests::failedAssertion("hasValue\\(\\)", "value", "Engine/Base/optional");
     EXPECT_DEATH(empty.value(), line);
     EXPECT_DEATH(*empty, line);
     EXPECT_DEATH(empty->size(), line);

@@ -1,6 +1,7 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/death.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>
@@ -62,13 +63,11 @@ TEST(PathInstruction, HasItsNumberAndItsName) {
 TEST(PathInstructionDeathTest, HasNoOtherNames) {
     for (char const* name : {"Close", "close ", " close", "", "moveto", "curve"}) {
         EXPECT_DEATH(stringToPathInstruction(name),
-                     "^Assertion failed: \\(0\\), function stringToPathInstruction, file "
-                     "Engine/Base/path, line [0-9]+\\.\n$")
+                     tests::failedAssertion("0", "stringToPathInstruction", "Engine/Base/path"))
             << name;
     }
     EXPECT_DEATH(pathInstructionToString(PathInstruction(5)),
-                 "^Assertion failed: \\(0\\), function pathInstructionToString, file "
-                 "Engine/Base/path, line [0-9]+\\.\n$");
+                 tests::failedAssertion("0", "pathInstructionToString", "Engine/Base/path"));
 }
 
 TEST(PathElement, EqualsByInstructionAndPoints) {
