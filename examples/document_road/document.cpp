@@ -2,8 +2,10 @@
 
 using namespace tarn::engine;
 
-Document readDocument(std::string const& fileName) {
-    Json const json = readJsonFile(fileName);
+Document readDocument(std::string const& fileName) { return parseDocument(readFile(fileName)); }
+
+Document parseDocument(std::string const& text) {
+    Json const json = parseJson(text);
     Field const file(json);
     if (file.object().contains("nodes")) return readNodeGraph(file);
     if (file.object().contains("root")) return readOwnForm(file);

@@ -23,6 +23,7 @@ struct Document {
 
 // Tells the two forms apart by their content. Throws an InputError for what cannot be used.
 Document readDocument(std::string const& fileName);
+Document parseDocument(std::string const& text);
 
 // Our own form: see examples/documents/README.md.
 Document readOwnForm(Field const& file);

@@ -15,17 +15,6 @@ using tarn::engine::Unstructured;
 
 namespace {
 
-std::string wholeFile(std::string const& name) {
-    std::error_code error;
-    if (!std::filesystem::exists(name, error)) throw InputError("", "there is no such file");
-    if (std::filesystem::is_directory(name, error)) throw InputError("", "it is a folder");
-    std::ifstream file(name, std::ios::binary);
-    if (!file) throw InputError("", "it cannot be opened");
-    std::string text((std::istreambuf_iterator<char>(file)), {});
-    if (file.bad()) throw InputError("", "it cannot be read");
-    return text;
-}
-
 // Where byte `offset` is, as people count.
 std::string lineAndColumn(std::string_view text, std::size_t offset) {
     std::size_t line = 1;
@@ -92,8 +81,18 @@ std::string escaped(std::string const& key) {
 
 }  // namespace
 
-Json readJsonFile(std::string const& name) {
-    std::string const text = wholeFile(name);
+std::string readFile(std::string const& name) {
+    std::error_code error;
+    if (!std::filesystem::exists(name, error)) throw InputError("", "there is no such file");
+    if (std::filesystem::is_directory(name, error)) throw InputError("", "it is a folder");
+    std::ifstream file(name, std::ios::binary);
+    if (!file) throw InputError("", "it cannot be opened");
+    std::string text((std::istreambuf_iterator<char>(file)), {});
+    if (file.bad()) throw InputError("", "it cannot be read");
+    return text;
+}
+
+Json parseJson(std::string const& text) {
     if (text.find_first_not_of(" \t\r\n") == std::string::npos) {
         throw InputError("", "it is empty");
     }

@@ -27,9 +27,12 @@ struct InputError : std::runtime_error {
         : std::runtime_error(place.empty() ? problem : place + ": " + problem) {}
 };
 
-// The whole file. Throws an InputError that names line and column where it is no JSON, nests too
-// deeply or has a number beyond 64 bits.
-Json readJsonFile(std::string const& name);
+// The bytes of the file. Throws an InputError that says why there are none.
+std::string readFile(std::string const& name);
+
+// Throws an InputError that names line and column where the text is no JSON, nests too deeply or
+// has a number beyond 64 bits.
+Json parseJson(std::string const& text);
 
 // JSON as the library's data: truth becomes 1 or 0, and an integer is signed where it fits.
 tarn::engine::Unstructured toUnstructured(Json const& json);

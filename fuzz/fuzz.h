@@ -1,0 +1,76 @@
+// fuzz/fuzz.h: what the fuzz targets share: bytes as inputs, and a check that ends the program.
+
+#ifndef TARN_FUZZ_FUZZ_H
+#define TARN_FUZZ_FUZZ_H
+
+#include <fuzzer/FuzzedDataProvider.h>
+
+#include <cmath>
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <string>
+
+namespace fuzz {
+
+/// Ends the program where `holds` is false: that is what a fuzzer finds.
+inline void check(bool holds, char const* what) {
+    if (holds) return;
+    std::fprintf(stderr, "does not hold: %s\n", what);
+    std::abort();
+}
+
+inline std::uint64_t bits(double d) {
+    std::uint64_t result;
+    std::memcpy(&result, &d, sizeof result);
+    return result;
+}
+
+/// The same number to the last bit; any NaN is as good as another.
+inline bool same(double a, double b) {
+    return bits(a) == bits(b) || (std::isnan(a) && std::isnan(b));
+}
+
+/// The input, as numbers of any kind, small choices and texts. Beyond its end everything is zero.
+class Input {
+public:
+    Input(std::uint8_t const* data, std::size_t size) : provider(data, size) {}
+
+    bool ended() { return provider.remaining_bytes() == 0; }
+    std::size_t below(std::size_t end) {
+        return provider.ConsumeIntegralInRange<std::size_t>(0, end - 1);
+    }
+    bool chance() { return provider.ConsumeBool(); }
+    std::uint64_t word() { return provider.ConsumeIntegral<std::uint64_t>(); }
+    std::string text(std::size_t longest) { return provider.ConsumeRandomLengthString(longest); }
+    std::string rest() { return provider.ConsumeRemainingBytesAsString(); }
+
+    /// Any double at all, or one of those that occur in documents.
+    double anyDouble() {
+        switch (below(4)) {
+            case 0: {
+                std::uint64_t const word = provider.ConsumeIntegral<std::uint64_t>();
+                double d;
+                std::memcpy(&d, &word, sizeof d);
+                return d;
+            }
+            case 1: return provider.ConsumeIntegral<std::int8_t>();
+            case 2: return provider.ConsumeIntegral<std::int32_t>() / 200.0;
+            default: {
+                double const special[] = {0.0,  -0.0,   1000.0, 999.995, 0.005,     INFINITY,
+                                          -1e9, 5e-324, NAN,    1e300,   -INFINITY, 9.3e18};
+                return special[below(std::size(special))];
+            }
+        }
+    }
+    /// Finite, with an absolute value of at most a million and few binary digits.
+    double number() { return provider.ConsumeIntegralInRange<int>(-1000000, 1000000) / 16.0; }
+
+private:
+    FuzzedDataProvider provider;
+};
+
+}  // namespace fuzz
+
+#endif

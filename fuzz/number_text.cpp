@@ -1,0 +1,39 @@
+// The text of any number, with any decimal points of the C and the C++ library, beside what the C
+// library formats.
+
+#include "model.h"
+
+#include <Engine/Base/value.h>
+
+#include <clocale>
+#include <iostream>
+#include <locale>
+
+using namespace fuzz;
+
+namespace {
+
+struct Punctuation : std::numpunct<char> {
+    explicit Punctuation(char decimalPoint) : point(decimalPoint) {}
+    char do_decimal_point() const override { return point; }
+    char point;
+};
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
+    Input input(data, size);
+    char const* const localeNames[] = {"C", "de_DE.UTF-8"};
+    std::setlocale(LC_NUMERIC, localeNames[input.below(2)]);  // Where it is there.
+    char const points[] = {'.', '.', ',', ';'};
+    char const point = points[input.below(std::size(points))];
+    std::cout.imbue(std::locale(std::locale::classic(), new Punctuation(point)));
+    do {
+        double const d = input.anyDouble();
+        std::string const text = numberText(d, point);
+        check(to_string(tarn::engine::Value(d)) == text, "the text of a number");
+        tarn::engine::Value const vector(tarn::engine::FloatVec2{d, -d});
+        check(to_string(vector) == text + ", " + numberText(-d, point), "the text of a vector");
+    } while (!input.ended());
+    return 0;
+}

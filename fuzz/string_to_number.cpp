@@ -1,0 +1,26 @@
+// Any text as a number: all of it, or its truth.
+
+#include "model.h"
+
+#include <Engine/Base/value.h>
+
+#include <clocale>
+
+using namespace fuzz;
+
+extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
+    Input input(data, size);
+    char const* const localeNames[] = {"C", "de_DE.UTF-8"};
+    std::setlocale(LC_NUMERIC, localeNames[input.below(2)]);  // Where it is there.
+    std::string const text = input.rest();
+    tarn::engine::Value const value(text);
+    double const number = textAsNumber(text);
+    errno = 12345;
+    check(same(double(value), number), "a text as a number");
+    check(static_cast<long long>(value) == toInteger(number), "a text as an integer");
+    check(bool(value) == !text.empty(), "a text as a truth value");
+    check(static_cast<unsigned long long>(value) == 0, "a text as an identifier");
+    check(errno == 12345, "errno stays as it was");
+    check(*value.ifString() == text, "a text stays as it is");
+    return 0;
+}
