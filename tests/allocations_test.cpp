@@ -92,6 +92,8 @@ std::vector<Row> const kRows{
     {"value of a long text", 2, [](Inputs const&, Kept& k) { k.value = kLongText; }},
     {"value of an empty path", 1, [](Inputs const&, Kept& k) { k.value = Path(); }},
     {"value of a shared path", 0, [](Inputs const& in, Kept& k) { k.value = in.shared; }},
+    {"value of shared data", 0,
+     [](Inputs const& in, Kept& k) { k.value = in.data.sharedUnstructured(); }},
     {"value of null data", 1, [](Inputs const&, Kept& k) { k.value = Unstructured(); }},
 
     {"copy of a number", 0, [](Inputs const& in, Kept& k) { k.value = in.number; }},

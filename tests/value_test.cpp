@@ -637,6 +637,73 @@ TEST(Value, GivesItsPayloadInPlace) {
     }
 }
 
+TEST(Value, SharesDataThatIsGivenByPointer) {
+    auto const tree = std::make_shared<Unstructured const>(smallMap());
+    tests::AllocationCounter counter;
+    Value const value = tree;
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_EQ(value.type(), Type::Unstructured);
+    EXPECT_EQ(value.ifUnstructured(), tree.get());
+    EXPECT_EQ(value, Value(smallMap()));
+}
+
+TEST(Value, SharesAnElementOfADocumentThatItKeeps) {
+    auto document = std::make_shared<Unstructured const>(
+        Unstructured::Map{{"items", Unstructured::Array{1, Unstructured::Map{{"X", 2.5}}}}});
+    std::weak_ptr<Unstructured const> const watched = document;
+    Unstructured const& element = document->ifMap()->at("items").ifArray()->at(1);
+    tests::AllocationCounter counter;
+    Value const value = std::shared_ptr<Unstructured const>(document, &element);
+    document.reset();
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_FALSE(watched.expired());
+    EXPECT_EQ(value.ifUnstructured(), &element);
+    EXPECT_EQ(FloatVec2(value).x, 2.5);
+}
+
+TEST(Value, GivesItsPayloadToBeShared) {
+    std::vector<Value> const values{1,
+                                    2.5,
+                                    true,
+                                    FloatVec2{1, 2},
+                                    FloatVec3{1, 2, 3},
+                                    FloatVec4{1, 2, 3, 4},
+                                    Value::Image(5),
+                                    Value::Video(5),
+                                    Value::Sound(5),
+                                    Value::Model(5),
+                                    countingMatrix(),
+                                    linePath(),
+                                    "text",
+                                    smallMap()};
+    tests::AllocationCounter counter;
+    for (Value const& value : values) {
+        EXPECT_EQ(value.sharedFloatMat4().get(), value.asFloatMat4());
+        EXPECT_EQ(value.sharedPath().get(), value.ifPath());
+        EXPECT_EQ(value.sharedString().get(), value.ifString());
+        EXPECT_EQ(value.sharedUnstructured().get(), value.ifUnstructured());
+    }
+    EXPECT_EQ(counter.count(), 0u);
+
+    Value value = "kept";
+    std::shared_ptr<std::string const> const text = value.sharedString();
+    Value const again = Value(value).asType(Type::String);
+    EXPECT_NE(again.sharedString(), text);
+    value = 1;
+    EXPECT_EQ(*text, "kept");
+    EXPECT_EQ(text.use_count(), 1);
+    EXPECT_EQ(Value(std::shared_ptr<Path const>()).sharedPath(), nullptr);
+    Value const null = std::shared_ptr<Unstructured const>();
+    EXPECT_EQ(null.type(), Type::Unstructured);
+    EXPECT_EQ(null.sharedUnstructured(), nullptr);
+    EXPECT_EQ(null.asUnstructured(), Unstructured());
+    EXPECT_EQ(double(null), 0.0);
+    EXPECT_EQ(std::string(null), "??");
+    EXPECT_EQ(to_string(null), "unstructured");
+    EXPECT_EQ(null, Value(std::shared_ptr<Unstructured const>()));
+    EXPECT_NE(null, Value(Unstructured()));
+}
+
 TEST(Value, ReadingsOfScalarsAndVectorsAllocateNothing) {
     std::vector<Value> const values{1,
                                     2.5,

@@ -330,6 +330,16 @@ private:
     std::string number(double d) const { return (*this)(d); }
 };
 
+// What an alternative points to, itself or shared; nothing where another one is held.
+template <class T>
+T const* inside(std::shared_ptr<T const> const* held) {
+    return held != nullptr ? held->get() : nullptr;
+}
+template <class T>
+std::shared_ptr<T const> shared(std::shared_ptr<T const> const* held) {
+    return held != nullptr ? *held : nullptr;
+}
+
 }  // namespace
 
 // Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
@@ -364,6 +374,7 @@ Value::Value(std::string text) : storage(std::make_shared<std::string const>(std
 Value::Value(Path path) : storage(std::make_shared<Path const>(std::move(path))) {}
 Value::Value(std::shared_ptr<Path const> path) : storage(std::move(path)) {}
 Value::Value(Unstructured tree) : storage(std::make_shared<Unstructured const>(std::move(tree))) {}
+Value::Value(std::shared_ptr<Unstructured const> tree) : storage(std::move(tree)) {}
 
 Value::Value(unsigned long long id, Type type) {
     switch (type) {
@@ -442,23 +453,29 @@ Unstructured Value::asUnstructured() const {
 }
 
 FloatMat4 const* Value::asFloatMat4() const {
-    auto const* matrix = boost::get<std::shared_ptr<FloatMat4 const>>(&storage);
-    return matrix ? matrix->get() : nullptr;
+    return inside(boost::get<std::shared_ptr<FloatMat4 const>>(&storage));
 }
-
 Path const* Value::ifPath() const {
-    auto const* path = boost::get<std::shared_ptr<Path const>>(&storage);
-    return path ? path->get() : nullptr;
+    return inside(boost::get<std::shared_ptr<Path const>>(&storage));
 }
-
 std::string const* Value::ifString() const {
-    auto const* text = boost::get<std::shared_ptr<std::string const>>(&storage);
-    return text ? text->get() : nullptr;
+    return inside(boost::get<std::shared_ptr<std::string const>>(&storage));
+}
+Unstructured const* Value::ifUnstructured() const {
+    return inside(boost::get<std::shared_ptr<Unstructured const>>(&storage));
 }
 
-Unstructured const* Value::ifUnstructured() const {
-    auto const* tree = boost::get<std::shared_ptr<Unstructured const>>(&storage);
-    return tree ? tree->get() : nullptr;
+std::shared_ptr<FloatMat4 const> Value::sharedFloatMat4() const {
+    return shared(boost::get<std::shared_ptr<FloatMat4 const>>(&storage));
+}
+std::shared_ptr<Path const> Value::sharedPath() const {
+    return shared(boost::get<std::shared_ptr<Path const>>(&storage));
+}
+std::shared_ptr<std::string const> Value::sharedString() const {
+    return shared(boost::get<std::shared_ptr<std::string const>>(&storage));
+}
+std::shared_ptr<Unstructured const> Value::sharedUnstructured() const {
+    return shared(boost::get<std::shared_ptr<Unstructured const>>(&storage));
 }
 
 Value Value::asType(Type type) const {

@@ -236,6 +236,9 @@ public:
     /// Shares the path; nothing is copied.
     TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Path const> path);
     TARN_ENGINE_BASE_EXPORT Value(Unstructured tree);
+    /// Shares the data; nothing is copied. An aliasing pointer makes an element of a large document
+    /// a value: `std::shared_ptr<Unstructured const>(document, &element)`. The whole lives as long.
+    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Unstructured const> tree);
     /// The resource `id`. A `type` that is no resource is an assertion failure.
     TARN_ENGINE_BASE_EXPORT Value(unsigned long long id, Type type);
 
@@ -308,6 +311,13 @@ public:
     TARN_ENGINE_BASE_EXPORT std::string const* ifString() const;
     TARN_ENGINE_BASE_EXPORT Unstructured const* ifUnstructured() const;
 
+    /// The payload, shared: the pointer that every copy of the value holds, or null as above. Costs
+    /// one reference count, and keeps the payload for as long as it is held.
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<FloatMat4 const> sharedFloatMat4() const;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Path const> sharedPath() const;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<std::string const> sharedString() const;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Unstructured const> sharedUnstructured() const;
+
     /// A value of exactly `type`, made from the matching reading with a payload of its own, even
     /// when this value has that type already. An enumerator out of range is an assertion failure.
     TARN_ENGINE_BASE_EXPORT Value asType(Type type) const;
@@ -376,7 +386,7 @@ template <class T>
 constexpr bool isComparedByReading =
     std::is_arithmetic_v<T> || std::is_convertible_v<T const&, std::string> ||
     isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, std::shared_ptr<Path const>,
-            Unstructured>;
+            Unstructured, std::shared_ptr<Unstructured const>>;
 template <>
 inline constexpr bool isComparedByReading<Value> = false;
 
