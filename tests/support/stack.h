@@ -11,10 +11,12 @@
 #include <functional>
 
 #if defined(__has_feature)
-#define TARN_TESTS_CLANG_SANITIZES                                                                 \
-    (__has_feature(address_sanitizer) || __has_feature(thread_sanitizer))
-#else
-#define TARN_TESTS_CLANG_SANITIZES 0
+#if __has_feature(address_sanitizer)
+#define __SANITIZE_ADDRESS__ 1
+#endif
+#if __has_feature(thread_sanitizer)
+#define __SANITIZE_THREAD__ 1
+#endif
 #endif
 
 namespace tests {
@@ -34,12 +36,17 @@ inline void onStackOf(std::size_t bytes, std::function<void()> work) {
     pthread_attr_destroy(&attributes);
 }
 
-/// How deep graphs and layers may nest, and on how much stack. Sanitizers lay guards around every
-/// variable, and need a multiple of it.
+/// How deep graphs and layers may nest, and on how much stack. AddressSanitizer lays guards around
+/// every variable and needs a multiple of it; ThreadSanitizer knows 65,536 calls within one
+/// another.
+#if defined(__SANITIZE_ADDRESS__)
 constexpr std::size_t kDeepest = 10000;
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__) || TARN_TESTS_CLANG_SANITIZES
 constexpr std::size_t kStack = 64 * 1024 * 1024;
+#elif defined(__SANITIZE_THREAD__)
+constexpr std::size_t kDeepest = 1000;
+constexpr std::size_t kStack = 8 * 1024 * 1024;
 #else
+constexpr std::size_t kDeepest = 10000;
 constexpr std::size_t kStack = 8 * 1024 * 1024;
 #endif
 
