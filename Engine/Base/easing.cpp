@@ -65,7 +65,6 @@ long long eachComponent(long long from, long long to, Formula formula) {
 
 template <class T>
 T exponentialInOut(T from, T to, double t) {
-    if (t == 0.0 || t == 1.0) return t == 0.0 ? from : to;
     T const middle =
         eachComponent(from, to, [](double a, double delta) { return delta * 0.5 + a; });
     double const u = 2.0 * t;

@@ -128,12 +128,12 @@ public:
     }
     template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
     iterator insert(const_iterator position, Iterator first, Iterator last) {
-        auto const at = static_cast<size_type>(position - begin());
+        auto const index = static_cast<size_type>(position - begin());
         auto const before = static_cast<difference_type>(length);
         Points const added(first, last);  // What is inserted may be a part of this.
         append(added.data(), added.length);
-        std::rotate(begin() + at, begin() + before, end());
-        return begin() + at;
+        std::rotate(begin() + index, begin() + before, end());
+        return begin() + index;
     }
     template <class... Coordinates>
     iterator emplace(const_iterator position, Coordinates... coordinates) {

@@ -90,10 +90,10 @@ bool Unstructured::isDeep() const { return height() > kDeepestRecursion; }
 
 template <class T>
 Unstructured::Storage Unstructured::made(T content) {
-    std::uint32_t height = 0;
-    for (auto const& element : content) height = std::max(height, elementOf(element).height());
-    height = std::max(height, height + 1);  // Stays at the largest there is.
-    return new Node<T>{std::move(content), height};
+    std::uint32_t levels = 0;
+    for (auto const& element : content) levels = std::max(levels, elementOf(element).height());
+    levels = std::max(levels, levels + 1);  // Stays at the largest there is.
+    return new Node<T>{std::move(content), levels};
 }
 
 template <class T>
@@ -105,7 +105,7 @@ Unstructured::Storage Unstructured::copiedContent() const {
     if (isDeep()) {
         Unstructured copy;
         copyDeep(*this, copy);
-        Storage const taken = copy.storage;
+        Storage taken = copy.storage;
         copy.forget();
         return taken;
     }
@@ -136,18 +136,18 @@ void Unstructured::copyDeep(Unstructured const& from, Unstructured& to) {
         auto const [source, target] = waiting.back();
         waiting.pop_back();
         if (Node<Array> const* array = source->node<Array>()) {
-            auto* const made = new Node<Array>{Array(), array->height};
-            ::new (static_cast<void*>(&target->storage)) Storage(made);
-            made->content.resize(array->content.size());
+            auto* const copy = new Node<Array>{Array(), array->height};
+            ::new (static_cast<void*>(&target->storage)) Storage(copy);
+            copy->content.resize(array->content.size());
             for (std::size_t i = 0; i < array->content.size(); ++i) {
-                put(array->content[i], made->content[i]);
+                put(array->content[i], copy->content[i]);
             }
         } else {
             Node<Map> const* const map = source->node<Map>();
-            auto* const made = new Node<Map>{Map(), map->height};
-            ::new (static_cast<void*>(&target->storage)) Storage(made);
+            auto* const copy = new Node<Map>{Map(), map->height};
+            ::new (static_cast<void*>(&target->storage)) Storage(copy);
             for (auto const& [key, element] : map->content) {
-                put(element, made->content.try_emplace(made->content.end(), key)->second);
+                put(element, copy->content.try_emplace(copy->content.end(), key)->second);
             }
         }
     }

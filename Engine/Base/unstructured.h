@@ -89,7 +89,7 @@ public:
     TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured const& other)
         : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
     TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured&& other) noexcept
-        : storage(other.storage) {
+        : storage(std::move(other.storage)) {
         other.forget();
     }
     /// A failing allocation leaves this as it was; either side may be part of the other.
