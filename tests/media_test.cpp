@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <thread>
 
 using namespace tarn::engine;
 
@@ -93,12 +92,4 @@ TEST(MediaContainer, HasOneExtension) {
     for (int number : {0, 7, 255}) {
         EXPECT_EQ(extensionForMediaContainer(MediaContainer(number)), "") << number;
     }
-}
-
-TEST(KeyboardTypes, AreBuiltOnceByManyThreads) {
-    std::vector<std::vector<std::string> const*> seen(8);
-    std::vector<std::thread> threads;
-    for (auto& list : seen) threads.emplace_back([&list] { list = &keyboardTypes(); });
-    for (std::thread& thread : threads) thread.join();
-    for (auto const* list : seen) EXPECT_EQ(list, seen[0]);
 }

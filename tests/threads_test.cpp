@@ -61,14 +61,14 @@ TEST(Threads, TakeWhatIsMadeAtFirstUseAtOnce) {
     std::vector<Path const*> paths(kThreads);
     std::vector<Loop const*> loops(kThreads);
     std::vector<std::string> texts(kThreads);
-    std::vector<std::vector<std::string>> types(kThreads);
+    std::vector<std::vector<std::string> const*> types(kThreads);
     std::vector<Value const*> nulls(kThreads);
     onManyThreads([&](int i) {
         auto const n = static_cast<std::size_t>(i);
         texts[n] = to_string(Value(-0.001)) + " " + to_string(Value(-1234.56));
         paths[n] = Path::EmptyPath().get();
         loops[n] = &nullLoop();
-        types[n] = keyboardTypes();
+        types[n] = &keyboardTypes();
         nulls[n] = &indexLoopCasting({}, TypeInfo(), 3);
         EXPECT_EQ(double(indexLoopCasting({}, bounded, 3)), 1.0);
         EXPECT_EQ(easingFunctionNames().size(), 13u);
@@ -77,7 +77,7 @@ TEST(Threads, TakeWhatIsMadeAtFirstUseAtOnce) {
         EXPECT_EQ(texts[n], "0 -1234.6");
         EXPECT_EQ(paths[n], Path::EmptyPath().get());
         EXPECT_EQ(loops[n], &nullLoop());
-        EXPECT_EQ(types[n], keyboardTypes());
+        EXPECT_EQ(types[n], &keyboardTypes());
         EXPECT_EQ(nulls[n], nulls[0]);
     }
 }

@@ -18,7 +18,6 @@
 #include <cmath>
 #include <iomanip>
 #include <sstream>
-#include <thread>
 
 using namespace tarn::engine;
 
@@ -1245,22 +1244,6 @@ TEST(CastValueToType, AgreesWithAModelOnRandomNumbers) {
     }
 }
 
-TEST(Value, IsReadAndCopiedOnManyThreads) {
-    Value const shared = smallMap();
-    std::vector<std::thread> threads;
-    std::vector<std::string> texts(4);
-    for (std::string& text : texts) {
-        threads.emplace_back([&shared, &text] {
-            for (int i = 0; i < 2000; ++i) {
-                Value const copy = shared;
-                text = to_string(Value(double(FloatVec2(copy).x) + i)) + to_string(copy);
-            }
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    for (std::string const& text : texts) EXPECT_EQ(text, "2000.5unstructured");
-}
-
 TEST(Value, SurvivesFailingAllocations) {
     Value const before = "kept, and too long to be stored in place";
     Value value = before;
@@ -1277,19 +1260,3 @@ TEST(Value, InBracesFillsAVectorsFirstNumber) {
 }
 
 // In a program of its own under ctest, so that the first use is here.
-TEST(Statics, AreBuiltOnceByManyThreads) {
-    std::vector<std::thread> threads;
-    std::vector<std::pair<void const*, void const*>> seen(8);
-    std::vector<std::string> texts(8);
-    for (std::size_t i = 0; i < seen.size(); ++i) {
-        threads.emplace_back([&, i] {
-            texts[i] = to_string(Value(-0.0));
-            seen[i] = {Path::EmptyPath().get(), &nullLoop()};
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    for (std::size_t i = 0; i < seen.size(); ++i) {
-        EXPECT_EQ(seen[i], seen[0]);
-        EXPECT_EQ(texts[i], "0");
-    }
-}

@@ -31,5 +31,11 @@ if grep -E '_test\.cpp|document_road' "$work/build/compile_commands.json"; then
     echo "tests or examples are built for those who use us"
     exit 1
 fi
+for test in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`[A-Z][A-Za-z]+\.[A-Z][A-Za-z]+`' | tr -d '`'); do
+    grep -qE "^TEST(_F)?\(${test%.*}, ${test#*.}\)" "$root"/tests/*_test.cpp || { echo "no such test: $test"; exit 1; }
+done
+for script in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`(scripts/[a-z]+|\.ci/run)' | tr -d '`'); do
+    [ -x "$root/$script" ] || { echo "no such script: $script"; exit 1; }
+done
 lines=$(wc -l < "$work/main.cpp")
 echo "README.md: $lines lines compile and print what they say"
