@@ -1,0 +1,53 @@
+# What `cmake --install` puts where. The library and its development files are two components, and two
+# Debian packages.
+
+include(CMakePackageConfigHelpers)
+include(GNUInstallDirs)
+
+set(cmake_dir "${CMAKE_INSTALL_LIBDIR}/cmake/${PROJECT_NAME}")
+set(pkgconfig_dir "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
+
+install(TARGETS tarn_engine_base
+    EXPORT TarnEngineBaseTargets
+    LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT runtime NAMELINK_COMPONENT development
+    RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT runtime
+    ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development
+    INCLUDES DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+install(EXPORT TarnEngineBaseTargets
+    NAMESPACE tarn:: DESTINATION "${cmake_dir}" COMPONENT development)
+
+install(DIRECTORY Engine/Base
+    DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/Engine" COMPONENT development
+    FILES_MATCHING PATTERN "*.h"
+    PATTERN "prefetch.h" EXCLUDE
+    PATTERN "truncate.h" EXCLUDE)
+
+configure_package_config_file(cmake/TarnEngineBaseConfig.cmake.in
+    "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfig.cmake"
+    INSTALL_DESTINATION "${cmake_dir}")
+write_basic_package_version_file("${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfigVersion.cmake"
+    COMPATIBILITY SameMajorVersion)
+install(FILES
+    "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfig.cmake"
+    "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfigVersion.cmake"
+    DESTINATION "${cmake_dir}" COMPONENT development)
+
+# Relative to its own place, so that a tree that was moved still works.
+file(RELATIVE_PATH TARN_ENGINE_BASE_PREFIX_FROM_PC "/${pkgconfig_dir}" "/")
+string(REGEX REPLACE "/$" "" TARN_ENGINE_BASE_PREFIX_FROM_PC "${TARN_ENGINE_BASE_PREFIX_FROM_PC}")
+configure_file(cmake/tarn_engine_base.pc.in
+    "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc" @ONLY)
+install(FILES "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc"
+    DESTINATION "${pkgconfig_dir}" COMPONENT development)
+
+# gdb loads a script by the full name of the library, beneath its auto-load folder.
+set(library_file "libtarn_engine_base.so.${PROJECT_VERSION}")
+install(FILES tools/gdb/tarn_engine_base.py
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/gdb/auto-load${CMAKE_INSTALL_FULL_LIBDIR}"
+    RENAME "${library_file}-gdb.py" COMPONENT development)
+install(FILES tools/gdb/tarn_engine_base.py
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/tarn-engine-base/gdb" COMPONENT development)
+install(FILES tools/lldb/tarn_engine_base_lldb.py
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/tarn-engine-base/lldb" COMPONENT development)
+install(FILES tools/natvis/tarn_engine_base.natvis
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/tarn-engine-base/natvis" COMPONENT development)
