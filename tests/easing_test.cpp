@@ -226,6 +226,8 @@ TEST(Ease, OfIntegersIsCutTowardsZero) {
              Row{"too far back", EF::Linear, 0, 10, -1e30, LLONG_MIN},
              Row{"difference that wraps", EF::Linear, LLONG_MIN, LLONG_MAX, 1.0, LLONG_MIN},
              // -2^63 is its own negative in 64 bits: (0.5 - 2) * (-2^63 * 0.5).
+             Row{"the middle of such a difference", EF::QuadraticInOut, 0, LLONG_MIN, 0.5,
+                 4611686018427387904},
              Row{"difference that is its own negative", EF::QuadraticOut, 0, LLONG_MIN, 0.5,
                  6917529027641081856},
              Row{"quadratic", EF::QuadraticOut, 0, 100, 0.5, 75},

@@ -250,6 +250,17 @@ TEST(Patch, CopiesShareTheirLists) {
     EXPECT_EQ(copy.connections, original.connections);
 }
 
+TEST(EvalPort, IsEmptyAtFirst) {
+    EvalPort const port;
+    EXPECT_EQ(port.id, 0u);
+    EXPECT_EQ(port.tag, 0u);
+    EXPECT_EQ(port.evaluatorState, 0u);
+    EXPECT_FALSE(port.evaluatorFlag);
+    EXPECT_EQ(port.typeInfo, TypeInfo());
+    EXPECT_TRUE(port.values.empty());
+    EXPECT_EQ(port.name, "");
+}
+
 TEST(EvalPort, TakesOverAPort) {
     Port source = port(5, 6);
     source.typeInfo = {Type::Int, 1, Value(0), {}, Value("e")};

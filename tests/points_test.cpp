@@ -81,6 +81,15 @@ TEST(Points, OfUpToThreeAllocateNothing) {
     static_assert(sizeof(Points) <= 72);
 }
 
+TEST(Points, GiveBothEndsToThoseWhoOnlyRead) {
+    Points const few{{1, 2}, {3, 4}};
+    Points const many{{1, 2}, {3, 4}, {5, 6}, {7, 8}};
+    EXPECT_EQ(few.front(), (FloatVec2{1, 2}));
+    EXPECT_EQ(few.back(), (FloatVec2{3, 4}));
+    EXPECT_EQ(many.front(), (FloatVec2{1, 2}));
+    EXPECT_EQ(many.back(), (FloatVec2{7, 8}));
+}
+
 TEST(Points, CompareAsFloatingPointNumbersDo) {
     EXPECT_TRUE((Points{{0.0, 1}} == Points{{-0.0, 1}}));
     EXPECT_TRUE((Points{{NAN, 1}} != Points{{NAN, 1}}));
