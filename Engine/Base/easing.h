@@ -15,6 +15,7 @@
 
 namespace tarn::engine {
 
+/// The curves. The numbers are stored in documents.
 enum class EasingFunction : std::int32_t {
     Linear = 0,
     QuadraticIn = 1,

@@ -17,20 +17,24 @@ namespace tarn::engine {
 /// A tree of 3D model layers. Copying and comparing are deep. 8 MiB of stack are enough for 10,000
 /// levels of everything here.
 struct ModelLayer {
+    /// The layer, and those beneath it.
     unsigned long long id = 0;
     std::vector<ModelLayer> children;
     /// Compared and copied, but not part of the debug text.
     std::vector<ModelLayer> additionalLayers;
 
+    /// The same identifiers in the same trees.
     TARN_ENGINE_BASE_EXPORT bool operator==(ModelLayer const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(ModelLayer const& other) const;
 };
 
+/// One layer as the renderer knows it.
 struct RenderLayer {
     /// The renderer's own; carried, copied and compared.
     unsigned long long rendererState = 0;
     unsigned long long id = 0;
 
+    /// Both fields.
     TARN_ENGINE_BASE_EXPORT bool operator==(RenderLayer const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(RenderLayer const& other) const;
 };
@@ -38,10 +42,12 @@ struct RenderLayer {
 /// A layer with those that are drawn ahead of it and those nested in it. 8 MiB of stack are enough
 /// for 10,000 levels of everything here; the text of n levels has about n * n / 2 dashes.
 struct RenderLayerHierarchy {
+    /// The layer, those drawn ahead of it, and those nested in it.
     RenderLayer layer;
     std::vector<RenderLayerHierarchy> leadingLayers;
     std::vector<RenderLayerHierarchy> children;
 
+    /// The same layers in the same trees.
     TARN_ENGINE_BASE_EXPORT bool operator==(RenderLayerHierarchy const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(RenderLayerHierarchy const& other) const;
 };
@@ -49,6 +55,7 @@ struct RenderLayerHierarchy {
 /// How an outline is stroked. The first three fields are the renderer's: carried, copied and
 /// compared, and not looked at by `isVisible`.
 struct StrokeSettings {
+    /// The shapes of ends and corners, and how far a corner may reach, as the renderer counts them.
     unsigned char cap = 0;
     unsigned char join = 0;
     double miterLimit = 0.0;
@@ -67,6 +74,7 @@ struct StrokeSettings {
     /// epsilon. A NaN hides nothing.
     TARN_ENGINE_BASE_EXPORT bool isVisible() const;
 
+    /// Field by field, without a tolerance.
     TARN_ENGINE_BASE_EXPORT bool operator==(StrokeSettings const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(StrokeSettings const& other) const;
 };

@@ -20,6 +20,7 @@ enum class ImageFormat : unsigned char {
     PNG = 3,
 };
 
+/// What films and sounds are kept in.
 enum class MediaContainer : unsigned char {
     Unknown = 0,
     MOV = 1,

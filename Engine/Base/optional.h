@@ -20,6 +20,7 @@ namespace tarn::engine {
 template <class T>
 class Optional {
 public:
+    /// Empty.
     Optional() = default;
     Optional(std::nullopt_t) {}
 
@@ -28,10 +29,12 @@ public:
     template <class U, std::enable_if_t<std::is_same_v<std::decay_t<U>, T>, int> = 0>
     Optional(U&& value) : storage(std::forward<U>(value)) {}
 
+    /// Whether there is a value.
     bool hasValue() const { return storage.has_value(); }
     bool has_value() const { return hasValue(); }
     explicit operator bool() const { return hasValue(); }
 
+    /// The value. Of an empty one it is an assertion failure.
     T& value() & {
         check();
         return *storage;
@@ -45,10 +48,12 @@ public:
         return *std::move(storage);
     }
 
+    /// As `value()`.
     T& operator*() & { return value(); }
     T const& operator*() const& { return value(); }
     T&& operator*() && { return std::move(*this).value(); }
 
+    /// A member of the value.
     T* operator->() { return &value(); }
     T const* operator->() const { return &value(); }
 

@@ -45,17 +45,20 @@ struct Port {
     Value defaultValue;
     std::map<std::string, Unstructured> attributes;
 
+    /// Field by field.
     TARN_ENGINE_BASE_EXPORT bool operator==(Port const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(Port const& other) const;
 };
 
 /// From an output port to an input port. Held by the patch whose children both ends are.
 struct Connection {
+    /// The identifiers of both ends; each port by itself is unique in the document.
     unsigned long long fromPatchId = 0;
     unsigned long long fromPortId = 0;
     unsigned long long toPatchId = 0;
     unsigned long long toPortId = 0;
 
+    /// All four identifiers.
     TARN_ENGINE_BASE_EXPORT bool operator==(Connection const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(Connection const& other) const;
 };
@@ -100,6 +103,7 @@ static_assert(std::is_nothrow_move_constructible_v<Patch>, "lists of patches mov
 
 /// A port as the evaluator keeps it: with a list of the values that it has now.
 struct EvalPort {
+    /// Those of the port.
     unsigned long long id = 0;
     unsigned long long tag = 0;
     /// The evaluator's own; zero and false at first, and not looked at here.
@@ -110,9 +114,11 @@ struct EvalPort {
     std::vector<Value> values;
     std::string name;
 
+    /// Without values, or with the default value of `port` as the one that it has.
     TARN_ENGINE_BASE_EXPORT EvalPort();
     TARN_ENGINE_BASE_EXPORT explicit EvalPort(Port const& port);
 
+    /// Field by field, the evaluator's own included.
     TARN_ENGINE_BASE_EXPORT bool operator==(EvalPort const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPort const& other) const;
 };
@@ -120,6 +126,7 @@ struct EvalPort {
 /// A patch as the evaluator keeps it. Copies share the lists; two conversions do not. 8 MiB of
 /// stack are enough for 10,000 levels of everything here.
 struct EvalPatch {
+    /// Those of the patch.
     unsigned long long id = 0;
     unsigned long long builtin = 0;
     MutableArray<EvalPort> inputs = std::make_shared<std::vector<EvalPort>>();

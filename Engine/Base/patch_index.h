@@ -20,25 +20,31 @@ namespace tarn::engine {
 /// view and its references live as long as the index that gave it.
 class ConnectionView {
 public:
+    /// Goes forward, over and over if wanted.
     class Iterator {
     public:
+        /// As the standard library wants them.
         using iterator_category = std::forward_iterator_tag;
         using value_type = Connection;
         using difference_type = std::ptrdiff_t;
         using pointer = Connection const*;
         using reference = Connection const&;
 
+        /// Equal to nothing but its like, or at a connection of the list.
         Iterator() = default;
         Iterator(Connection const* connections, std::uint32_t const* at)
             : list(connections), position(at) {}
 
+        /// The very connection in the list.
         reference operator*() const { return list[*position]; }
         pointer operator->() const { return &list[*position]; }
+        /// One further; the second form answers where it was.
         Iterator& operator++() {
             ++position;
             return *this;
         }
         Iterator operator++(int) { return {list, position++}; }
+        /// Whether both are at one place of one view.
         friend bool operator==(Iterator a, Iterator b) { return a.position == b.position; }
         friend bool operator!=(Iterator a, Iterator b) { return a.position != b.position; }
 
@@ -47,10 +53,12 @@ public:
         std::uint32_t const* position = nullptr;
     };
 
+    /// Empty, or of the connections of a list at `count` positions.
     ConnectionView() = default;
     ConnectionView(Connection const* connections, std::uint32_t const* positions, std::size_t count)
         : list(connections), first(positions), length(count) {}
 
+    /// As of a container that is only read. All take constant time.
     Iterator begin() const { return {list, first}; }
     Iterator end() const { return {list, first + length}; }
     std::size_t size() const { return length; }
@@ -113,12 +121,14 @@ private:
 /// may change freely.
 class EvalPatchIndex {
 public:
+    /// Shares the lists of `root`. Costs as that of `PatchIndex`.
     TARN_ENGINE_BASE_EXPORT explicit EvalPatchIndex(EvalPatch root);
 
     /// Looks at the graph again. Afterwards the answers are those of the lists as they are now. A
     /// failing allocation leaves the index as it was.
     TARN_ENGINE_BASE_EXPORT void rebuild();
 
+    /// As those of `PatchIndex`. None allocates.
     TARN_ENGINE_BASE_EXPORT EvalPatch const& root() const;
     TARN_ENGINE_BASE_EXPORT EvalPatch const* findPatch(unsigned long long id) const;
     TARN_ENGINE_BASE_EXPORT EvalPatch const* parentOf(unsigned long long id) const;

@@ -37,6 +37,7 @@ TARN_ENGINE_BASE_EXPORT PathInstruction stringToPathInstruction(std::string cons
 
 /// One instruction with its points. Their number is not checked against the instruction.
 struct PathElement {
+    /// What is drawn.
     PathInstruction instruction = PathInstruction::moveTo;
     /// Up to three of them allocate nothing.
     Points points;
@@ -49,8 +50,10 @@ struct PathElement {
 
 /// An outline: elements in drawing order. Copying is deep.
 struct Path {
+    /// In drawing order.
     std::vector<PathElement> elements;
 
+    /// Empty, of the elements given, or a copy; a move takes constant time.
     TARN_ENGINE_BASE_EXPORT Path();
     TARN_ENGINE_BASE_EXPORT Path(std::vector<PathElement> drawn);
     TARN_ENGINE_BASE_EXPORT Path(Path const& other);
@@ -59,6 +62,7 @@ struct Path {
     TARN_ENGINE_BASE_EXPORT Path& operator=(Path&& other) noexcept;
     TARN_ENGINE_BASE_EXPORT ~Path();
 
+    /// As many elements, equal in order.
     TARN_ENGINE_BASE_EXPORT bool operator==(Path const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(Path const& other) const;
 
@@ -115,6 +119,7 @@ public:
     TARN_ENGINE_BASE_EXPORT Path build() const&;
     TARN_ENGINE_BASE_EXPORT Path build() &&;
 
+    /// The same elements and the same current point.
     TARN_ENGINE_BASE_EXPORT bool operator==(PathBuilder const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(PathBuilder const& other) const;
 

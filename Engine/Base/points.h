@@ -25,6 +25,7 @@ namespace tarn::engine {
 /// and takes longer for those. Made from a vector and convertible to one, at the cost of a copy.
 class Points {
 public:
+    /// As those of a vector.
     using value_type = FloatVec2;
     using size_type = std::size_t;
     using difference_type = std::ptrdiff_t;
@@ -37,6 +38,7 @@ public:
     using reverse_iterator = std::reverse_iterator<iterator>;
     using const_reverse_iterator = std::reverse_iterator<const_iterator>;
 
+    /// As the constructors of a vector; and from a vector, which is copied.
     Points() = default;
     explicit Points(size_type count) { resize(count); }
     Points(size_type count, FloatVec2 point) { resize(count, point); }
@@ -50,6 +52,7 @@ public:
     Points(Points&& other) noexcept { take(other); }
     ~Points() { delete[] many; }
 
+    /// A failing allocation leaves this as it was.
     Points& operator=(Points const& other) {
         if (this != &other) *this = Points(other);
         return *this;
@@ -62,8 +65,10 @@ public:
     }
     Points& operator=(std::initializer_list<FloatVec2> points) { return *this = Points(points); }
 
+    /// A copy.
     operator std::vector<FloatVec2>() const { return {begin(), end()}; }
 
+    /// The points behind one another, and how many. Constant time.
     FloatVec2* data() { return many != nullptr ? many : few; }
     FloatVec2 const* data() const { return many != nullptr ? many : few; }
     size_type size() const { return length; }
@@ -71,6 +76,7 @@ public:
     size_type max_size() const { return static_cast<size_type>(-1) / (2 * sizeof(FloatVec2)); }
     bool empty() const { return length == 0; }
 
+    /// Valid until points are added or this is moved from.
     iterator begin() { return data(); }
     iterator end() { return data() + length; }
     const_iterator begin() const { return data(); }
@@ -84,6 +90,7 @@ public:
     const_reverse_iterator crbegin() const { return rbegin(); }
     const_reverse_iterator crend() const { return rend(); }
 
+    /// One point. `at` throws `std::out_of_range` for one that is not there.
     FloatVec2& operator[](size_type i) { return data()[i]; }
     FloatVec2 const& operator[](size_type i) const { return data()[i]; }
     FloatVec2& at(size_type i) { return data()[checked(i)]; }
@@ -93,6 +100,8 @@ public:
     FloatVec2& back() { return end()[-1]; }
     FloatVec2 const& back() const { return end()[-1]; }
 
+    /// As of a vector: adding at the end takes constant time over many calls, and a failing
+    /// allocation leaves this as it was.
     void reserve(size_type wanted) {
         if (wanted > room) moveTo(wanted);
     }
@@ -116,6 +125,7 @@ public:
         length = count;
     }
 
+    /// Linear in what follows the place. What is inserted may be a part of this.
     iterator insert(const_iterator position, FloatVec2 point) {
         return insert(position, &point, &point + 1);
     }
@@ -145,12 +155,14 @@ public:
         length = static_cast<size_type>(std::copy(last, cend(), to) - begin());
         return to;
     }
+    /// As the constructors.
     void assign(size_type count, FloatVec2 point) { *this = Points(count, point); }
     void assign(std::initializer_list<FloatVec2> points) { *this = points; }
     template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
     void assign(Iterator first, Iterator last) {
         *this = Points(first, last);
     }
+    /// Constant time.
     void swap(Points& other) noexcept { std::swap(*this, other); }
     friend void swap(Points& a, Points& b) noexcept { a.swap(b); }
 

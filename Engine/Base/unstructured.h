@@ -42,9 +42,11 @@ using EnableIfDataSource = std::enable_if_t<
 /// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
 class Unstructured {
 public:
+    /// An object, ordered by the bytes of its keys, and a list.
     using Map = std::map<std::string, Unstructured>;
     using Array = std::vector<Unstructured>;
 
+    /// The kinds, numbered as the alternatives of the union.
     enum class Type : unsigned char {
         Null = 0,
         Map = 1,
@@ -86,6 +88,7 @@ public:
     Unstructured(Source) = delete;
     Unstructured(std::nullptr_t) = delete;
 
+    /// The whole tree, copied; or taken over in constant time, null being left behind.
     TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured const& other)
         : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
     TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured&& other) noexcept
@@ -102,6 +105,7 @@ public:
     /// Null, by name.
     TARN_ENGINE_BASE_EXPORT_INLINE static Unstructured Undefined() { return Unstructured(); }
 
+    /// The kind of this value. Constant time.
     TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return Type(storage.which()); }
 
     /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy

@@ -23,6 +23,7 @@
 #include <type_traits>
 #include <vector>
 
+/// The vocabulary that the evaluator, the renderer and the editor share.
 namespace tarn::engine {
 
 struct Path;
@@ -48,36 +49,43 @@ enum class Type : unsigned char {
     Unstructured = 13,
 };
 
-/// Two doubles. Equality is the floating-point one, component by component.
+/// Two doubles. Equality is the floating-point one: a NaN is unequal to itself, and 0.0 equals
+/// -0.0.
 struct FloatVec2 {
+    /// The components.
     double x = 0.0;
     double y = 0.0;
 
+    /// Component by component.
     friend constexpr bool operator==(FloatVec2 const& a, FloatVec2 const& b) {
         return a.x == b.x && a.y == b.y;
     }
     friend constexpr bool operator!=(FloatVec2 const& a, FloatVec2 const& b) { return !(a == b); }
 };
 
-/// Three doubles. Equality is the floating-point one, component by component.
+/// Three doubles, compared like two.
 struct FloatVec3 {
+    /// The components.
     double x = 0.0;
     double y = 0.0;
     double z = 0.0;
 
+    /// Component by component.
     friend constexpr bool operator==(FloatVec3 const& a, FloatVec3 const& b) {
         return a.x == b.x && a.y == b.y && a.z == b.z;
     }
     friend constexpr bool operator!=(FloatVec3 const& a, FloatVec3 const& b) { return !(a == b); }
 };
 
-/// Four doubles. Equality is the floating-point one, component by component.
+/// Four doubles, compared like two.
 struct FloatVec4 {
+    /// The components; of a colour red, green, blue and opacity, from 0 to 1.
     double x = 0.0;
     double y = 0.0;
     double z = 0.0;
     double w = 0.0;
 
+    /// Component by component.
     friend constexpr bool operator==(FloatVec4 const& a, FloatVec4 const& b) {
         return a.x == b.x && a.y == b.y && a.z == b.z && a.w == b.w;
     }
@@ -88,6 +96,7 @@ struct FloatVec4 {
 /// Rows or columns first is the reader's convention. It has no equality of its own: a `Value`
 /// compares matrices by their bytes, and one reading of `==` is enough.
 struct FloatMat4 {
+    /// Row by row or column by column, as the reader has it.
     double elements[16] = {};
 };
 static_assert(sizeof(FloatMat4) == 128, "sixteen doubles and nothing else");
@@ -207,11 +216,14 @@ public:
     /// A resource by its number; 0 is no resource. Four types, so that an image is never a video.
     template <Type resource>
     struct ResourceID {
+        /// The resource's number; 0 is none.
         unsigned long long id = 0;
 
+        /// The same kind and the same number.
         friend constexpr bool operator==(ResourceID a, ResourceID b) { return a.id == b.id; }
         friend constexpr bool operator!=(ResourceID a, ResourceID b) { return a.id != b.id; }
     };
+    /// One for each kind of resource.
     using ImageID = ResourceID<Type::Image>;
     using VideoID = ResourceID<Type::Video>;
     using SoundID = ResourceID<Type::Sound>;
@@ -247,6 +259,7 @@ public:
     Value(Source) = delete;
     Value(std::nullptr_t) = delete;
 
+    /// As the constructor of the same type.
     TARN_ENGINE_BASE_EXPORT static Value Image(unsigned long long id);
     TARN_ENGINE_BASE_EXPORT static Value Video(unsigned long long id);
     TARN_ENGINE_BASE_EXPORT static Value Sound(unsigned long long id);
@@ -258,6 +271,7 @@ public:
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type);
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
 
+    /// The type of what the value holds. Constant time, a few instructions.
     TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return kTypes[storage.which()]; }
 
     /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
@@ -412,6 +426,7 @@ using Loop = std::vector<Value>;
 
 /// What a port carries, and the bounds of what it takes.
 struct TypeInfo {
+    /// The type of the port's values.
     Type type = Type::Float;
     /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
     unsigned char subtype = 0;
@@ -421,6 +436,7 @@ struct TypeInfo {
     /// Carried, copied and compared; this library reads nothing into it.
     Optional<Value> extra;
 
+    /// Field by field.
     TARN_ENGINE_BASE_EXPORT bool operator==(TypeInfo const& other) const;
     TARN_ENGINE_BASE_EXPORT bool operator!=(TypeInfo const& other) const;
 };

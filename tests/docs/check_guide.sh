@@ -1,0 +1,57 @@
+#!/bin/sh
+# Compiles every program of the guide and the short use at the head of every header, and compares what the
+# programs print with what the guide says.
+#
+#     check_guide.sh SOURCE_DIR COMPILER LIBRARY INCLUDE_DIR
+set -eu
+
+root=$1
+compiler=$2
+library=$3
+boost=${4:-/usr/include}
+[ "$boost" = /usr/include ] && boost="" || boost="-isystem $boost"
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+
+programs=0
+for page in "$root"/docs/*.md; do
+    name=$(basename "$page" .md)
+    awk -v base="$work/$name" '
+        /^```cpp$/ { n++; out = base "-" n ".cpp"; next }
+        /^```text$/ { out = base "-" n ".txt"; next }
+        /^```/ { out = ""; next }
+        out != "" { print > out }' "$page"
+done
+for program in "$work"/*.cpp; do
+    base=${program%.cpp}
+    "$compiler" -std=c++17 -I"$root" $boost "$program" -o "$base" "$library" \
+        -Wl,-rpath,"$(dirname "$library")"
+    "$base" > "$base.out"
+    diff "$base.txt" "$base.out" || { echo "$(basename "$base") prints something else"; exit 1; }
+    programs=$((programs + 1))
+done
+[ "$programs" -ge 9 ]
+
+headers=0
+for header in "$root"/Engine/Base/*.h; do
+    name=$(basename "$header")
+    case $name in prefetch.h) continue ;; esac
+    {
+        printf '#include <Engine/Base/%s>\n#include <Engine/Base/assertion.h>\n' "$name"
+        printf '#include <Engine/Base/patch.h>\n#include <Engine/Base/path.h>\n#include <iostream>\n'
+        printf 'using namespace tarn::engine;\nvoid follow(Connection const&);\nvoid use(Type);\nbool hasValue();\n'
+        printf 'extern Patch root;\nextern unsigned long long portId;\n'
+        use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
+        [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
+        case $use in
+            '#include'* | 'TARN_'*) printf '%s\n' "$use" ;;
+            *) printf 'void shown() {\n%s\n}\n' "$use" ;;
+        esac
+    } > "$work/use.cpp"
+    "$compiler" -std=c++17 -fsyntax-only -I"$root" $boost "$work/use.cpp" || {
+        cat "$work/use.cpp"
+        exit 1
+    }
+    headers=$((headers + 1))
+done
+echo "$programs programs of the guide and the uses of $headers headers"
