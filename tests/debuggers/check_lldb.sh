@@ -10,7 +10,8 @@ some nothing input inner root evaluated index evaluatedIndex"
 for folder in /usr/lib/llvm-*/lib/python3*/dist-packages; do
     [ ! -f "$folder/lldb/embedded_interpreter.py" ] || export PYTHONPATH="$folder"
 done
-lldb -b -x -o "command script import $2" -o "breakpoint set -n here" -o run -o finish \
+lldb -b -x -o "command script import $2" -o "breakpoint set -n here" \
+    -o "process launch --no-stdio" -o finish \
     -o "frame variable $names" "$1" 2>&1 |
     sed -n 's/^(tarn::engine::[A-Za-z:<>]*) //; /^integer = /,$p' | diff "$3" -
 echo "as expected"
