@@ -265,7 +265,6 @@ void checkReadings(Value const& value, Model const& model) {
     FloatVec3 const v3 = value;
     FloatVec4 const v4 = value;
     check(same(v2.x, v[0]) && same(v2.y, v[1]), "vector of 2");
-    // A shorter vector's missing components are zero, and so are those of a model's.
     check(same(v3.x, v[0]) && same(v3.y, v[1]) && same(v3.z, v[2]), "vector of 3");
     check(same(v4.x, v[0]) && same(v4.y, v[1]) && same(v4.z, v[2]) && same(v4.w, v[3]),
           "vector of 4");
