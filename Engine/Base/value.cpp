@@ -330,6 +330,35 @@ private:
     std::string number(double d) const { return (*this)(d); }
 };
 
+// Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
+bool payloadsEqual(FloatMat4 const& a, FloatMat4 const& b) {
+    // NOLINTNEXTLINE(bugprone-suspicious-memory-comparison,cert-exp42-c,cert-flp37-c)
+    return std::memcmp(&a, &b, sizeof(FloatMat4)) == 0;
+}
+template <class T>
+bool payloadsEqual(T const& a, T const& b) {
+    return a == b;
+}
+
+// Compares with another union, which holds the same alternative.
+template <class Storage>
+struct EqualsContent : boost::static_visitor<bool> {
+    explicit EqualsContent(Storage const& other) : right(other) {}
+
+    template <class T>
+    bool operator()(T const& left) const {
+        return left == *boost::get<T>(&right);
+    }
+    template <class T>
+    bool operator()(std::shared_ptr<T const> const& left) const {
+        T const* const a = left.get();
+        T const* const b = boost::get<std::shared_ptr<T const>>(&right)->get();
+        return a == b || (a != nullptr && b != nullptr && payloadsEqual(*a, *b));
+    }
+
+    Storage const& right;
+};
+
 // What an alternative points to, itself or shared; nothing where another one is held.
 template <class T>
 T const* inside(std::shared_ptr<T const> const* held) {
@@ -341,15 +370,6 @@ std::shared_ptr<T const> shared(std::shared_ptr<T const> const* held) {
 }
 
 }  // namespace
-
-// Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
-bool detail::payloadsEqual(FloatMat4 const& a, FloatMat4 const& b) {
-    // NOLINTNEXTLINE(bugprone-suspicious-memory-comparison,cert-exp42-c,cert-flp37-c)
-    return std::memcmp(&a, &b, sizeof(FloatMat4)) == 0;
-}
-bool detail::payloadsEqual(Path const& a, Path const& b) { return a == b; }
-bool detail::payloadsEqual(Unstructured const& a, Unstructured const& b) { return a == b; }
-bool detail::payloadsEqual(std::string const& a, std::string const& b) { return a == b; }
 
 std::string typeToString(Type type) {
     if (std::size_t(type) >= kTypeNames.size()) assertionFailed("0", __func__, kModule, __LINE__);
@@ -496,6 +516,10 @@ Value Value::asType(Type type) const {
         case Type::Unstructured: return Value(Unstructured(*this));
     }
     assertionFailed("0", __func__, kModule, __LINE__);
+}
+
+bool Value::contentEquals(Value const& other) const {
+    return boost::apply_visitor(EqualsContent<Storage>(other.storage), storage);
 }
 
 std::string to_string(Value const& value) {

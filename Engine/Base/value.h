@@ -11,9 +11,7 @@
 #include <Engine/Base/export.h>
 #include <Engine/Base/optional.h>
 
-#include <boost/variant/apply_visitor.hpp>
 #include <boost/variant/get.hpp>
-#include <boost/variant/static_visitor.hpp>
 #include <boost/variant/variant.hpp>
 
 #include <cstddef>
@@ -131,12 +129,6 @@ template <class T>
 constexpr bool isNoValueSource = isUnsignedInteger<T> || isCharacter<T> ||
                                  std::is_same_v<T, long double> || std::is_member_pointer_v<T> ||
                                  (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>);
-
-// Deep, for values that do not share their payloads.
-TARN_ENGINE_BASE_EXPORT bool payloadsEqual(FloatMat4 const& a, FloatMat4 const& b);
-TARN_ENGINE_BASE_EXPORT bool payloadsEqual(Path const& a, Path const& b);
-TARN_ENGINE_BASE_EXPORT bool payloadsEqual(Unstructured const& a, Unstructured const& b);
-TARN_ENGINE_BASE_EXPORT bool payloadsEqual(std::string const& a, std::string const& b);
 
 }  // namespace detail
 
@@ -341,8 +333,7 @@ public:
     TARN_ENGINE_BASE_EXPORT_INLINE bool operator==(Value const& other) const {
         if (storage.which() != other.storage.which()) return false;
         double const* number = boost::get<double>(&storage);
-        return number != nullptr ? *number == double(other)
-                                 : boost::apply_visitor(EqualsContent{other.storage}, storage);
+        return number != nullptr ? *number == double(other) : contentEquals(other);
     }
     TARN_ENGINE_BASE_EXPORT_INLINE bool operator!=(Value const& other) const {
         return !(*this == other);
@@ -362,25 +353,9 @@ private:
                                       Type::Video,        Type::Sound, Type::Model,   Type::Path,
                                       Type::Unstructured, Type::String};
 
-    // Compares with another union, which holds the same alternative.
-    struct EqualsContent : boost::static_visitor<bool> {
-        explicit EqualsContent(Storage const& other) : right(other) {}
-
-        template <class T>
-        bool operator()(T const& left) const {
-            return left == *boost::get<T>(&right);
-        }
-        template <class T>
-        bool operator()(std::shared_ptr<T const> const& left) const {
-            T const* const a = left.get();
-            T const* const b = boost::get<std::shared_ptr<T const>>(&right)->get();
-            return a == b || (a != nullptr && b != nullptr && detail::payloadsEqual(*a, *b));
-        }
-
-        Storage const& right;
-    };
-
     TARN_ENGINE_BASE_EXPORT double readDouble() const;
+    // For values of the same alternative.
+    TARN_ENGINE_BASE_EXPORT bool contentEquals(Value const& other) const;
 
     Storage storage;
 };

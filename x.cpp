@@ -1,0 +1,1 @@
+#include <Engine/Base/fwd.h>
