@@ -5,11 +5,13 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include <sys/wait.h>
 
@@ -79,6 +81,7 @@ TEST_F(DocumentRoad, PrintsTheBundledDocuments) {
              Row{"animation.json --frames 0 --debug", "animation_debug.txt"},
              Row{"animation.json --frames 0 --patch 6 --port 651", "animation_patch_6.txt"},
              Row{"animation.json --frames 0 --patch 1 --port 603", "animation_patch_1.txt"},
+             Row{"animation.json --frames 25 --every 12 --paths", "animation_paths.txt"},
              Row{"node_graph.json --frames 3", "node_graph_frames.txt"},
              Row{"node_graph.json --frames 0 --patch 7 --port 13", "node_graph_patch_7.txt"},
          }) {
@@ -487,4 +490,92 @@ TEST_F(DocumentRoad, SurvivesDamagedDocuments) {
         refused += outcome.status == 2;
     }
     EXPECT_GT(refused, 50);
+}
+
+TEST_F(DocumentRoad, WritesAPageThatNeedsNothingElse) {
+    struct Row {
+        char const* arguments;
+        // What the page shows of the document.
+        std::vector<std::string> shown;
+    };
+    for (Row const& row : {
+             Row{"animation.json",
+                 {"<h1>bouncing badge</h1>", "<p>read a document: 40 patches in 3 levels, ",
+                  "id=\"level-1\"", "id=\"level-19\" hidden",
+                  "input speed; Number [type: float] from 0.1 to 4, default 1; port 201, tag 1; "
+                  "ui: {&quot;slider&quot;:1,&quot;steps&quot;:[0.1,1,4]}; unit: "
+                  "&quot;times&quot;",
+                  "outline <span class=\"type\">Path</span>",
+                  "dots <span class=\"type\">Positions</span>", "<span>3 in the loop</span>",
+                  "Exponential In-Out", "<li>curveTo 20 11.05, 11.05 20, 0 20</li>",
+                  "motion (patch 2), speed (port 201) {2}", "max=\"119\""}},
+             Row{"small.json --report-frames 1", {"max=\"0\"", "The document draws no path"}},
+             Row{"node_graph.json", {"left out", "The document draws no path"}},
+         }) {
+        SCOPED_TRACE(row.arguments);
+        std::string const file = (folder / "report.html").string();
+        Outcome const outcome = run(kDocuments + row.arguments + " --frames 0 --report " + file);
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_EQ(outcome.errors, "");
+        EXPECT_NE(outcome.output.find("\nreport: " + file + "\n"), std::string::npos);
+        std::string const page = contentsOf(file);
+        EXPECT_LT(page.size(), 2000000u);
+        EXPECT_EQ(page.substr(0, 15), "<!DOCTYPE html>");
+        EXPECT_EQ(page.substr(page.size() - 8), "</html>\n");
+        for (std::string const& text : row.shown) {
+            EXPECT_NE(page.find(text), std::string::npos) << text;
+        }
+        for (char const* other : {" src=", "url(", "@import", "href=\"http", "{{", "}}\n"}) {
+            EXPECT_EQ(page.find(other), std::string::npos) << other;
+        }
+    }
+}
+
+TEST_F(DocumentRoad, ShowsNamesInThePageAsTheyAre) {
+    std::string const name = R"(</script><img src=x>\"&'{{TITLE}})";
+    std::string const file =
+        write("names.json", document(R"({"id":2,"kind":"text","name":")" + name +
+                                     R"(","inputs":[{"id":3,"type":"string","default":")" + name +
+                                     R"(","name":")" + name +
+                                     R"("}],"outputs":[{"id":4,"type":"string","name":")" + name +
+                                     R"("}],"attributes":{")" + name + R"(":")" + name + R"("}})"));
+    Outcome const outcome = run(file + " --report " + (folder / "report.html").string());
+    EXPECT_EQ(outcome.status, 0);
+    std::string const page = contentsOf(folder / "report.html");
+    EXPECT_EQ(page.find("<img"), std::string::npos);
+    EXPECT_NE(page.find("&lt;/script&gt;&lt;img src=x&gt;&quot;&amp;'{{TITLE}}"),
+              std::string::npos);
+    EXPECT_NE(page.find("\\u003c/script>"), std::string::npos);
+}
+
+TEST_F(DocumentRoad, WritesAPageForEveryRootThatHasAtMostOnePatch) {
+    for (char const* contents :
+         {R"({"root":{"id":1}})", R"({"root":{"id":1,"children":[{"id":2}]}})",
+          R"({"root":{"id":1,"outputs":[{"id":2,"type":"float"}]}})"}) {
+        SCOPED_TRACE(contents);
+        std::string const file = (folder / "report.html").string();
+        Outcome const outcome = run(write("root.json", contents) + " --report " + file);
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_EQ(outcome.errors, "");
+        EXPECT_NE(contentsOf(file).find("</html>"), std::string::npos);
+    }
+}
+
+TEST_F(DocumentRoad, SaysWhyAPageOrPictureCannotBeWritten) {
+    std::string const nowhere = (folder / "nowhere" / "file").string();
+    for (char const* option : {" --report ", " --picture "}) {
+        SCOPED_TRACE(option);
+        Outcome const outcome = run(kDocuments + "small.json" + option + nowhere);
+        EXPECT_EQ(outcome.status, 1);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_EQ(outcome.errors, "document_road: " + nowhere + " cannot be written\n");
+    }
+    std::string const file = write("report.html", "as it was");
+    std::string const path = std::getenv("PATH");
+    ASSERT_EQ(setenv("PATH", folder.c_str(), 1), 0);
+    Outcome const outcome = run(kDocuments + "small.json --report " + file);
+    ASSERT_EQ(setenv("PATH", path.c_str(), 1), 0);
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.errors, "document_road: dot (Graphviz) cannot be run; is it installed?\n");
+    EXPECT_EQ(contentsOf(file), "as it was");
 }

@@ -107,38 +107,6 @@ Json parseJson(std::string const& text) {
     }
 }
 
-Unstructured toUnstructured(Json const& json) {
-    switch (json.type()) {
-        case Json::value_t::object: {
-            Unstructured::Map map;
-            for (auto const& [key, member] : json.items()) {
-                map.emplace(key, toUnstructured(member));
-            }
-            return map;
-        }
-        case Json::value_t::array: {
-            Unstructured::Array array;
-            array.reserve(json.size());
-            for (Json const& element : json) array.push_back(toUnstructured(element));
-            return array;
-        }
-        case Json::value_t::string: return json.get<std::string>();
-        case Json::value_t::boolean: return json.get<bool>() ? 1 : 0;
-        case Json::value_t::number_integer: return json.get<long long>();
-        case Json::value_t::number_unsigned: {
-            auto const number = json.get<unsigned long long>();
-            bool const fits =
-                number <= static_cast<unsigned long long>(std::numeric_limits<long long>::max());
-            return fits ? Unstructured(static_cast<long long>(number)) : Unstructured(number);
-        }
-        case Json::value_t::number_float: return json.get<double>();
-        case Json::value_t::null:
-        case Json::value_t::binary:
-        case Json::value_t::discarded: break;
-    }
-    return Unstructured::Undefined();
-}
-
 Field Field::at(std::string const& key) const {
     auto const member = object().find(key);
     if (member == json->end()) refuse("\"" + printable(key) + "\" is missing");

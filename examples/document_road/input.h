@@ -6,17 +6,13 @@
 #ifndef DOCUMENT_ROAD_INPUT_H
 #define DOCUMENT_ROAD_INPUT_H
 
-#include <Engine/Base/unstructured.h>
-
-#include <nlohmann/json.hpp>
+#include "json.h"
 
 #include <cstddef>
 #include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
-
-using Json = nlohmann::json;
 
 // Deeper input is refused: everything that reads a document afterwards may recurse over it.
 constexpr std::size_t kDeepestNesting = 1000;
@@ -33,9 +29,6 @@ std::string readFile(std::string const& name);
 // Throws an InputError that names line and column where the text is no JSON, nests too deeply or
 // has a number beyond 64 bits.
 Json parseJson(std::string const& text);
-
-// JSON as the library's data: truth becomes 1 or 0, and an integer is signed where it fits.
-tarn::engine::Unstructured toUnstructured(Json const& json);
 
 // A value in the file, and how to get there from the root. A field refers to its parent: keep the
 // parents while it is used.

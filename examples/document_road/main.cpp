@@ -3,11 +3,17 @@
 //     document_road examples/documents/small.json --frames 3
 
 #include "document.h"
+#include "drawing.h"
+#include "page.h"
 #include "report.h"
+#include "scene.h"
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
 #include <chrono>
+#include <filesystem>
+#include <fstream>
 #include <iostream>
 #include <optional>
 #include <sstream>
@@ -43,6 +49,23 @@ private:
     std::chrono::steady_clock::time_point last = std::chrono::steady_clock::now();
 };
 
+// Whole or not at all: a reader never finds half of it.
+void writeFile(std::string const& name, std::string const& contents) {
+    std::string const unfinished = name + ".unfinished";
+    bool done = false;
+    {
+        std::ofstream stream(unfinished, std::ios::binary);
+        stream << contents << std::flush;
+        done = bool(stream);
+    }
+    std::error_code error;
+    if (done) std::filesystem::rename(unfinished, name, error);
+    if (!done || error) {
+        std::filesystem::remove(unfinished, error);
+        throw std::runtime_error(printable(name) + " cannot be written");
+    }
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -52,6 +75,10 @@ int main(int argc, char** argv) {
     bool debug = false;
     long long frames = 13;
     long long every = 1;
+    long long reportFrames = 120;
+    bool paths = false;
+    std::string report;
+    std::string picture;
     std::optional<unsigned long long> patchId;
     std::optional<unsigned long long> portId;
     app.add_option("FILE", file, "The document")->required();
@@ -68,6 +95,18 @@ int main(int argc, char** argv) {
         ->type_name("K")
         ->check(CLI::Range(1LL, 10000000LL))
         ->capture_default_str();
+    app.add_flag("--paths", paths, "Print the SVG path data of what is drawn in those frames");
+    app.add_option("--report", report,
+                   "Write a page with the graph, the animation and its plots (needs Graphviz)")
+        ->type_name("HTML")
+        ->take_last();
+    app.add_option("--report-frames", reportFrames, "How many frames the page plays")
+        ->type_name("N")
+        ->check(CLI::Range(1LL, 10000LL))
+        ->capture_default_str();
+    app.add_option("--picture", picture,
+                   "Write a picture of the graph and of the last of the frames (needs Graphviz)")
+        ->type_name("SVG");
     try {
         app.parse(argc, argv);
     } catch (CLI::ParseError const& error) {
@@ -96,6 +135,18 @@ int main(int argc, char** argv) {
                    << framesText(document, frames, every,
                                  [&](long long frame) { progress(frame); });
         }
+        if (paths) output << "\n" << pathsText(document, frames, every);
+        if (!picture.empty()) {
+            writeFile(picture, pictureText(document, std::max(frames - 1, 0LL)));
+        }
+        if (!report.empty()) {
+            std::filesystem::path const fileName = std::filesystem::path(file).filename();
+            writeFile(report, pageText(document, fileName.string(), reportFrames));
+            std::string const place = std::filesystem::absolute(report).string();
+            output << "\nreport: " << printable(place)
+                   << "\nopen it in a browser, for example: xdg-open '" << printable(place)
+                   << "'\n";
+        }
         std::cout << output.str() << std::flush;
         if (!std::cout) {
             std::cerr << "document_road: the output cannot be written\n";
@@ -104,6 +155,9 @@ int main(int argc, char** argv) {
     } catch (InputError const& error) {
         std::cerr << "document_road: " << printable(file) << ": " << error.what() << "\n";
         return kBadInput;
+    } catch (std::runtime_error const& error) {
+        std::cerr << "document_road: " << error.what() << "\n";
+        return 1;
     } catch (std::bad_alloc const&) {
         std::cerr << "document_road: " << printable(file) << ": not enough memory\n";
         return kBadInput;

@@ -40,21 +40,6 @@ std::string cut(std::string text) {
     return text.substr(0, end) + "...";
 }
 
-std::string shown(Loop const& values) {
-    if (values.size() == 1) return cut(printable(to_string(values.front())));
-    std::string text;
-    for (Value const& value : values) {
-        text += (text.empty() ? "[" : " | ") + printable(to_string(value));
-        if (text.size() > kWidestCell) break;
-    }
-    return cut(text + "]");
-}
-
-std::string kindName(Patch const& patch) {
-    Kind const* const kind = kindByNumber(patch.builtin);
-    return kind != nullptr ? kind->name : "unknown";
-}
-
 std::string title(Patch const& patch) {
     std::ostringstream text;
     text << "patch " << patch.id << " \"" << printable(patch.name) << "\", " << kindName(patch);
@@ -64,11 +49,7 @@ std::string title(Patch const& patch) {
 
 std::string portTitle(Port const& port) {
     std::ostringstream text;
-    text << "port " << port.id << " \"" << printable(port.name) << "\", "
-         << portNameForTypeInfo(port.typeInfo, false) << " " << port.typeInfo;
-    if (port.typeInfo.min) text << " from " << printable(to_string(*port.typeInfo.min));
-    if (port.typeInfo.max) text << " to " << printable(to_string(*port.typeInfo.max));
-    text << ", default " << shown({port.defaultValue});
+    text << "port " << port.id << " \"" << printable(port.name) << "\", " << portTypeText(port);
     return text.str();
 }
 
@@ -94,27 +75,6 @@ void writeAttributes(std::ostream& stream, std::map<std::string, Unstructured> c
     stream << "\n";
 }
 
-struct Column {
-    std::string heading;
-    EvalPort const* port;
-};
-
-// The root's outputs, or else those of its children that nothing is connected to.
-std::vector<Column> columns(Document const& document, EvalPatch const& root) {
-    std::vector<Column> result;
-    for (EvalPort const& output : *root.outputs) result.push_back({output.name, &output});
-    if (!result.empty()) return result;
-    for (EvalPatch const& child : *root.children) {
-        for (EvalPort const& output : *child.outputs) {
-            bool const connected =
-                !findOutgoingConnectionsFromPort(document.root, output.id).empty();
-            if (connected || result.size() == kMostColumns) continue;
-            result.push_back({std::to_string(child.id) + " " + output.name, &output});
-        }
-    }
-    return result;
-}
-
 std::string tableText(std::vector<std::vector<std::string>> const& rows) {
     std::vector<std::size_t> widths(rows.front().size(), 0);
     for (auto const& row : rows) {
@@ -132,6 +92,45 @@ std::string tableText(std::vector<std::vector<std::string>> const& rows) {
 }
 
 }  // namespace
+
+std::vector<ShownOutput> shownOutputs(Document const& document, EvalPatch const& root) {
+    std::vector<ShownOutput> result;
+    for (EvalPort const& output : *root.outputs) result.push_back({output.name, &output});
+    if (!result.empty()) return result;
+    for (EvalPatch const& child : *root.children) {
+        for (EvalPort const& output : *child.outputs) {
+            bool const connected =
+                !findOutgoingConnectionsFromPort(document.root, output.id).empty();
+            if (connected || result.size() == kMostColumns) continue;
+            result.push_back({std::to_string(child.id) + " " + output.name, &output});
+        }
+    }
+    return result;
+}
+
+std::string shownValues(Loop const& values) {
+    if (values.size() == 1) return cut(printable(to_string(values.front())));
+    std::string text;
+    for (Value const& value : values) {
+        text += (text.empty() ? "[" : " | ") + printable(to_string(value));
+        if (text.size() > kWidestCell) break;
+    }
+    return cut(text + "]");
+}
+
+std::string kindName(Patch const& patch) {
+    Kind const* const kind = kindByNumber(patch.builtin);
+    return kind != nullptr ? kind->name : "unknown";
+}
+
+std::string portTypeText(Port const& port) {
+    std::ostringstream text;
+    text << portNameForTypeInfo(port.typeInfo, false) << " " << port.typeInfo;
+    if (port.typeInfo.min) text << " from " << printable(to_string(*port.typeInfo.min));
+    if (port.typeInfo.max) text << " to " << printable(to_string(*port.typeInfo.max));
+    text << ", default " << shownValues({port.defaultValue});
+    return text.str();
+}
 
 std::string countsText(Document const& document) {
     std::size_t patches = 0;
@@ -228,15 +227,17 @@ std::string portText(Document const& document, unsigned long long id) {
 std::string framesText(Document const& document, long long frames, long long every,
                        std::function<void(long long frame)> const& progress) {
     Evaluator evaluator(document);
-    std::vector<Column> const shownColumns = columns(document, evaluator.root());
+    std::vector<ShownOutput> const outputs = shownOutputs(document, evaluator.root());
     std::vector<std::vector<std::string>> rows(1, {"frame"});
-    for (Column const& column : shownColumns) rows[0].push_back(cut(printable(column.heading)));
+    for (ShownOutput const& output : outputs) rows[0].push_back(cut(printable(output.name)));
     for (long long frame = 0; frame < frames; ++frame) {
         progress(frame);
         evaluator.evaluate(frame);
         if (frame % every != 0) continue;
         rows.push_back({std::to_string(frame)});
-        for (Column const& column : shownColumns) rows.back().push_back(shown(column.port->values));
+        for (ShownOutput const& output : outputs) {
+            rows.back().push_back(shownValues(output.port->values));
+        }
     }
     return tableText(rows);
 }

@@ -8,6 +8,26 @@
 
 #include <functional>
 #include <string>
+#include <vector>
+
+// An output whose values are shown.
+struct ShownOutput {
+    std::string name;
+    tarn::engine::EvalPort const* port;
+};
+
+// The root's outputs, or else those of its children that nothing is connected to, up to twelve.
+std::vector<ShownOutput> shownOutputs(Document const& document,
+                                      tarn::engine::EvalPatch const& root);
+
+// The value in one line; of a loop, all of them: "[1 | 2]". Long ones are cut.
+std::string shownValues(tarn::engine::Loop const& values);
+
+// "oscillator".
+std::string kindName(tarn::engine::Patch const& patch);
+
+// "Number [type: float] from 0 to 1, default 0".
+std::string portTypeText(tarn::engine::Port const& port);
 
 // How many patches, ports and connections there are, and of which types; what was left out.
 std::string countsText(Document const& document);

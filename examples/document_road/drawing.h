@@ -1,0 +1,58 @@
+// Graphs and scenes as SVG.
+//
+//     Drawing drawing(document.root);
+//     std::string const svg = drawing.graph(layOut(document.root).front());
+
+#ifndef DOCUMENT_ROAD_DRAWING_H
+#define DOCUMENT_ROAD_DRAWING_H
+
+#include "document.h"
+#include "layout.h"
+#include "scene.h"
+
+#include <Engine/Base/patch_index.h>
+
+#include <string>
+#include <vector>
+
+// A part of the plane, y downwards.
+struct Bounds {
+    double left = 0.0;
+    double top = 0.0;
+    double right = 0.0;
+    double bottom = 0.0;
+    bool isEmpty = true;
+
+    void add(tarn::engine::Path const& path);
+    // With a margin of `margin` on each side.
+    Bounds widened(double margin) const;
+};
+
+// "rgb(255 127 0 / 0.5)".
+std::string colorText(tarn::engine::FloatVec4 color);
+
+class Drawing {
+public:
+    explicit Drawing(tarn::engine::Patch const& root) : index(root) {}
+
+    // One level: boxes with their ports, and the connections between them. `attributes` go into the
+    // opening tag.
+    std::string graph(Level const& level, std::string const& attributes) const;
+
+private:
+    std::string box(Box const& box) const;
+    std::string port(tarn::engine::Port const& port, bool isInput, double width, double y) const;
+    std::string patchLabel(tarn::engine::Patch const& patch) const;
+    std::string portLabel(tarn::engine::Port const& port, bool isInput) const;
+    std::string portName(unsigned long long patchId, unsigned long long portId) const;
+
+    tarn::engine::PatchIndex index;
+};
+
+// The outlines as `path` elements.
+std::string scenePaths(std::vector<Drawn> const& scene);
+
+// The root's graph and what the document draws in that frame, as a picture that stands by itself.
+std::string pictureText(Document const& document, long long frame);
+
+#endif

@@ -1,0 +1,186 @@
+#include "layout.h"
+
+#include "report.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <memory>
+#include <sstream>
+#include <stdexcept>
+#include <unordered_map>
+
+#include <spawn.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+using namespace tarn::engine;
+
+namespace {
+
+constexpr double kPixelsPerInch = 72.0;
+constexpr double kPadding = 14.0;
+constexpr double kMargin = 12.0;
+constexpr std::size_t kNarrowest = 12;
+
+struct CloseFile {
+    void operator()(std::FILE* file) const { std::fclose(file); }
+};
+using File = std::unique_ptr<std::FILE, CloseFile>;
+
+File temporaryFile() {
+    File file(std::tmpfile());
+    if (!file) throw std::runtime_error("no temporary file can be made for Graphviz");
+    return file;
+}
+
+// What `dot` answers to the text.
+std::string answerOfDot(std::string const& text) {
+    File const in = temporaryFile();
+    File const out = temporaryFile();
+    bool const written = std::fwrite(text.data(), 1, text.size(), in.get()) == text.size() &&
+                         std::fflush(in.get()) == 0;
+    if (!written) throw std::runtime_error("the graph cannot be written for Graphviz");
+    std::rewind(in.get());
+
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    posix_spawn_file_actions_adddup2(&actions, fileno(in.get()), STDIN_FILENO);
+    posix_spawn_file_actions_adddup2(&actions, fileno(out.get()), STDOUT_FILENO);
+    char program[] = "dot";
+    char format[] = "-Tplain";
+    char* arguments[] = {program, format, nullptr};
+    pid_t child = 0;
+    int const failed = posix_spawnp(&child, program, &actions, nullptr, arguments, environ);
+    posix_spawn_file_actions_destroy(&actions);
+    if (failed != 0) throw std::runtime_error("dot (Graphviz) cannot be run; is it installed?");
+    int status = 0;
+    if (waitpid(child, &status, 0) != child || !WIFEXITED(status) || WEXITSTATUS(status) != 0) {
+        throw std::runtime_error("dot (Graphviz) failed");
+    }
+
+    std::rewind(out.get());
+    std::string answer;
+    char buffer[65536];
+    while (std::size_t const count = std::fread(buffer, 1, sizeof buffer, out.get())) {
+        answer.append(buffer, count);
+    }
+    return answer;
+}
+
+Box sizedBox(Patch const& patch) {
+    std::size_t columns = columnsOf(headingOf(patch)) + (patch.children->empty() ? 0 : 3);
+    for (auto const& list : {patch.inputs, patch.outputs}) {
+        for (Port const& port : *list) columns = std::max(columns, columnsOf(labelOf(port)));
+    }
+    Box box{&patch};
+    box.width = static_cast<double>(std::max(columns, kNarrowest)) * kCharacterWidth + 2 * kPadding;
+    auto const rows = static_cast<double>(patch.inputs->size() + patch.outputs->size());
+    box.height = kHeadingHeight + rows * kRowHeight + 6.0;
+    return box;
+}
+
+void addLevels(Patch const& patch, std::vector<Level>& levels) {
+    Level level{&patch, 0.0, 0.0, {}};
+    for (Patch const& child : *patch.children) {
+        if (level.boxes.size() == kMostBoxes) break;
+        level.boxes.push_back(sizedBox(child));
+    }
+    levels.push_back(std::move(level));
+    for (Patch const& child : *patch.children) {
+        if (!child.children->empty()) addLevels(child, levels);
+    }
+}
+
+// Boxes are named by their position. Lines are not asked for: they are drawn from port to port.
+void writeDot(std::ostream& stream, Level const& level) {
+    stream << "digraph {\n  graph [rankdir=LR, splines=false, nodesep=0.28, ranksep=0.7, "
+              "nslimit=2, nslimit1=2, mclimit=0.5];\n"
+              "  node [shape=box, fixedsize=true, label=\"\"];\n";
+    std::unordered_map<unsigned long long, std::size_t> positions;
+    for (std::size_t i = 0; i < level.boxes.size(); ++i) {
+        Box const& box = level.boxes[i];
+        positions.emplace(box.patch->id, i);
+        stream << "  " << i << " [width=" << box.width / kPixelsPerInch
+               << ", height=" << box.height / kPixelsPerInch << "];\n";
+    }
+    for (Connection const& connection : *level.group->connections) {
+        auto const from = positions.find(connection.fromPatchId);
+        auto const to = positions.find(connection.toPatchId);
+        if (from == positions.end() || to == positions.end()) continue;
+        stream << "  " << from->second << " -> " << to->second << ";\n";
+    }
+    stream << "}\n";
+}
+
+// Reads "graph scale width height", "node name x y ..." from the middle and upwards, up to "stop".
+void place(Level& level, std::istream& answer) {
+    double height = 0.0;
+    for (std::string line; std::getline(answer, line) && line != "stop";) {
+        std::istringstream words(line);
+        std::string word;
+        words >> word;
+        if (word == "graph") {
+            double scale = 0.0;
+            double width = 0.0;
+            words >> scale >> width >> height;
+            level.width = width * kPixelsPerInch + 2 * kMargin;
+            level.height = height * kPixelsPerInch + 2 * kMargin;
+        } else if (word == "node") {
+            std::size_t position = 0;
+            double x = 0.0;
+            double y = 0.0;
+            words >> position >> x >> y;
+            Box& box = level.boxes.at(position);
+            box.x = x * kPixelsPerInch - box.width / 2 + kMargin;
+            box.y = (height - y) * kPixelsPerInch - box.height / 2 + kMargin;
+        }
+    }
+}
+
+}  // namespace
+
+std::size_t columnsOf(std::string const& text) {
+    std::size_t columns = 0;
+    for (char const c : text) {
+        auto const byte = static_cast<unsigned char>(c);
+        if ((byte & 0xc0) == 0x80) continue;
+        columns += byte < 0xe0 ? 1 : 2;  // East Asian letters, of three bytes and more, are wide.
+    }
+    return columns;
+}
+
+std::string shortened(std::string const& text, std::size_t longest) {
+    if (columnsOf(text) <= longest) return text;
+    std::string result;
+    std::size_t columns = 0;
+    for (std::size_t i = 0; i < text.size();) {
+        std::size_t end = i + 1;
+        while (end < text.size() && (static_cast<unsigned char>(text[end]) & 0xc0) == 0x80) ++end;
+        std::string const character = text.substr(i, end - i);
+        columns += columnsOf(character);
+        if (columns >= longest) break;
+        result += character;
+        i = end;
+    }
+    return result + "\u2026";
+}
+
+std::string headingOf(Patch const& patch) {
+    return shortened(printable(patch.name.empty() ? kindName(patch) : patch.name), kLongestLabel);
+}
+
+std::string labelOf(Port const& port) {
+    std::string const type = portNameForTypeInfo(port.typeInfo, false);
+    if (port.name.empty()) return type;
+    return shortened(printable(port.name), kLongestLabel - type.size() - 1) + " " + type;
+}
+
+std::vector<Level> layOut(Patch const& root) {
+    std::vector<Level> levels;
+    addLevels(root, levels);
+    std::ostringstream text;
+    for (Level const& level : levels) writeDot(text, level);
+    std::istringstream answer(answerOfDot(text.str()));
+    for (Level& level : levels) place(level, answer);
+    return levels;
+}

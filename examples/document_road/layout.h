@@ -1,0 +1,56 @@
+// Where the patches of a graph are drawn: Graphviz places them, level by level.
+//
+//     std::vector<Level> const levels = layOut(document.root);
+//     Box const& box = levels.front().boxes.front();
+
+#ifndef DOCUMENT_ROAD_LAYOUT_H
+#define DOCUMENT_ROAD_LAYOUT_H
+
+#include <Engine/Base/patch.h>
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+// All lengths are in pixels, downwards.
+struct Box {
+    tarn::engine::Patch const* patch;
+    double x = 0.0;
+    double y = 0.0;
+    double width = 0.0;
+    double height = 0.0;
+};
+
+// The children of one patch.
+struct Level {
+    tarn::engine::Patch const* group;
+    double width = 0.0;
+    double height = 0.0;
+    // The children in order, up to `kMostBoxes`.
+    std::vector<Box> boxes;
+};
+
+// More take too long to place, and nobody finds anything among them.
+constexpr std::size_t kMostBoxes = 2500;
+
+// A patch is drawn as a heading, a row for each output, and a row for each input.
+constexpr double kHeadingHeight = 26.0;
+constexpr double kRowHeight = 18.0;
+constexpr double kCharacterWidth = 6.65;  // Of the fixed-width face at 11 pixels.
+constexpr std::size_t kLongestLabel = 32;
+
+// The text of at most `longest` characters, cut with an ellipsis.
+std::string shortened(std::string const& text, std::size_t longest);
+// How many columns a fixed-width face takes for it.
+std::size_t columnsOf(std::string const& text);
+
+// What a patch is called where it is drawn.
+std::string headingOf(tarn::engine::Patch const& patch);
+// "radius Number".
+std::string labelOf(tarn::engine::Port const& port);
+
+// A level for each patch with children, the root's first, in the order of the document; one, empty,
+// for a root without children. Throws a std::runtime_error where Graphviz is not there or fails.
+std::vector<Level> layOut(tarn::engine::Patch const& root);
+
+#endif

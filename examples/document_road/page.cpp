@@ -1,0 +1,501 @@
+#include "page.h"
+
+#include "drawing.h"
+#include "evaluator.h"
+#include "page_files.h"
+#include "report.h"
+#include "svg.h"
+
+#include <Engine/Base/easing.h>
+
+#include <algorithm>
+#include <cmath>
+#include <functional>
+#include <map>
+#include <sstream>
+#include <unordered_map>
+
+using namespace tarn::engine;
+using svg::escaped;
+using svg::number;
+
+namespace {
+
+// Browsers nest elements no deeper than some hundred levels.
+constexpr int kDeepestTree = 64;
+
+// Texts that repeat from frame to frame are kept once.
+class Texts {
+public:
+    std::size_t add(std::string const& text) {
+        auto const [place, isNew] = places.emplace(text, list.size());
+        if (isNew) list.push_back(text);
+        return place->second;
+    }
+    Json json() const { return list; }
+
+private:
+    std::vector<std::string> list;
+    std::unordered_map<std::string, std::size_t> places;
+};
+
+// A line of a plot, one value for each frame.
+struct Line {
+    std::string name;
+    std::size_t color;
+    std::vector<double> values;
+};
+
+struct Plot {
+    std::string name;
+    TypeInfo typeInfo;
+    std::vector<Line> lines;
+    // Where the output has no numbers: the frames at which it changes.
+    std::vector<long long> changes;
+    Loop last;
+    std::vector<std::size_t> texts;
+    std::size_t longestLoop = 1;
+};
+
+struct Component {
+    char const* name;
+    double value;
+};
+
+// What there is to plot of a value; nothing where it has no numbers.
+std::vector<Component> components(Value const& value) {
+    switch (value.type()) {
+        case Type::Float:
+        case Type::Int:
+        case Type::Boolean: return {{"value", double(value)}};
+        case Type::Vec2: {
+            FloatVec2 const v = value;
+            return {{"x", v.x}, {"y", v.y}};
+        }
+        case Type::Vec3: {
+            FloatVec3 const v = value;
+            return {{"x", v.x}, {"y", v.y}, {"z", v.z}};
+        }
+        case Type::Vec4: {
+            FloatVec4 const v = value;
+            return {{"red", v.x}, {"green", v.y}, {"blue", v.z}, {"opacity", v.w}};
+        }
+        case Type::Path: {
+            Bounds bounds;
+            bounds.add(*value.ifPath());
+            return {{"left", bounds.left},
+                    {"right", bounds.right},
+                    {"top", bounds.top},
+                    {"bottom", bounds.bottom}};
+        }
+        case Type::Mat4:
+        case Type::Image:
+        case Type::Video:
+        case Type::Sound:
+        case Type::String:
+        case Type::Model:
+        case Type::Unstructured: break;
+    }
+    return {};
+}
+
+void addFrame(Plot& plot, Loop const& values, long long frame) {
+    plot.longestLoop = std::max(plot.longestLoop, values.size());
+    bool hasNumbers = false;
+    std::size_t line = 0;
+    for (Value const& value : values) {
+        std::size_t color = 0;
+        for (Component const& component : components(value)) {
+            hasNumbers = true;
+            if (line == plot.lines.size()) {
+                plot.lines.push_back({component.name, color, {}});
+                // It was not there before.
+                plot.lines.back().values.assign(static_cast<std::size_t>(frame), NAN);
+            }
+            plot.lines[line++].values.push_back(component.value);
+            ++color;
+        }
+    }
+    for (; line < plot.lines.size(); ++line) plot.lines[line].values.push_back(NAN);
+    if (!hasNumbers && frame > 0 && values != plot.last) plot.changes.push_back(frame);
+    plot.last = values;
+}
+
+// All that is played.
+struct Film {
+    Texts texts;
+    std::vector<Plot> plots;
+    Json frames = Json::array();
+    Bounds bounds;
+    std::vector<Drawn> first;
+    std::size_t mostOutlines = 0;
+};
+
+Film filmOf(Document const& document, long long frames) {
+    Film film;
+    Evaluator evaluator(document);
+    Scene const scene(document, evaluator.root());
+    std::vector<ShownOutput> const outputs = shownOutputs(document, evaluator.root());
+    for (ShownOutput const& output : outputs) {
+        film.plots.push_back({printable(output.name), output.port->typeInfo, {}, {}, {}, {}, 1});
+    }
+    double widest = 0.0;
+    for (long long frame = 0; frame < frames; ++frame) {
+        evaluator.evaluate(frame);
+        for (std::size_t i = 0; i < outputs.size(); ++i) {
+            addFrame(film.plots[i], outputs[i].port->values, frame);
+            film.plots[i].texts.push_back(film.texts.add(shownValues(outputs[i].port->values)));
+        }
+        std::vector<Drawn> drawn = scene.now();
+        Json items = Json::array();
+        for (Drawn const& outline : drawn) {
+            film.bounds.add(outline.path);
+            if (outline.isLayer && std::isfinite(outline.width)) {
+                widest = std::max(widest, outline.width);
+            }
+            Json item = {film.texts.add(outline.data)};
+            if (outline.isLayer) {
+                item.push_back(film.texts.add(colorText(outline.color)));
+                item.push_back(film.texts.add(number(outline.width)));
+            }
+            items.push_back(std::move(item));
+        }
+        film.frames.push_back(std::move(items));
+        film.mostOutlines = std::max(film.mostOutlines, drawn.size());
+        if (frame == 0) film.first = std::move(drawn);
+    }
+    film.bounds = film.bounds.widened(widest / 2.0 + 8.0);
+    return film;
+}
+
+// The line through all values, 0 being the top and 100 the bottom; or the steps between them.
+std::string lineData(std::vector<double> const& values, double least, double most, bool isStepped) {
+    std::string data;
+    bool isDrawing = false;
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        if (!std::isfinite(values[i])) {
+            isDrawing = false;
+            continue;
+        }
+        double const y = most > least ? 100.0 - (values[i] - least) / (most - least) * 100.0 : 50.0;
+        std::string const frame = std::to_string(i);
+        if (!isDrawing) {
+            data += "M" + frame + " " + number(y) + "h0";  // A line of one point is a dot.
+        } else if (isStepped) {
+            data += "H" + frame + "V" + number(y);
+        } else {
+            data += "L" + frame + " " + number(y);
+        }
+        isDrawing = true;
+    }
+    return data;
+}
+
+std::string plotText(Plot const& plot, std::size_t position, long long frames,
+                     std::string const& firstText) {
+    double least = INFINITY;
+    double most = -INFINITY;
+    for (Line const& line : plot.lines) {
+        for (double const value : line.values) {
+            if (!std::isfinite(value)) continue;
+            least = std::min(least, value);
+            most = std::max(most, value);
+        }
+    }
+    std::string const name = escaped(plot.name);
+    std::ostringstream text;
+    text << "<div class=\"plot\"><h3>" << name << " <span class=\"type\">"
+         << portNameForTypeInfo(plot.typeInfo, plot.longestLoop > 1)
+         << "</span></h3>\n<p class=\"keys\">";
+    for (std::size_t i = 0; i < plot.lines.size() && i <= 4; ++i) {
+        Line const& line = plot.lines[i];
+        if (i > 0 && line.color == 0) break;
+        text << "<span class=\"key c" << line.color << "\">" << line.name << "</span> ";
+    }
+    if (plot.longestLoop > 1) text << "<span>" << plot.longestLoop << " in the loop</span>";
+    if (plot.lines.empty()) {
+        text << "<span>" << plot.changes.size()
+             << (plot.changes.size() == 1 ? " change</span>" : " changes</span>");
+    }
+    text << "</p>\n<div class=\"chart\" role=\"slider\" tabindex=\"0\" data-plot=\"" << position
+         << "\" aria-label=\"" << name << " over time\" aria-valuemin=\"0\" aria-valuemax=\""
+         << frames - 1 << "\" aria-valuenow=\"0\" aria-valuetext=\"frame 0: " << escaped(firstText)
+         << "\"><svg aria-hidden=\"true\" preserveAspectRatio=\"none\" viewBox=\"0 -3 "
+         << std::max(frames - 1, 1LL) << " 106\">";
+    bool const isStepped = plot.typeInfo.type == Type::Boolean || plot.typeInfo.type == Type::Int;
+    for (Line const& line : plot.lines) {
+        text << "<path class=\"line c" << line.color << "\" d=\""
+             << lineData(line.values, least, most, isStepped) << "\"/>";
+    }
+    if (plot.lines.empty()) {
+        text << "<path class=\"line c0\" d=\"M0 50H" << std::max(frames - 1, 1LL);
+        for (long long const frame : plot.changes) text << "M" << frame << " 25V75";
+        text << "\"/>";
+    }
+    text << "<path class=\"cursor\" d=\"M0 -3V103\"/></svg></div>\n";
+    if (least <= most) {
+        text << "<p class=\"range\"><span>" << number(least) << " to " << number(most)
+             << "</span></p>\n";
+    }
+    text << "<p class=\"now\"><span class=\"frame\">frame 0</span> <output>" << escaped(firstText)
+         << "</output></p></div>\n";
+    return text.str();
+}
+
+std::string levelsText(Document const& document) {
+    std::vector<Level> const levels = layOut(document.root);
+    std::unordered_map<Patch const*, Level const*> levelOf;
+    for (Level const& level : levels) levelOf.emplace(level.group, &level);
+    Drawing const drawing(document.root);
+    std::ostringstream text;
+    // A level's figure holds those of the groups in it: closing it closes them.
+    std::function<void(Level const&, int)> const write = [&](Level const& level, int depth) {
+        Patch const& group = *level.group;
+        std::string const name = escaped(headingOf(group));
+        text << "<figure class=\"level\" id=\"level-" << group.id << "\""
+             << (depth > 1 ? " hidden" : "") << ">\n<figcaption><span class=\"name\">" << name
+             << "</span> <span class=\"type\">level " << depth << ", patch " << group.id << ", "
+             << group.children->size() << (group.children->size() == 1 ? " patch" : " patches")
+             << " inside</span>";
+        if (!level.boxes.empty()) {
+            text << " <button type=\"button\" class=\"zoom\" data-factor=\"0.8\" aria-label=\"Draw "
+                 << name
+                 << " smaller\">\u2212</button> <button type=\"button\" class=\"zoom\" "
+                    "data-factor=\"1.25\" aria-label=\"Draw "
+                 << name << " larger\">+</button>";
+        }
+        if (depth > 1)
+            text << " <button type=\"button\" class=\"close\">Close " << name << "</button>";
+        text << "</figcaption>\n";
+        if (level.boxes.size() < group.children->size()) {
+            text << "<p>Shown are the first " << level.boxes.size() << ".</p>\n";
+        }
+        if (level.boxes.empty()) {
+            text << "<p>There is nothing inside.</p>\n";
+        } else {
+            text << "<div class=\"scroll\" tabindex=\"-1\">"
+                 << drawing.graph(level, "role=\"group\" aria-label=\"Graph of " + name +
+                                             "\" aria-describedby=\"graph-keys\"")
+                 << "</div>\n<div class=\"info\" aria-hidden=\"true\"></div>\n";
+        }
+        for (Patch const& child : *group.children) {
+            auto const inner = levelOf.find(&child);
+            if (inner != levelOf.end()) write(*inner->second, depth + 1);
+        }
+        text << "</figure>\n";
+    };
+    write(levels.front(), 1);
+    return text.str();
+}
+
+std::string legendText(Document const& document) {
+    std::map<std::string, std::string> types;
+    std::function<void(Patch const&)> const add = [&](Patch const& patch) {
+        for (auto const& list : {patch.inputs, patch.outputs}) {
+            for (Port const& port : *list) {
+                types.emplace(portNameForTypeInfo(port.typeInfo, false) + " (" +
+                                  typeToString(port.typeInfo.type) + ")",
+                              typeToString(port.typeInfo.type));
+            }
+        }
+        for (Patch const& child : *patch.children) add(child);
+    };
+    add(document.root);
+    std::string text;
+    for (auto const& [name, type] : types) {
+        text += "<li class=\"t-" + type + "\">" + name + "</li>\n";
+    }
+    return text;
+}
+
+std::string curvesText() {
+    constexpr double kSize = 100.0;
+    double const side = (svg::kCurveEnd - svg::kCurveStart) * kSize;
+    double const margin = -svg::kCurveStart * kSize;
+    std::ostringstream text;
+    std::vector<std::string> const names = easingFunctionNames();
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        text << "<figure class=\"curve\"><svg role=\"img\" aria-label=\"" << escaped(names[i])
+             << "\" viewBox=\"" << -margin << " " << margin - side << " " << side << " " << side
+             << "\"><rect class=\"beyond\" x=\"" << -margin << "\" y=\"" << margin - side
+             << "\" width=\"" << side << "\" height=\"" << side << "\"/><rect class=\"way\" y=\""
+             << -kSize << "\" width=\"" << kSize << "\" height=\"" << kSize << "\"/><path d=\""
+             << svg::curveData(EasingFunction(i), kSize) << "\"/></svg><figcaption>"
+             << escaped(names[i]) << "</figcaption></figure>\n";
+    }
+    return text.str();
+}
+
+std::string shapesText() {
+    struct Shape {
+        char const* call;
+        Path path;
+    };
+    Path const leaf = PathBuilder().moveTo({0, 0}).quadCurveTo({20, -20}, {40, 0}).close().build();
+    std::vector<Shape> const shapes{
+        {"moveTo, lineTo, close",
+         PathBuilder().moveTo({0, 30}).lineTo({20, 0}).lineTo({40, 30}).close().build()},
+        {"curveTo", PathBuilder().moveTo({0, 30}).curveTo({0, 0}, {40, 40}, {40, 0}).build()},
+        {"quadCurveTo", PathBuilder().moveTo({0, 30}).quadCurveTo({20, -20}, {40, 30}).build()},
+        {"arcTo, vertical first", PathBuilder().moveTo({0, 30}).arcTo({40, 0}, true).build()},
+        {"arcTo, horizontal first", PathBuilder().moveTo({0, 30}).arcTo({40, 0}, false).build()},
+        {"circle", PathBuilder().circle({0, 0}, 20).build()},
+        {"ellipse", PathBuilder().ellipse({0, 0}, {28, 16}).build()},
+        {"roundRect", PathBuilder().roundRect({0, 0}, {50, 32}, 9).build()},
+        {"hexaRect", PathBuilder().hexaRect({0, 0}, {50, 32}, 9).build()},
+        {"append", PathBuilder().append(leaf).circle({20, 14}, 8).build()},
+    };
+    std::ostringstream text;
+    for (Shape const& shape : shapes) {
+        Bounds bounds;
+        bounds.add(shape.path);
+        bounds = bounds.widened(5.0);
+        text << "<figure class=\"shape\"><figcaption>" << shape.call
+             << "</figcaption><svg class=\"points\" role=\"img\" aria-label=\"" << shape.call
+             << "\" viewBox=\"" << number(bounds.left) << " " << number(bounds.top) << " "
+             << number(bounds.right - bounds.left) << " " << number(bounds.bottom - bounds.top)
+             << "\"><path class=\"outline\" d=\"" << svg::pathData(shape.path)
+             << "\"/></svg>\n<ol>";
+        for (PathElement const& element : shape.path.elements) {
+            text << "<li>" << pathInstructionToString(element.instruction);
+            char const* before = " ";
+            for (FloatVec2 const p : element.points) {
+                text << before << svg::point(p);
+                before = ", ";
+            }
+            text << "</li>\n";
+        }
+        text << "</ol></figure>\n";
+    }
+    return text.str();
+}
+
+void writeTree(std::ostream& stream, std::string const& name, Unstructured const& data, int depth) {
+    Unstructured::Map const* const map = data.ifMap();
+    Unstructured::Array const* const array = data.ifArray();
+    if (map == nullptr && array == nullptr) {
+        Json const json = toJson(data);
+        stream << "<li><span class=\"name\">" << escaped(printable(name)) << "</span> "
+               << escaped(printable(json.dump(-1, ' ', false, Json::error_handler_t::replace)))
+               << "</li>\n";
+        return;
+    }
+    std::size_t const size = map != nullptr ? map->size() : array->size();
+    stream << "<li><details><summary><span class=\"name\">" << escaped(printable(name))
+           << "</span> " << (map != nullptr ? "{" : "[") << size << (map != nullptr ? "}" : "]")
+           << "</summary><ul>\n";
+    if (depth == kDeepestTree) {
+        stream << "<li>nested deeper than this page shows</li>\n";
+    } else if (map != nullptr) {
+        for (auto const& [key, member] : *map) writeTree(stream, key, member, depth + 1);
+    } else {
+        for (std::size_t i = 0; i < array->size(); ++i) {
+            writeTree(stream, std::to_string(i), (*array)[i], depth + 1);
+        }
+    }
+    stream << "</ul></details></li>\n";
+}
+
+void writeAttributes(std::ostream& stream, std::string const& owner,
+                     std::map<std::string, Unstructured> const& attributes) {
+    if (attributes.empty()) return;
+    stream << "<li><details><summary>" << escaped(owner) << " {" << attributes.size()
+           << "}</summary><ul>\n";
+    for (auto const& [key, value] : attributes) writeTree(stream, key, value, 1);
+    stream << "</ul></details></li>\n";
+}
+
+std::string attributesText(Document const& document) {
+    std::ostringstream text;
+    std::function<void(Patch const&)> const write = [&](Patch const& patch) {
+        std::string const owner = headingOf(patch) + " (patch " + std::to_string(patch.id) + ")";
+        writeAttributes(text, owner, patch.attributes);
+        for (auto const& list : {patch.inputs, patch.outputs}) {
+            for (Port const& port : *list) {
+                writeAttributes(text,
+                                owner + ", " + printable(port.name) + " (port " +
+                                    std::to_string(port.id) + ")",
+                                port.attributes);
+            }
+        }
+        for (Patch const& child : *patch.children) write(child);
+    };
+    write(document.root);
+    std::string const list = text.str();
+    return list.empty() ? "<p>The document has no attributes.</p>\n"
+                        : "<ul class=\"tree\">\n" + list + "</ul>\n";
+}
+
+std::string paragraphs(std::string const& lines) {
+    std::istringstream stream(lines);
+    std::string text;
+    for (std::string line; std::getline(stream, line);) text += "<p>" + escaped(line) + "</p>\n";
+    return text;
+}
+
+std::string stageText(Film const& film) {
+    if (film.bounds.isEmpty) return "";
+    Bounds const& bounds = film.bounds;
+    return "viewBox=\"" + number(bounds.left) + " " + number(bounds.top) + " " +
+           number(bounds.right - bounds.left) + " " + number(bounds.bottom - bounds.top) + "\"";
+}
+
+std::string dataText(Film const& film, Document const& document) {
+    Json plots = Json::array();
+    for (Plot const& plot : film.plots) plots.push_back(plot.texts);
+    Json const data = {{"framesPerSecond", document.framesPerSecond},
+                       {"texts", film.texts.json()},
+                       {"frames", film.frames},
+                       {"plots", plots}};
+    std::string const json = data.dump(-1, ' ', false, Json::error_handler_t::replace);
+    // Nothing in it may look like the end of the element that it stands in.
+    std::string text;
+    for (char const c : json) text += c == '<' ? std::string("\\u003c") : std::string(1, c);
+    return text;
+}
+
+// The template with its {{NAMES}} filled in.
+std::string filled(std::string const& page, std::map<std::string, std::string> const& parts) {
+    std::string text;
+    std::size_t done = 0;
+    for (std::size_t open = page.find("{{"); open != std::string::npos;
+         open = page.find("{{", done)) {
+        std::size_t const close = page.find("}}", open);
+        text += page.substr(done, open - done);
+        text += parts.at(page.substr(open + 2, close - open - 2));
+        done = close + 2;
+    }
+    return text + page.substr(done);
+}
+
+}  // namespace
+
+std::string pageText(Document const& document, std::string const& fileName, long long frames) {
+    Film const film = filmOf(document, frames);
+    std::ostringstream plots;
+    for (std::size_t i = 0; i < film.plots.size(); ++i) {
+        Plot const& plot = film.plots[i];
+        std::string const first = film.texts.json().at(plot.texts.front());
+        plots << plotText(plot, i, frames, first);
+    }
+    if (film.plots.empty()) plots << "<p>The document has no outputs.</p>\n";
+    std::string const name = escaped(printable(fileName));
+    return filled(page_files::kPageHtml, {{"TITLE", name},
+                                          {"NAME", escaped(headingOf(document.root))},
+                                          {"COUNTS", paragraphs(countsText(document))},
+                                          {"GRAPH_CSS", page_files::kGraphCss},
+                                          {"CSS", page_files::kPageCss},
+                                          {"SCRIPT", page_files::kPageJs},
+                                          {"DRAWN", film.bounds.isEmpty ? " hidden" : ""},
+                                          {"NOT_DRAWN", film.bounds.isEmpty ? "" : " hidden"},
+                                          {"VIEW", stageText(film)},
+                                          {"SCENE", scenePaths(film.first)},
+                                          {"LAST_FRAME", std::to_string(frames - 1)},
+                                          {"LEGEND", legendText(document)},
+                                          {"LEVELS", levelsText(document)},
+                                          {"PLOTS", plots.str()},
+                                          {"CURVES", curvesText()},
+                                          {"SHAPES", shapesText()},
+                                          {"ATTRIBUTES", attributesText(document)},
+                                          {"DATA", dataText(film, document)}});
+}

@@ -1,0 +1,16 @@
+// The report: one HTML file with the graph, the animation, its outputs over time, the curves, the
+// shapes and the attributes. It needs no network and no other file.
+//
+//     std::ofstream("report.html") << pageText(document, "animation.json", 120);
+
+#ifndef DOCUMENT_ROAD_PAGE_H
+#define DOCUMENT_ROAD_PAGE_H
+
+#include "document.h"
+
+#include <string>
+
+// `fileName` is shown as the heading; `frames` are evaluated and played.
+std::string pageText(Document const& document, std::string const& fileName, long long frames);
+
+#endif

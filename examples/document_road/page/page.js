@@ -1,0 +1,261 @@
+"use strict";
+
+const data = JSON.parse(document.getElementById("data").textContent);
+const byId = (id) => document.getElementById(id);
+const lastFrame = data.frames.length - 1;
+let frame = 0;
+
+// The points of a path and what belongs to them, from the text of its `d`.
+function handlesOf(d) {
+    let lines = "", points = "", controls = "";
+    let current = "0 0";
+    for (const [, letter, numbers] of d.matchAll(/([MLCQZ])([^MLCQZ]*)/g)) {
+        const all = numbers.trim().split(/\s+/);
+        const p = [];
+        for (let i = 0; i + 1 < all.length; i += 2) p.push(all[i] + " " + all[i + 1]);
+        if (p.length === 0) continue;
+        const end = p[p.length - 1];
+        if (letter === "C") lines += `M${current}L${p[0]}M${end}L${p[1]}`;
+        if (letter === "Q") lines += `M${current}L${p[0]}L${end}`;
+        for (const control of p.slice(0, -1)) controls += `M${control}h0`;
+        points += `M${end}h0`;
+        current = end;
+    }
+    return { handle: lines, control: controls, dot: points };
+}
+
+function svgElement(name, attributes) {
+    const element = document.createElementNS("http://www.w3.org/2000/svg", name);
+    for (const [key, value] of Object.entries(attributes)) element.setAttribute(key, value);
+    return element;
+}
+
+function showHandles(group, d) {
+    const handles = handlesOf(d);
+    for (const name of ["handle", "control", "dot"]) {
+        const path = group.querySelector("." + name) ?? group.appendChild(svgElement("path", { class: name }));
+        path.setAttribute("d", handles[name]);
+    }
+}
+
+// Animation
+
+const drawn = byId("drawn");
+const slider = byId("frame");
+const play = byId("play");
+const charts = [...document.querySelectorAll(".chart")];
+
+function showScene() {
+    const items = data.frames[frame];
+    while (drawn.children.length < items.length) drawn.append(svgElement("path", {}));
+    [...drawn.children].forEach((path, i) => {
+        if (i >= items.length) {
+            path.removeAttribute("d");
+            return;
+        }
+        const [d, color, width] = items[i].map((text) => data.texts[text]);
+        path.setAttribute("d", d);
+        path.setAttribute("class", color === undefined ? "outline" : "layer");
+        if (color === undefined) {
+            path.removeAttribute("stroke");
+        } else {
+            path.setAttribute("stroke", color);
+            path.setAttribute("stroke-width", width);
+        }
+    });
+    byId("points").style.display = byId("show-points").checked ? "" : "none";
+    if (byId("show-points").checked) {
+        showHandles(byId("points"), items.map(([d]) => data.texts[d]).join(" "));
+    }
+}
+
+const plotText = (chart, at) => data.texts[data.plots[chart.dataset.plot][at]];
+
+function showPlot(chart, at) {
+    chart.querySelector(".cursor").setAttribute("d", `M${at} -3V103`);
+    const plot = chart.parentElement;
+    plot.querySelector(".frame").textContent = `frame ${at}`;
+    plot.querySelector("output").textContent = plotText(chart, at);
+}
+
+function showFrame(next) {
+    frame = Math.min(Math.max(next, 0), lastFrame);
+    const time = `${frame}, ${(frame / data.framesPerSecond).toFixed(2)} s`;
+    slider.value = frame;
+    slider.setAttribute("aria-valuetext", time);
+    byId("time").textContent = time;
+    showScene();
+    for (const chart of charts) {
+        chart.setAttribute("aria-valuenow", frame);
+        chart.setAttribute("aria-valuetext", `frame ${frame}: ${plotText(chart, frame)}`);
+        if (!chart.matches(":hover")) showPlot(chart, frame);
+    }
+}
+
+let playing = 0;
+function setPlaying(on) {
+    cancelAnimationFrame(playing);
+    playing = 0;
+    play.textContent = on ? "Pause" : "Play";
+    play.setAttribute("aria-pressed", String(on));
+    if (!on) return;
+    const startFrame = frame;
+    const start = performance.now();
+    const step = (now) => {
+        const passed = Math.floor(Math.max(now - start, 0) / 1000 * data.framesPerSecond);
+        const next = (startFrame + passed) % (lastFrame + 1);
+        if (next !== frame) showFrame(next);
+        playing = requestAnimationFrame(step);
+    };
+    playing = requestAnimationFrame(step);
+}
+
+// By how many frames a key goes on, or nothing for other keys.
+function keyStep(key) {
+    const steps = { ArrowLeft: -1, ArrowDown: -1, ArrowRight: 1, ArrowUp: 1, PageDown: -10, PageUp: 10, Home: -Infinity, End: Infinity };
+    return steps[key];
+}
+
+play.addEventListener("click", () => setPlaying(!playing));
+slider.addEventListener("input", () => {
+    setPlaying(false);
+    showFrame(Number(slider.value));
+});
+byId("show-points").addEventListener("change", showScene);
+byId("animation").addEventListener("keydown", (event) => {
+    if (event.target === slider && event.key === " ") {
+        event.preventDefault();
+        setPlaying(!playing);
+    }
+    if (event.target === play && keyStep(event.key) !== undefined) {
+        event.preventDefault();
+        setPlaying(false);
+        showFrame(frame + keyStep(event.key));
+    }
+});
+
+// Plots
+
+for (const chart of charts) {
+    const frameAt = (event) => {
+        const box = chart.getBoundingClientRect();
+        const at = Math.round((event.clientX - box.left) / box.width * lastFrame);
+        return Math.min(Math.max(at, 0), lastFrame);
+    };
+    chart.addEventListener("pointermove", (event) => showPlot(chart, frameAt(event)));
+    chart.addEventListener("pointerleave", () => showPlot(chart, frame));
+    chart.addEventListener("click", (event) => {
+        setPlaying(false);
+        showFrame(frameAt(event));
+    });
+    chart.addEventListener("keydown", (event) => {
+        if (keyStep(event.key) === undefined) return;
+        event.preventDefault();
+        setPlaying(false);
+        showFrame(frame + keyStep(event.key));
+        showPlot(chart, frame);
+    });
+}
+
+// Graph
+
+function showInfo(item) {
+    const info = item.closest("figure").querySelector(":scope > .info");
+    info.replaceChildren(...item.getAttribute("aria-label").split("; ").map((line) => {
+        const paragraph = document.createElement("p");
+        paragraph.textContent = line;
+        return paragraph;
+    }));
+}
+
+function setOpen(heading, open) {
+    heading.setAttribute("aria-expanded", String(open));
+    heading.querySelector(".fold").textContent = open ? "\u2212" : "+";
+    byId(heading.dataset.level).hidden = !open;
+    if (open) byId(heading.dataset.level).scrollIntoView({ block: "nearest" });
+}
+const toggle = (heading) => setOpen(heading, heading.getAttribute("aria-expanded") !== "true");
+
+// One stop of the tab key for each graph; the arrow keys go on from there.
+for (const graph of document.querySelectorAll(".graph")) {
+    const items = [...graph.querySelectorAll("[tabindex]")];
+    let current = items[0];
+    showInfo(current);
+    current.setAttribute("tabindex", "0");
+    const go = (item) => {
+        if (!item) return;
+        current.setAttribute("tabindex", "-1");
+        current = item;
+        current.setAttribute("tabindex", "0");
+        current.focus();
+    };
+    const place = new Map(items.map((item, i) => [item, i]));
+    const headings = items.filter((item) => item.classList.contains("heading"));
+    const headingOf = new Map();
+    let heading = -1;
+    for (const item of items) {
+        if (item.classList.contains("heading")) ++heading;
+        headingOf.set(item, heading);
+    }
+    const itemOf = (event) => event.target.closest("[tabindex]");
+    let pointedAt = null;
+    graph.addEventListener("pointermove", (event) => {
+        const item = itemOf(event);
+        // A pointer at rest, beneath which the graph scrolls, points at nothing new.
+        const rests = event.movementX === 0 && event.movementY === 0;
+        if (item === pointedAt || rests) return;
+        pointedAt = item;
+        if (item && graph.contains(item)) showInfo(item);
+    });
+    graph.addEventListener("focusin", (event) => {
+        const item = itemOf(event);
+        if (!item || !graph.contains(item)) return;
+        if (item !== current) go(item);
+        showInfo(item);
+        item.scrollIntoView({ block: "nearest", inline: "nearest" });
+    });
+    graph.addEventListener("click", (event) => {
+        const item = itemOf(event);
+        if (item && item.getAttribute("role") === "button" && graph.contains(item)) toggle(item);
+    });
+    graph.addEventListener("keydown", (event) => {
+        const item = itemOf(event);
+        if (!item || !graph.contains(item)) return;
+        if ((event.key === "Enter" || event.key === " ") && item.getAttribute("role") === "button") toggle(item);
+        else if (event.key === "ArrowDown") go(items[place.get(item) + 1]);
+        else if (event.key === "ArrowUp") go(items[place.get(item) - 1]);
+        else if (event.key === "ArrowRight") go(headings[headingOf.get(item) + 1]);
+        else if (event.key === "ArrowLeft") go(headings[item.classList.contains("heading") ? headingOf.get(item) - 1 : headingOf.get(item)]);
+        else if (event.key === "Home") go(items[0]);
+        else if (event.key === "End") go(items[items.length - 1]);
+        else return;
+        event.preventDefault();
+    });
+}
+
+for (const close of document.querySelectorAll(".close")) {
+    close.addEventListener("click", () => {
+        const heading = document.querySelector(`[data-level="${close.closest("figure").id}"]`);
+        setOpen(heading, false);
+        heading.focus();
+    });
+}
+
+for (const button of document.querySelectorAll(".zoom")) {
+    button.addEventListener("click", () => {
+        const graph = button.closest("figure").querySelector(".graph");
+        const view = graph.viewBox.baseVal;
+        const scale = graph.width.baseVal.value / view.width * Number(button.dataset.factor);
+        graph.setAttribute("width", view.width * Math.min(Math.max(scale, 0.1), 3));
+        graph.setAttribute("height", view.height * Math.min(Math.max(scale, 0.1), 3));
+    });
+}
+
+// Shapes
+
+for (const picture of document.querySelectorAll("svg.points")) {
+    const group = picture.appendChild(svgElement("g", { "aria-hidden": "true" }));
+    showHandles(group, picture.querySelector(".outline").getAttribute("d"));
+}
+
+showFrame(0);

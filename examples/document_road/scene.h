@@ -1,0 +1,49 @@
+// What a document draws in the frame that was evaluated last: its outputs that are paths, and its
+// layers.
+//
+//     Scene scene(document, evaluator.root());
+//     for (Drawn const& drawn : scene.now()) std::cout << drawn.name << " " << drawn.data << "\n";
+
+#ifndef DOCUMENT_ROAD_SCENE_H
+#define DOCUMENT_ROAD_SCENE_H
+
+#include "document.h"
+#include "report.h"
+
+#include <Engine/Base/path.h>
+
+#include <string>
+#include <vector>
+
+// One outline.
+struct Drawn {
+    std::string name;
+    tarn::engine::Path path;
+    // The text of an SVG path's `d`.
+    std::string data;
+    // A layer is stroked; an output that is a path is filled, and has no stroke.
+    bool isLayer = false;
+    // Red, green, blue and opacity.
+    tarn::engine::FloatVec4 color;
+    double width = 0.0;
+};
+
+class Scene {
+public:
+    // Both are used as long as the scene lives.
+    Scene(Document const& document, tarn::engine::EvalPatch const& root);
+
+    // In drawing order, one for each element of a loop.
+    std::vector<Drawn> now() const;
+
+private:
+    void findLayers(tarn::engine::EvalPatch const& patch);
+
+    std::vector<ShownOutput> paths;
+    std::vector<tarn::engine::EvalPatch const*> layers;
+};
+
+// "frame 0, ring: M 5 0 ...", a line for each outline of each `every`-th frame.
+std::string pathsText(Document const& document, long long frames, long long every);
+
+#endif

@@ -1,0 +1,53 @@
+// All easing curves on one sheet, as an SVG picture: the way from 0 to 1 in the bright square, and
+// what they do before and beyond it.
+//
+//     easing_sheet > easing_sheet.svg
+
+#include "svg.h"
+
+#include <iostream>
+
+using namespace tarn::engine;
+
+int main() {
+    constexpr int kColumns = 5;
+    constexpr double kSize = 100.0;  // Of the square from 0 to 1.
+    constexpr double kCell = 170.0;
+    std::vector<std::string> const names = easingFunctionNames();
+    int const count = static_cast<int>(names.size());
+    double const width = kColumns * kCell;
+    double const height = (count + kColumns - 1) / kColumns * (kCell + 10.0);
+
+    std::cout
+        << "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " << width << " " << height
+        << "\" role=\"img\" aria-label=\"The easing curves\">\n"
+        << "<style>\n"
+           "  text { font: 13px sans-serif; fill: #1c2430; text-anchor: middle; }\n"
+           "  .sheet { fill: #ffffff; } .beyond { fill: #e3e7ee; } .way { fill: #f6f8fb; }\n"
+           "  .curve { fill: none; stroke: #0b62b8; stroke-width: 2; }\n"
+           "  @media (prefers-color-scheme: dark) {\n"
+           "    text { fill: #e6eaf0; } .sheet { fill: #14181f; } .beyond { fill: #262d38; }\n"
+           "    .way { fill: #1b2028; } .curve { stroke: #7cc0ff; }\n"
+           "  }\n"
+           "</style>\n"
+        << "<rect class=\"sheet\" width=\"" << width << "\" height=\"" << height << "\"/>\n";
+    double const margin = -svg::kCurveStart * kSize;
+    double const side = (svg::kCurveEnd - svg::kCurveStart) * kSize;
+    for (int i = 0; i < count; ++i) {
+        // Each cell is a picture of its own, which cuts off what leaves it.
+        std::cout << "<svg x=\"" << i % kColumns * kCell + 10.0 << "\" y=\""
+                  << i / kColumns * (kCell + 10.0) + 5.0 << "\" width=\"" << side << "\" height=\""
+                  << side << "\" viewBox=\"" << -margin << " " << margin - side << " " << side
+                  << " " << side << "\">\n"
+                  << "<rect class=\"beyond\" x=\"" << -margin << "\" y=\"" << margin - side
+                  << "\" width=\"" << side << "\" height=\"" << side << "\"/>\n"
+                  << "<rect class=\"way\" y=\"" << -kSize << "\" width=\"" << kSize
+                  << "\" height=\"" << kSize << "\"/>\n"
+                  << "<path class=\"curve\" d=\"" << svg::curveData(EasingFunction(i), kSize)
+                  << "\"/>\n</svg>\n"
+                  << "<text x=\"" << i % kColumns * kCell + 10.0 + side / 2 << "\" y=\""
+                  << i / kColumns * (kCell + 10.0) + side + 22.0 << "\">"
+                  << svg::escaped(names[static_cast<std::size_t>(i)]) << "</text>\n";
+    }
+    std::cout << "</svg>\n";
+}
