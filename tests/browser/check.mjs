@@ -1,0 +1,353 @@
+// The report in a real browser: Debian's chromium, at two sizes and in both colour schemes.
+//
+//     node check.mjs DOCUMENT_ROAD DOCUMENTS FOLDER [CHROMIUM]
+//
+// Writes the pages and screenshots of them into FOLDER. Ends non-zero at the first check that fails.
+
+import assert from "node:assert/strict";
+import { execFileSync } from "node:child_process";
+import { readFileSync, writeFileSync } from "node:fs";
+import { createRequire } from "node:module";
+import path from "node:path";
+import { pathToFileURL } from "node:url";
+
+const [program, documents, out, executablePath = "/usr/bin/chromium"] = process.argv.slice(2);
+const folder = path.resolve(out);
+const require = createRequire(path.join(folder, "package.json"));
+const { chromium } = require("playwright-core");
+const axe = readFileSync(require.resolve("axe-core/axe.min.js"), "utf8");
+
+const FRAMES = 120;
+const SIZES = [{ width: 1280, height: 800 }, { width: 390, height: 844 }];
+const SCHEMES = ["light", "dark"];
+const OPENING_SECONDS = 5;
+
+let checks = 0;
+function check(condition, what) {
+    assert.ok(condition, what);
+    ++checks;
+}
+function checkEqual(actual, expected, what) {
+    assert.deepEqual(actual, expected, what);
+    ++checks;
+}
+
+const run = (...options) => execFileSync(program, options, { encoding: "utf8", maxBuffer: 1 << 28 });
+
+function writePage(file, name) {
+    const page = path.join(folder, `${name}.html`);
+    run(file, "--frames", "0", "--report", page, "--report-frames", String(FRAMES));
+    return pathToFileURL(page).href;
+}
+
+// Opens the page; every console message and every error is a failure, as is anything that it loads.
+async function open(browser, url, options) {
+    const page = await browser.newPage(options);
+    page.on("console", (message) => assert.fail(`console: ${message.type()}: ${message.text()}`));
+    page.on("pageerror", (error) => assert.fail(`error: ${error.message}`));
+    page.on("request", (request) => {
+        const asked = request.url();
+        assert.ok(asked === url || asked.startsWith(url + "#") || asked.startsWith("data:"), `loads ${asked}`);
+    });
+    await page.goto(url);
+    return page;
+}
+
+// What is wrong with the places of texts: cut off, or over one another.
+const misplacedTexts = () => {
+    const found = [];
+    const texts = [];
+    const walker = document.createTreeWalker(document.body, NodeFilter.SHOW_TEXT);
+    while (walker.nextNode()) {
+        const node = walker.currentNode;
+        const parent = node.parentElement;
+        if (!node.data.trim() || parent.closest("script, .skip")) continue;
+        if (!parent.checkVisibility({ checkOpacity: true })) continue;
+        const range = document.createRange();
+        range.selectNodeContents(node);
+        // A graph scrolls in its frame: its texts are held against one another alone.
+        const graph = parent.closest(".graph");
+        for (const box of range.getClientRects()) {
+            if (box.width < 1) continue;
+            texts.push({ text: node.data.trim(), box, graph, info: parent.closest(".info, .now") });
+            if (graph) {
+                const patch = parent.closest(".patch").querySelector(".body").getBoundingClientRect();
+                if (box.left < patch.left || box.right > patch.right) found.push(`leaves its patch: ${node.data}`);
+            } else if (box.left < 0 || box.right > innerWidth + 0.5) {
+                found.push(`leaves the page: ${node.data}`);
+            }
+        }
+    }
+    const shown = texts.filter(({ info }) => !info);
+    for (let i = 0; i < shown.length; ++i) {
+        for (let j = i + 1; j < shown.length; ++j) {
+            const a = shown[i];
+            const b = shown[j];
+            if (a.graph !== b.graph) continue;
+            const width = Math.min(a.box.right, b.box.right) - Math.max(a.box.left, b.box.left);
+            const height = Math.min(a.box.bottom, b.box.bottom) - Math.max(a.box.top, b.box.top);
+            if (width > 2 && height > 6) found.push(`overlap: ${a.text} / ${b.text}`);
+        }
+    }
+    if (document.documentElement.scrollWidth > innerWidth) found.push("the page scrolls sideways");
+    return { found, count: texts.length };
+};
+
+async function checkLooks(page, name, size, scheme) {
+    const { found, count } = await page.evaluate(misplacedTexts);
+    checkEqual(found, [], `${name}, ${size.width}, ${scheme}`);
+    check(count > 50, "texts were looked at");
+    await page.evaluate(axe);
+    const result = await page.evaluate(() => globalThis.axe.run(document, {
+        runOnly: ["wcag2a", "wcag2aa", "wcag21a", "wcag21aa", "wcag22aa", "best-practice"],
+    }));
+    const wrong = result.violations.map((v) => `${v.id}: ${v.help}: ${v.nodes.map((n) => n.html).slice(0, 3)}`);
+    checkEqual(wrong, [], `accessibility of ${name}, ${size.width}, ${scheme}`);
+    check(result.passes.some(({ id }) => id === "color-contrast"), "contrast was looked at");
+    await page.screenshot({ path: path.join(folder, `${name}-${size.width}-${scheme}.png`), fullPage: true });
+}
+
+// The `d` of everything that is drawn, in order.
+const drawnNow = (page) => page.$$eval("#drawn path[d]", (paths) => paths.map((p) => p.getAttribute("d")));
+
+async function checkAnimation(page, file) {
+    // What the program prints for each frame.
+    const printed = Array.from({ length: FRAMES }, () => []);
+    const lines = run(file, "--frames", String(FRAMES), "--paths").split("\n");
+    for (const line of lines) {
+        const match = /^frame (\d+), [^:]*: (M .*)$/.exec(line);
+        if (match) printed[Number(match[1])].push(match[2]);
+    }
+    check(printed.every((paths) => paths.length === 2), "an outline and a layer in every frame");
+    checkEqual(await drawnNow(page), printed[0], "the first frame");
+
+    for (let frame = 0; frame < FRAMES; ++frame) {
+        await page.fill("#frame", String(frame));
+        checkEqual(await drawnNow(page), printed[frame], `the slider at frame ${frame}`);
+    }
+    await page.focus("#frame");
+    await page.keyboard.press("Home");
+    checkEqual(await drawnNow(page), printed[0], "the key Home");
+    for (const [key, frame] of [["ArrowRight", 1], ["ArrowRight", 2], ["ArrowLeft", 1], ["End", FRAMES - 1]]) {
+        await page.keyboard.press(key);
+        checkEqual(await drawnNow(page), printed[frame], `the key ${key}`);
+    }
+    await page.keyboard.press("Home");
+
+    await page.evaluate(() => {
+        globalThis.shifts = [];
+        new PerformanceObserver((list) => globalThis.shifts.push(...list.getEntries()))
+            .observe({ type: "layout-shift", buffered: false });
+    });
+    const height = await page.evaluate(() => document.documentElement.scrollHeight);
+    await page.click("#play");
+    checkEqual(await page.textContent("#play"), "Pause");
+    const seen = new Set();
+    for (let i = 0; i < 20; ++i) {
+        await page.waitForTimeout(60);
+        seen.add((await drawnNow(page))[0]);
+        checkEqual(await page.evaluate(() => document.documentElement.scrollHeight), height, "no jump of the page");
+    }
+    check(seen.size >= 5, `playing showed ${seen.size} frames`);
+    await page.keyboard.press("Space");
+    checkEqual(await page.textContent("#play"), "Play");
+    const stopped = await drawnNow(page);
+    await page.waitForTimeout(250);
+    checkEqual(await drawnNow(page), stopped, "a pause");
+    checkEqual(await page.evaluate(() => globalThis.shifts.filter((s) => !s.hadRecentInput).length), 0, "no layout shift");
+
+    checkEqual(await page.locator("#points").isVisible(), false);
+    await page.check("#show-points");
+    for (const name of ["handle", "control", "dot"]) {
+        check((await page.getAttribute(`#points .${name}`, "d")).length > 100, `${name}s are shown`);
+    }
+    await page.uncheck("#show-points");
+    checkEqual(await page.locator("#points").isVisible(), false);
+}
+
+async function checkPlots(page, file) {
+    const rows = run(file, "--frames", String(FRAMES)).trimEnd().split("\n").slice(-FRAMES - 1)
+        .map((line) => line.trim().split(/ {2,}/));
+    const [headings, ...cells] = rows;
+    const charts = await page.$$(".chart");
+    checkEqual(charts.length, headings.length - 1, "a plot for each output");
+    for (const frame of [0, 37, FRAMES - 1]) {
+        await page.fill("#frame", String(frame));
+        for (const [i, chart] of charts.entries()) {
+            const text = `frame ${frame}: ${cells[frame][i + 1]}`;
+            checkEqual(await chart.getAttribute("aria-valuetext"), text, headings[i + 1]);
+            const plot = await chart.evaluate((c) => c.parentElement.querySelector("output").textContent);
+            checkEqual(plot, cells[frame][i + 1], headings[i + 1]);
+        }
+    }
+    // Pointing at a plot reads the frame there; going away, the current one.
+    await page.fill("#frame", "0");
+    for (const [i, chart] of charts.entries()) {
+        await chart.scrollIntoViewIfNeeded();
+        const box = await chart.boundingBox();
+        await page.mouse.move(box.x + box.width * 60 / (FRAMES - 1), box.y + box.height / 2);
+        const shown = await chart.evaluate((c) => c.parentElement.querySelector(".now").textContent.trim());
+        checkEqual(shown, `frame 60 ${cells[60][i + 1]}`, `pointing at ${headings[i + 1]}`);
+        await page.mouse.move(box.x + box.width / 2, box.y - 40);
+    }
+    checkEqual(await page.textContent(".plot .frame"), "frame 0");
+}
+
+async function checkGraph(page) {
+    const level = page.locator("#level-13");
+    checkEqual(await level.isVisible(), false, "a group is closed");
+    const heading = page.locator('[data-level="level-13"]');
+    await heading.click();
+    checkEqual(await level.isVisible(), true, "a group opens");
+    checkEqual(await heading.getAttribute("aria-expanded"), "true");
+    await page.getByRole("button", { name: "Close colors" }).click();
+    checkEqual(await level.isVisible(), false, "a group closes");
+    checkEqual(await heading.evaluate((h) => h === document.activeElement), true, "the focus goes back");
+    await page.keyboard.press("Enter");
+    checkEqual(await level.isVisible(), true, "a key opens a group");
+    await page.keyboard.press("Space");
+    checkEqual(await level.isVisible(), false, "a key closes a group");
+
+    const info = page.locator("#level-1 > .info");
+    await page.locator('#level-1 [aria-label^="input speed;"]').first().hover();
+    const lines = ["input speed", "Number [type: float] from 0.1 to 4, default 1", "port 201, tag 1",
+        'ui: {"slider":1,"steps":[0.1,1,4]}', 'unit: "times"'];
+    checkEqual(await info.locator("p").allTextContents(), lines, "pointing at a port");
+
+    // The arrow keys go through every patch and port of the level, and back.
+    const items = await page.$$eval("#level-1 > .scroll [tabindex]", (all) => all.map((e) => e.ariaLabel).filter(Boolean));
+    await page.locator("#level-1 > .scroll .heading").first().focus();
+    await page.keyboard.press("Home");
+    const reached = [];
+    for (let i = 0; i < items.length; ++i) {
+        reached.push(await page.evaluate(() => document.activeElement.ariaLabel));
+        checkEqual((await info.locator("p").allTextContents()).join("; "), reached[i], "the focus shows what is there");
+        await page.keyboard.press("ArrowDown");
+    }
+    checkEqual(reached, items, "every patch and port by the keyboard");
+    await page.keyboard.press("Home");
+    await page.keyboard.press("ArrowRight");
+    check((await page.evaluate(() => document.activeElement.ariaLabel)).startsWith("colors;"), "the next patch");
+
+    const width = () => page.locator("#level-1 > .scroll svg").evaluate((s) => s.width.baseVal.value);
+    const before = await width();
+    await page.getByRole("button", { name: "Draw bouncing badge larger" }).click();
+    check(Math.abs(await width() - before * 1.25) < 0.01, "a graph is drawn larger");
+    await page.getByRole("button", { name: "Draw bouncing badge smaller" }).click();
+}
+
+async function checkKeyboard(page) {
+    for (const closed of await page.$$("details:not([open]) > summary")) {
+        if (!await closed.isVisible()) continue;
+        await closed.focus();
+        await page.keyboard.press("Enter");
+        check(await closed.evaluate((s) => s.parentElement.open), "a key opens an attribute");
+    }
+    const wanted = await page.$$eval("a[href], button, input, summary, .chart, .graph", (all) => {
+        const visible = all.filter((e) => e.checkVisibility());
+        visible.forEach((e, i) => { e.dataset.wanted = i; });
+        return visible.length;
+    });
+    await page.evaluate(() => {
+        document.activeElement.blur();
+        getSelection().collapse(document.body, 0);
+    });
+    const reached = new Set();
+    for (let i = 0; i < wanted * 2 + 20; ++i) {
+        await page.keyboard.press("Tab");
+        const at = await page.evaluate(() => document.activeElement.closest("[data-wanted]")?.dataset.wanted);
+        if (at !== undefined) reached.add(at);
+    }
+    checkEqual(reached.size, wanted, "the tab key reaches everything");
+}
+
+function largeDocument(patches) {
+    const children = [];
+    const connections = [];
+    for (let i = 0; i < patches; ++i) {
+        const id = i + 2;
+        children.push({
+            id, kind: "add", name: `patch ${id}`, attributes: { place: [i % 50, i / 50] },
+            inputs: [{ id: id * 10, name: "a", type: "float" }, { id: id * 10 + 1, name: "b", type: "vec2" }],
+            outputs: [{ id: id * 10 + 2, name: "sum", type: "vec2" }],
+        });
+        for (const input of [0, 1]) {
+            const from = 2 + Math.floor(i / (2 + input));
+            if (i > 1) connections.push({ from: [from, from * 10 + 2], to: [id, id * 10 + input] });
+        }
+    }
+    return { root: { id: 1, name: "large", children, connections } };
+}
+
+// A group inside a group closes with the outer one.
+async function checkNested(browser) {
+    let root = { id: 5, name: "level 5" };
+    for (let id = 4; id > 0; --id) root = { id, name: `level ${id}`, children: [root] };
+    const file = path.join(folder, "nested.json");
+    writeFileSync(file, JSON.stringify({ root }));
+    const page = await open(browser, writePage(file, "nested"), { viewport: SIZES[1] });
+    const shown = () => page.$$eval(".level", (all) => all.filter((l) => l.checkVisibility()).map((l) => l.id));
+    const levels = ["level-1", "level-2", "level-3", "level-4"];
+    for (let i = 1; i < levels.length; ++i) {
+        checkEqual(await shown(), levels.slice(0, i));
+        await page.locator(`[data-level="${levels[i]}"]`).click();
+    }
+    checkEqual(await shown(), levels);
+    await page.locator('[data-level="level-2"]').click();
+    checkEqual(await shown(), ["level-1"]);
+    await page.close();
+}
+
+async function checkLarge(browser) {
+    const file = path.join(folder, "large.json");
+    writeFileSync(file, JSON.stringify(largeDocument(2000)));
+    const url = writePage(file, "large");
+    const start = performance.now();
+    const page = await open(browser, url, { viewport: SIZES[0] });
+    checkEqual(await page.locator(".patch").count(), 2000);
+    await page.evaluate(() => new Promise((done) => requestAnimationFrame(() => setTimeout(done, 0))));
+    const seconds = (performance.now() - start) / 1000;
+    check(seconds < OPENING_SECONDS, `2,000 patches open in ${seconds.toFixed(1)} s`);
+    const last = page.locator('.heading[aria-label^="patch 2001;"]');
+    await last.scrollIntoViewIfNeeded();
+    check(await last.isVisible(), "the last patch can be scrolled to");
+    const scrolled = await page.locator(".scroll").evaluate((s) => s.scrollTop + s.scrollLeft);
+    check(scrolled > 1000, "the graph scrolls");
+    console.log(`2,000 patches: ${seconds.toFixed(2)} s until they are drawn`);
+    await page.close();
+}
+
+const browser = await chromium.launch({ executablePath, args: ["--no-sandbox"] });
+try {
+    for (const name of ["animation", "small", "node_graph"]) {
+        const url = writePage(path.join(documents, `${name}.json`), name);
+        for (const viewport of SIZES) {
+            for (const colorScheme of SCHEMES) {
+                const page = await open(browser, url, { viewport, colorScheme, reducedMotion: "reduce" });
+                await checkLooks(page, name, viewport, colorScheme);
+                await page.close();
+            }
+        }
+    }
+    const file = path.join(documents, "animation.json");
+    const url = pathToFileURL(path.join(folder, "animation.html")).href;
+    for (const viewport of SIZES) {
+        const page = await open(browser, url, { viewport, reducedMotion: "reduce" });
+        await checkAnimation(page, file);
+        await checkPlots(page, file);
+        await checkGraph(page);
+        await checkKeyboard(page);
+        // With everything open.
+        for (const heading of await page.$$('[data-level][aria-expanded="false"]')) {
+            await heading.evaluate((h) => h.dispatchEvent(new MouseEvent("click", { bubbles: true })));
+        }
+        await page.check("#show-points");
+        await checkLooks(page, "animation-open", viewport, "light");
+        await page.close();
+    }
+    await checkNested(browser);
+    await checkLarge(browser);
+} finally {
+    await browser.close();
+}
+console.log(`${checks} checks passed in chromium`);
