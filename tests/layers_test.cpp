@@ -137,6 +137,8 @@ TEST(StrokeSettings, IsVisibleByItsThresholds) {
              Row{"whole", 1, 1, 0, 1, false, true},
              Row{"no length", 1, 1, 0, 0, false, false},
              Row{"no length, forced", 1, 1, 0, 0, true, true},
+             Row{"no length, further on", 1, 1, 0.5, 0.5, false, false},
+             Row{"around the start", 1, 1, -0.5, 0.5, false, true},
              Row{"opacity at the threshold", 1, 0.0001, 0, 1, true, false},
              Row{"opacity above it", 1, std::nextafter(0.0001, 1.0), 0, 1, false, true},
              Row{"no opacity", 1, 0, 0, 1, true, false},
@@ -160,6 +162,21 @@ TEST(StrokeSettings, IsVisibleByItsThresholds) {
         EXPECT_EQ(settings.isVisible(), row.visible);
     }
     EXPECT_FALSE(StrokeSettings().isVisible());
+}
+
+TEST(Layers, AreZeroAndEmptyAtFirst) {
+    StrokeSettings const stroke;
+    EXPECT_EQ(stroke.cap, 0);
+    EXPECT_EQ(stroke.join, 0);
+    EXPECT_EQ(stroke.miterLimit, 0.0);
+    EXPECT_EQ(stroke.width, 0.0);
+    EXPECT_EQ(stroke.opacity, 0.0);
+    EXPECT_EQ(stroke.start, 0.0);
+    EXPECT_EQ(stroke.end, 0.0);
+    EXPECT_FALSE(stroke.forceVisible);
+    EXPECT_EQ(RenderLayer().rendererState, 0u);
+    EXPECT_EQ(RenderLayer().id, 0u);
+    EXPECT_EQ(ModelLayer().id, 0u);
 }
 
 TEST(StrokeSettings, EqualsFieldByField) {

@@ -75,6 +75,10 @@ TEST(PatchIndex, AnswersAboutASmallGraph) {
     expectView(index.outgoingConnections(22), &root, {{2, 22, 3, 31}, {2, 22, 2, 21}});
     EXPECT_EQ(index.outgoingConnections(22).begin()->toPortId, 31u);
     EXPECT_EQ((*index.outgoingConnections(22).begin()++).toPortId, 31u);
+    auto place = index.outgoingConnections(22).begin();
+    EXPECT_EQ((place++)->toPortId, 31u);
+    EXPECT_EQ(place->toPortId, 21u);
+    EXPECT_TRUE(++place == index.outgoingConnections(22).end());
     EXPECT_TRUE(index.outgoingConnections(12).empty());
     EXPECT_TRUE(index.outgoingConnections(99).empty());
     EXPECT_EQ(index.incomingConnection(31), connections);

@@ -250,6 +250,30 @@ TEST(Patch, CopiesShareTheirLists) {
     EXPECT_EQ(copy.connections, original.connections);
 }
 
+TEST(Records, AreZeroAndEmptyAtFirst) {
+    Port const port;
+    EXPECT_EQ(port.id, 0u);
+    EXPECT_EQ(port.tag, 0u);
+    EXPECT_EQ(port.name, "");
+    EXPECT_EQ(port.typeInfo, TypeInfo());
+    EXPECT_EQ(port.defaultValue, Value());
+    EXPECT_TRUE(port.attributes.empty());
+    Patch const patch;
+    EXPECT_EQ(patch.id, 0u);
+    EXPECT_EQ(patch.builtin, 0u);
+    EXPECT_EQ(patch.descriptor, "");
+    EXPECT_EQ(patch.modelLayer, ModelLayer());
+    EXPECT_EQ(patch.name, "");
+    EXPECT_TRUE(patch.attributes.empty());
+    EvalPatch const evaluated;
+    EXPECT_EQ(evaluated.id, 0u);
+    EXPECT_EQ(evaluated.builtin, 0u);
+    EXPECT_EQ(evaluated.name, "");
+    EXPECT_EQ(evaluated.modelLayer, ModelLayer());
+    EXPECT_FALSE(evaluated.hasInputCount);
+    EXPECT_FALSE(evaluated.hasOutputCount);
+}
+
 TEST(EvalPort, IsEmptyAtFirst) {
     EvalPort const port;
     EXPECT_EQ(port.id, 0u);

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdint>
 #include <stdexcept>
 
 using tarn::engine::FloatVec2;
@@ -79,6 +80,26 @@ TEST(Points, OfUpToThreeAllocateNothing) {
     points.push_back({13, 14});
     EXPECT_EQ(counter.count(), 1u);
     static_assert(sizeof(Points) <= 72);
+}
+
+TEST(Points, KeepRoomUntilTheyShrink) {
+    EXPECT_EQ(Points().max_size(), SIZE_MAX / 32);
+    Points points{{1, 2}, {3, 4}, {5, 6}, {7, 8}, {9, 10}};
+    points.reserve(100);
+    FloatVec2 const* const before = points.data();
+    EXPECT_EQ(points.capacity(), 100u);
+    points.resize(5);
+    EXPECT_EQ(points.data(), before);
+    points.shrink_to_fit();
+    EXPECT_EQ(points.capacity(), 5u);
+    EXPECT_EQ(points, (Points{{1, 2}, {3, 4}, {5, 6}, {7, 8}, {9, 10}}));
+    FloatVec2 const* const shrunk = points.data();
+    points.shrink_to_fit();
+    EXPECT_EQ(points.data(), shrunk);
+    points.resize(2);
+    points.shrink_to_fit();
+    EXPECT_EQ(points.capacity(), 3u);
+    EXPECT_EQ(points, (Points{{1, 2}, {3, 4}}));
 }
 
 TEST(Points, GiveBothEndsToThoseWhoOnlyRead) {

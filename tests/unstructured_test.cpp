@@ -480,6 +480,25 @@ TEST(Unstructured, HandlesEveryDepthAlike) {
     };
     EXPECT_EQ(bushy("a"), bushy("a"));
     EXPECT_NE(bushy("a"), bushy("b"));
+    // Deep, and of other sizes or with other keys beside the deep part.
+    Unstructured const deep = nested(400, 2, "leaf");
+    std::vector<Unstructured> const different{List{deep},
+                                              List{deep, 1},
+                                              List{deep, 2},
+                                              List{1, deep},
+                                              List{deep, deep},
+                                              Map{{"x", deep}},
+                                              Map{{"y", deep}},
+                                              Map{{"x", deep}, {"y", 1}},
+                                              Map{{"x", deep}, {"z", 1}},
+                                              Map{{"x", deep}, {"y", deep}},
+                                              Map{{"a", 1}, {"x", deep}}};
+    for (std::size_t i = 0; i < different.size(); ++i) {
+        for (std::size_t j = 0; j < different.size(); ++j) {
+            SCOPED_TRACE(testing::Message() << i << " and " << j);
+            EXPECT_EQ(different[i] == different[j], i == j);
+        }
+    }
     Unstructured const copy = bushy("c");
     EXPECT_EQ(Unstructured(copy), bushy("c"));
 }

@@ -68,8 +68,8 @@ double numberFromString(std::shared_ptr<std::string const> const& text) {
     char* parsedTo = nullptr;
     double const number = std::strtod(text->c_str(), &parsedTo);
     errno = errorBefore;
-    if (parsedTo == text->c_str() + text->size()) return number;
-    return text->empty() ? 0.0 : 1.0;
+    // The whole of the empty text is 0.
+    return parsedTo == text->c_str() + text->size() ? number : 1.0;
 }
 
 struct AsInteger : boost::static_visitor<long long> {
