@@ -268,3 +268,29 @@ TEST(Allocations, AreTheseForEachOperation) {
         EXPECT_EQ(counter.count(), row.blocks) << row.operation;
     }
 }
+
+TEST(Allocations, AreGivenBack) {
+    auto const use = [](Row const& row) {
+        Inputs const inputs;
+        Kept kept;
+        row.run(inputs, kept);
+        // Over what is there already, by copy and by move.
+        Kept const copy = kept;
+        row.run(inputs, kept);
+        kept = copy;
+        kept.data = inputs.map;
+        kept.data = Unstructured(inputs.numbers);
+        kept.data = 5;
+        kept.value = inputs.text;
+        kept.value = Value(inputs.path);
+        kept.patch = Patch(inputs.root);
+        kept.path.elements.emplace_back();
+        kept.path = Path();
+    };
+    for (Row const& row : kRows) {
+        use(row);  // What is made at first use stays.
+        AllocationCounter const counter;
+        use(row);
+        EXPECT_EQ(counter.held(), 0u) << row.operation;
+    }
+}

@@ -117,11 +117,24 @@ TEST(Points, CompareAsFloatingPointNumbersDo) {
     EXPECT_TRUE((Points{{1, 1}} != Points{{1, 1}, {1, 1}}));
 }
 
+TEST(Points, AnswerWhereWhatWasInsertedBegins) {
+    Points points{{1, 1}, {2, 2}, {3, 3}};
+    EXPECT_EQ(points.insert(points.begin() + 2, FloatVec2{9, 9}) - points.begin(), 2);
+    EXPECT_EQ(points.insert(points.end(), 2, FloatVec2{8, 8}) - points.begin(), 4);
+    EXPECT_EQ(points.insert(points.begin() + 1, {{7, 7}, {6, 6}}) - points.begin(), 1);
+    EXPECT_EQ(points, (Points{{1, 1}, {7, 7}, {6, 6}, {2, 2}, {9, 9}, {3, 3}, {8, 8}, {8, 8}}));
+}
+
 TEST(Points, RefuseAnIndexOutOfRange) {
     Points points{{1, 2}};
     Points const& constant = points;
     EXPECT_THROW(points.at(1), std::out_of_range);
     EXPECT_THROW(constant.at(static_cast<std::size_t>(-1)), std::out_of_range);
+    try {
+        points.at(1);
+    } catch (std::out_of_range const& error) {
+        EXPECT_STREQ(error.what(), "Points::at");
+    }
 }
 
 TEST(Points, StayAsTheyWereWhenAllocationFails) {

@@ -191,6 +191,7 @@ TEST(Value, IsMadeFromEverySourceAsItsAlternative) {
 }
 
 TEST(Value, MakersAreTheConstructorOfTheirType) {
+    EXPECT_EQ(Value::ResourceID<Type::Image>().id, 0u);
     EXPECT_EQ(Value::Image(42), Value(42, Type::Image));
     EXPECT_EQ(Value::Video(42), Value(42, Type::Video));
     EXPECT_EQ(Value::Sound(42), Value(42, Type::Sound));

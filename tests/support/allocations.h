@@ -17,9 +17,12 @@ class AllocationCounter {
 public:
     AllocationCounter();
     std::size_t count() const;
+    /// How many blocks more there are than when this was made: those not given back.
+    std::size_t held() const;
 
 private:
     std::size_t start;
+    std::size_t startReleased;
 };
 
 /// While it lives, the allocation after `succeeding` further ones throws `std::bad_alloc`; those
