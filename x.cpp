@@ -1,1 +1,0 @@
-#include <Engine/Base/fwd.h>
