@@ -83,7 +83,8 @@ TEST(Points, OfUpToThreeAllocateNothing) {
 }
 
 TEST(Points, KeepRoomUntilTheyShrink) {
-    EXPECT_EQ(Points().max_size(), SIZE_MAX / 32);
+    EXPECT_EQ(Points().max_size(), 4294967295u);
+    EXPECT_THROW(Points().reserve(4294967296u), std::length_error);
     Points points{{1, 2}, {3, 4}, {5, 6}, {7, 8}, {9, 10}};
     points.reserve(100);
     FloatVec2 const* const before = points.data();

@@ -22,6 +22,14 @@ constexpr double kQuarterArc = 0.552284749;  // Deliberate: nine decimals, not 4
 constexpr double kQuarterArcRest = 0.447715251;
 static_assert(kQuarterArcRest == 1.0 - kQuarterArc);
 
+// Nothing but the list itself can fail to grow: the points fit in place.
+template <class... Vectors>
+void add(std::vector<PathElement>& elements, PathInstruction instruction, Vectors... points) {
+    PathElement& element = elements.emplace_back();
+    element.instruction = instruction;
+    (element.points.push_back(points), ...);
+}
+
 }  // namespace
 
 std::string pathInstructionToString(PathInstruction instruction) {
@@ -59,15 +67,6 @@ std::shared_ptr<Path const> Path::EmptyPath() {
     return emptyPathSharedPtr;
 }
 
-// Nothing but the list itself can fail to grow: the points fit in place.
-PathBuilder& PathBuilder::add(PathInstruction instruction,
-                              std::initializer_list<FloatVec2> points) {
-    PathElement& element = elements.emplace_back();
-    element.instruction = instruction;
-    for (FloatVec2 const& point : points) element.points.push_back(point);
-    return *this;
-}
-
 // Growth stays geometric over many calls.
 void PathBuilder::reserve(std::size_t more) {
     std::size_t const needed = elements.size() + more;
@@ -75,30 +74,33 @@ void PathBuilder::reserve(std::size_t more) {
 }
 
 PathBuilder& PathBuilder::moveTo(FloatVec2 p) {
-    add(PathInstruction::moveTo, {p});
+    add(elements, PathInstruction::moveTo, p);
     currentPoint = p;
     return *this;
 }
 
 PathBuilder& PathBuilder::lineTo(FloatVec2 p) {
-    add(PathInstruction::lineTo, {p});
+    add(elements, PathInstruction::lineTo, p);
     currentPoint = p;
     return *this;
 }
 
 PathBuilder& PathBuilder::curveTo(FloatVec2 c1, FloatVec2 c2, FloatVec2 p) {
-    add(PathInstruction::curveTo, {c1, c2, p});
+    add(elements, PathInstruction::curveTo, c1, c2, p);
     currentPoint = p;
     return *this;
 }
 
 PathBuilder& PathBuilder::quadCurveTo(FloatVec2 c, FloatVec2 p) {
-    add(PathInstruction::quadCurveTo, {c, p});
+    add(elements, PathInstruction::quadCurveTo, c, p);
     currentPoint = p;
     return *this;
 }
 
-PathBuilder& PathBuilder::close() { return add(PathInstruction::close, {}); }
+PathBuilder& PathBuilder::close() {
+    add(elements, PathInstruction::close);
+    return *this;
+}
 
 PathBuilder& PathBuilder::append(Path path) {
     reserve(path.elements.size());  // All that can fail comes first.

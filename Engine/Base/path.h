@@ -11,7 +11,6 @@
 #include <Engine/Base/value.h>
 
 #include <cstddef>
-#include <initializer_list>
 #include <memory>
 #include <string>
 #include <type_traits>
@@ -124,7 +123,6 @@ public:
     TARN_ENGINE_BASE_EXPORT bool operator!=(PathBuilder const& other) const;
 
 private:
-    PathBuilder& add(PathInstruction instruction, std::initializer_list<FloatVec2> points);
     void reserve(std::size_t more);
 };
 

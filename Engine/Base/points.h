@@ -11,8 +11,10 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <initializer_list>
 #include <iterator>
+#include <limits>
 #include <stdexcept>
 #include <type_traits>
 #include <utility>
@@ -48,9 +50,16 @@ public:
     Points(Iterator first, Iterator last) {
         for (; first != last; ++first) push_back(*first);
     }
-    Points(Points const& other) { append(other.data(), other.length); }
+    Points(Points const& other) {
+        if (other.isMany()) {
+            append(other.held.many, other.length);
+        } else {
+            held = other.held;
+            length = other.length;
+        }
+    }
     Points(Points&& other) noexcept { take(other); }
-    ~Points() { delete[] many; }
+    ~Points() { release(); }
 
     /// A failing allocation leaves this as it was.
     Points& operator=(Points const& other) {
@@ -59,7 +68,7 @@ public:
     }
     Points& operator=(Points&& other) noexcept {
         if (this == &other) return *this;
-        delete[] many;
+        release();
         take(other);
         return *this;
     }
@@ -68,12 +77,13 @@ public:
     /// A copy.
     operator std::vector<FloatVec2>() const { return {begin(), end()}; }
 
-    /// The points behind one another, and how many. Constant time.
-    FloatVec2* data() { return many != nullptr ? many : few; }
-    FloatVec2 const* data() const { return many != nullptr ? many : few; }
+    /// The points behind one another, and how many. Constant time. More than `max_size` throw
+    /// `std::length_error`.
+    FloatVec2* data() { return isMany() ? held.many : held.few; }
+    FloatVec2 const* data() const { return isMany() ? held.many : held.few; }
     size_type size() const { return length; }
     size_type capacity() const { return room; }
-    size_type max_size() const { return static_cast<size_type>(-1) / (2 * sizeof(FloatVec2)); }
+    size_type max_size() const { return std::numeric_limits<Count>::max(); }
     bool empty() const { return length == 0; }
 
     /// Valid until points are added or this is moved from.
@@ -106,11 +116,11 @@ public:
         if (wanted > room) moveTo(wanted);
     }
     void shrink_to_fit() {
-        if (many != nullptr && length < room) *this = Points(*this);
+        if (isMany() && length < room) *this = Points(*this);
     }
     void clear() { length = 0; }
     void push_back(FloatVec2 point) {
-        if (length == room) moveTo(2 * room);
+        if (length == room) moveTo(roomForMore());
         data()[length++] = point;
     }
     template <class... Coordinates>
@@ -122,7 +132,7 @@ public:
     void resize(size_type count, FloatVec2 point = FloatVec2()) {
         reserve(count);
         if (count > length) std::fill(data() + length, data() + count, point);
-        length = count;
+        length = static_cast<Count>(count);
     }
 
     /// Linear in what follows the place. What is inserted may be a part of this.
@@ -152,7 +162,7 @@ public:
     iterator erase(const_iterator position) { return erase(position, position + 1); }
     iterator erase(const_iterator first, const_iterator last) {
         iterator const to = begin() + (first - begin());
-        length = static_cast<size_type>(std::copy(last, cend(), to) - begin());
+        length = static_cast<Count>(std::copy(last, cend(), to) - begin());
         return to;
     }
     /// As the constructors.
@@ -173,37 +183,55 @@ public:
     friend bool operator!=(Points const& a, Points const& b) { return !(a == b); }
 
 private:
-    static constexpr size_type kInPlace = 3;
+    using Count = std::uint32_t;
+    static constexpr Count kInPlace = 3;
 
+    // A block of their own, or in place: `room` tells. Copying it copies what is there.
+    union Held {
+        Held() : few{} {}
+        FloatVec2 few[kInPlace];
+        FloatVec2* many;
+    };
+
+    bool isMany() const { return room > kInPlace; }
+    void release() {
+        if (isMany()) delete[] held.many;
+    }
     size_type checked(size_type i) const {
         if (i >= length) throw std::out_of_range("Points::at");
         return i;
     }
+    // Twice the room, or at least one more.
+    size_type roomForMore() const {
+        return std::max<size_type>(size_type(length) + 1,
+                                   std::min<size_type>(2 * size_type(room), max_size()));
+    }
     void append(FloatVec2 const* points, size_type count) {
         reserve(length + count);
         std::copy(points, points + count, data() + length);
-        length += count;
+        length += static_cast<Count>(count);
     }
     void moveTo(size_type newRoom) {
+        if (newRoom > max_size()) throw std::length_error("Points");
         auto* const larger = new FloatVec2[newRoom];
         std::copy(begin(), end(), larger);
-        delete[] many;
-        many = larger;
-        room = newRoom;
+        release();
+        held.many = larger;
+        room = static_cast<Count>(newRoom);
     }
     // Without a look at what this held. Afterwards `other` is empty.
     void take(Points& other) noexcept {
-        std::copy(other.few, other.few + kInPlace, few);
-        many = std::exchange(other.many, nullptr);
+        held = other.held;
         length = std::exchange(other.length, 0);
         room = std::exchange(other.room, kInPlace);
+        if (isMany()) other.held = Held();
     }
 
-    FloatVec2 few[kInPlace];
-    FloatVec2* many = nullptr;
-    size_type length = 0;
-    size_type room = kInPlace;
+    Held held;
+    Count length = 0;
+    Count room = kInPlace;
 };
+static_assert(sizeof(Points) == 56, "an element of a path is one cache line");
 static_assert(std::is_nothrow_move_constructible_v<Points>, "elements move when paths grow");
 
 }  // namespace tarn::engine

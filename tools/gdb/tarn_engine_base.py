@@ -221,7 +221,9 @@ class TypeInfoPrinter(Printer):
 
 class PointsPrinter(Printer):
     def points(self):
-        start = self.value["many"] if self.value["many"] else self.value["few"][0].address
+        held = self.value["held"]
+        is_many = int(self.value["room"]) > held["few"].type.range()[1] + 1
+        start = held["many"] if is_many else held["few"][0].address
         return [(start + i).dereference() for i in range(int(self.value["length"]))]
 
     def to_string(self):

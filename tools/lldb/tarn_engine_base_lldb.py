@@ -206,8 +206,10 @@ def type_info_text(value):
 
 def points_text(value):
     kind = record(value, "FloatVec2")
-    many = member(value, "many").GetValueAsUnsigned()
-    start = many or member(value, "few").GetLoadAddress()
+    held = member(value, "held")
+    few = member(held, "few")
+    is_many = member(value, "room").GetValueAsUnsigned() > few.GetNumChildren()
+    start = member(held, "many").GetValueAsUnsigned() if is_many else few.GetLoadAddress()
     count = member(value, "length").GetValueAsUnsigned()
     return " ".join(vector(at(value, "p", start + i * kind.GetByteSize(), kind)) for i in range(count))
 
