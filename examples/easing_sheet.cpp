@@ -1,4 +1,4 @@
-// All easing curves on one sheet, as an SVG picture: the way from 0 to 1 in the bright square, and
+// All easing curves on one sheet, as an SVG picture: the way from 0 to 1 in the inner square, and
 // what they do before and beyond it.
 //
 //     easing_sheet > easing_sheet.svg

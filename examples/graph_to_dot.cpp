@@ -6,21 +6,26 @@
 #include <Engine/Base/patch.h>
 
 #include <iostream>
+#include <string>
+#include <unordered_map>
+#include <vector>
 
 using namespace tarn::engine;
 
 namespace {
 
-// Within the braces and bars of a record label.
+// As a field of a record label. Graphviz knows entities, and gives some characters a meaning.
 std::string label(std::string const& text) {
     std::string result;
     for (char const c : text) {
-        if (c == '\n') {
-            result += "\\n";
-            continue;
+        if (c == '&') {
+            result += "&amp;";
+        } else if (static_cast<unsigned char>(c) < 0x20) {
+            result += "\\ ";
+        } else {
+            if (std::string("\\\"{}|<> ").find(c) != std::string::npos) result += '\\';
+            result += c;
         }
-        if (std::string("\\\"{}|<> ").find(c) != std::string::npos) result += '\\';
-        result += c;
     }
     return result;
 }
@@ -34,25 +39,27 @@ std::string fields(std::vector<Port> const& ports) {
     return text;
 }
 
-void writePatch(std::ostream& stream, Patch const& patch) {
-    stream << "  " << patch.id << " [label=\"{{" << fields(*patch.inputs) << "}|"
-           << label(patch.name) << "|{" << fields(*patch.outputs) << "}}\"];\n";
-    if (patch.children->empty()) return;
-    stream << "  subgraph \"cluster " << patch.id << "\" {\n";
-    for (Patch const& child : *patch.children) writePatch(stream, child);
-    for (Connection const& c : *patch.connections) {
-        stream << "  " << c.fromPatchId << ":" << c.fromPortId << ":s -> " << c.toPatchId << ":"
-               << c.toPortId << ":n;\n";
+// Nodes are named by their place, "1/2/3": identifiers may repeat in a graph that nobody checked.
+void writePatch(std::ostream& stream, Patch const& patch, std::string const& place) {
+    bool const isGroup = !patch.children->empty();
+    if (isGroup) stream << "subgraph \"cluster " << place << "\" {\n";
+    stream << "\"" << place << "\" [label=\"{{" << fields(*patch.inputs) << "}|"
+           << label(patch.name) << "|{" << fields(*patch.outputs) << "}}\""
+           << (isGroup ? ", style=bold];\n" : "];\n");
+    std::unordered_map<unsigned long long, std::string> places;
+    for (std::size_t i = 0; i < patch.children->size(); ++i) {
+        Patch const& child = (*patch.children)[i];
+        places.emplace(child.id, place + "/" + std::to_string(i + 1));
+        writePatch(stream, child, place + "/" + std::to_string(i + 1));
     }
-    stream << "  }\n";
-}
-
-Port port(unsigned long long id, char const* name, Type type) {
-    Port made;
-    made.id = id;
-    made.name = name;
-    made.typeInfo.type = type;
-    return made;
+    for (Connection const& c : *patch.connections) {
+        auto const from = places.find(c.fromPatchId);
+        auto const to = places.find(c.toPatchId);
+        if (from == places.end() || to == places.end()) continue;  // It leads nowhere.
+        stream << "\"" << from->second << "\":" << c.fromPortId << ":s -> \"" << to->second
+               << "\":" << c.toPortId << ":n;\n";
+    }
+    if (isGroup) stream << "}\n";
 }
 
 template <class T>
@@ -64,23 +71,27 @@ Array<T> listOf(std::vector<T> elements) {
 
 int main() {
     Patch clock;
-    clock.id = 2;
-    clock.name = "clock";
-    clock.outputs = listOf<Port>({port(21, "seconds", Type::Float)});
+    clock.id = 3;
+    clock.name = "clock & calendar";
+
+    Patch time;
+    time.id = 2;
+    time.name = "time";
+    time.outputs = listOf<Port>({{21, 1, "seconds", {}, {}, {}}});
+    time.children = listOf<Patch>({clock});
 
     Patch ring;
-    ring.id = 3;
+    ring.id = 4;
     ring.name = "ring <round>";
-    ring.inputs = listOf<Port>({port(31, "center", Type::Vec2), port(32, "radius", Type::Float)});
-    ring.outputs = listOf<Port>({port(33, "path", Type::Path)});
+    ring.inputs = listOf<Port>({{41, 1, "radius", {}, {}, {}}});
 
     Patch root;
     root.id = 1;
     root.name = "pulsing ring";
-    root.children = listOf<Patch>({clock, ring});
-    root.connections = listOf<Connection>({{2, 21, 3, 32}});
+    root.children = listOf<Patch>({time, ring});
+    root.connections = listOf<Connection>({{2, 21, 4, 41}});
 
-    std::cout << "digraph {\n  node [shape=record];\n";
-    writePatch(std::cout, root);
+    std::cout << "digraph {\nnode [shape=record];\n";
+    writePatch(std::cout, root, "1");
     std::cout << "}\n";
 }

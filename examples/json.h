@@ -46,7 +46,8 @@ inline tarn::engine::Unstructured toUnstructured(Json const& json) {
 }
 
 // Nothing is copied on the way but what JSON keeps. JSON has no NaN and no infinity: they are
-// written as null. Recurses over the levels.
+// written as null. Texts of data are any bytes: `dump` throws at those that are no UTF-8, unless it
+// is told to write something else (`Json::error_handler_t::replace`). Recurses over the levels.
 inline Json toJson(tarn::engine::Unstructured const& data) {
     using tarn::engine::Unstructured;
     switch (data.type()) {

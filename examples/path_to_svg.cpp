@@ -11,8 +11,8 @@ using namespace tarn::engine;
 
 namespace {
 
-// A line from every point to the control points that belong to it, as path data, and the dots of
-// both.
+// A line from every point to the control points that belong to it, and the dots of both. For
+// elements with all of their points, as a builder makes them.
 struct Handles {
     PathBuilder lines;
     std::vector<FloatVec2> points;
@@ -21,18 +21,25 @@ struct Handles {
 
 Handles handlesOf(Path const& path) {
     Handles handles;
-    FloatVec2 current{0.0, 0.0};
+    FloatVec2 start{0.0, 0.0};  // Of the outline; in a picture, `close` goes back there.
+    FloatVec2 current = start;
     for (PathElement const& element : path.elements) {
         Points const& p = element.points;
-        if (p.empty()) continue;
-        if (element.instruction == PathInstruction::curveTo && p.size() == 3) {
-            handles.lines.moveTo(current).lineTo(p[0]).moveTo(p[2]).lineTo(p[1]);
-            handles.controls.insert(handles.controls.end(), {p[0], p[1]});
-        } else if (element.instruction == PathInstruction::quadCurveTo && p.size() == 2) {
-            handles.lines.moveTo(current).lineTo(p[0]).lineTo(p[1]);
-            handles.controls.push_back(p[0]);
+        switch (element.instruction) {
+            case PathInstruction::moveTo: start = current = p.at(0); break;
+            case PathInstruction::lineTo: current = p.at(0); break;
+            case PathInstruction::curveTo:
+                handles.lines.moveTo(current).lineTo(p.at(0)).moveTo(p.at(2)).lineTo(p.at(1));
+                handles.controls.insert(handles.controls.end(), {p[0], p[1]});
+                current = p[2];
+                break;
+            case PathInstruction::quadCurveTo:
+                handles.lines.moveTo(current).lineTo(p.at(0)).lineTo(p.at(1));
+                handles.controls.push_back(p[0]);
+                current = p[1];
+                break;
+            case PathInstruction::close: current = start; continue;
         }
-        current = p.back();
         handles.points.push_back(current);
     }
     return handles;

@@ -11,16 +11,19 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdio>
 #include <string>
 
 namespace svg {
 
-// As the library writes numbers, two decimals at most. SVG has no NaN and viewers calculate in
-// single precision: what is not a number is 0, and what is too large is cut.
+// Six digits, which is what viewers calculate with. SVG has no NaN and no infinity: what is not a
+// number is 0, and what is too large is cut.
 inline std::string number(double value) {
-    constexpr double kLargest = 1e7;
-    if (std::isnan(value)) return "0";
-    return to_string(tarn::engine::Value(std::clamp(value, -kLargest, kLargest)));
+    constexpr double kLargest = 1e9;
+    char text[32];
+    double const shown = std::isnan(value) ? 0.0 : std::clamp(value, -kLargest, kLargest);
+    std::snprintf(text, sizeof text, "%.6g", shown);
+    return text;
 }
 
 inline std::string point(tarn::engine::FloatVec2 p) { return number(p.x) + " " + number(p.y); }
@@ -68,18 +71,24 @@ inline std::string curveData(tarn::engine::EasingFunction function, double size)
     return pathData(std::move(builder).build());
 }
 
-// The text as content or as an attribute in quotes, of SVG or HTML.
+// The text as content or as an attribute in quotes of either kind, of SVG or HTML. What may not
+// stand in XML is left out: control characters, and the two last of the first plane.
 inline std::string escaped(std::string const& text) {
     std::string result;
-    for (char const c : text) {
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        char const c = text[i];
+        if (text.compare(i, 3, "\xef\xbf\xbe") == 0 || text.compare(i, 3, "\xef\xbf\xbf") == 0) {
+            i += 2;
+            continue;
+        }
         switch (c) {
             case '&': result += "&amp;"; break;
             case '<': result += "&lt;"; break;
             case '>': result += "&gt;"; break;
             case '"': result += "&quot;"; break;
+            case '\'': result += "&#39;"; break;
             default:
-                // Control characters may not stand in XML.
-                result += static_cast<unsigned char>(c) < 0x20 && c != '\n' ? ' ' : c;
+                if (static_cast<unsigned char>(c) >= 0x20 || c == '\n') result += c;
         }
     }
     return result;

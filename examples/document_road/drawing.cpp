@@ -17,7 +17,7 @@ using svg::number;
 namespace {
 
 constexpr double kTextIndent = 14.0;
-constexpr std::size_t kLongestAttributes = 120;
+constexpr std::size_t kLongestAttribute = 200;
 
 // Where the port at this row of a box is; outputs come first.
 double rowMiddle(std::size_t row) {
@@ -30,28 +30,32 @@ struct Anchor {
     Type type;
 };
 
-std::string wire(Anchor const& from, Anchor const& to) {
+std::string wire(Connection const& connection, Anchor const& from, Anchor const& to) {
     double const bend = std::clamp(std::abs(to.x - from.x) / 2.0, 30.0, 160.0);
     Path const path = PathBuilder()
                           .moveTo({from.x, from.y})
                           .curveTo({from.x + bend, from.y}, {to.x - bend, to.y}, {to.x, to.y})
                           .build();
-    return "<path class=\"t-" + typeToString(from.type) + "\" d=\"" + svg::pathData(path) +
-           "\"/>\n";
+    return "<path class=\"t-" + typeToString(from.type) + "\" data-from=\"" +
+           std::to_string(connection.fromPortId) + "\" data-to=\"" +
+           std::to_string(connection.toPortId) + "\" d=\"" + svg::pathData(path) + "\"/>\n";
 }
 
 std::string counted(std::size_t count, std::string const& what) {
     return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
 }
 
-std::string attributesText(std::map<std::string, Unstructured> const& attributes) {
-    std::string text;
+void addAttributes(std::vector<std::string>& parts,
+                   std::map<std::string, Unstructured> const& attributes) {
     for (auto const& [key, value] : attributes) {
-        text += "; " + printable(key) + ": " +
-                shortened(toJson(value).dump(-1, ' ', false, Json::error_handler_t::replace),
-                          kLongestAttributes);
+        parts.push_back(printable(key) + ": " +
+                        shortened(jsonText(toJson(value)), kLongestAttribute));
     }
-    return text;
+}
+
+// As an attribute in quotes.
+std::string partsText(std::vector<std::string> const& parts) {
+    return escaped(jsonText(Json(parts)));
 }
 
 }  // namespace
@@ -68,6 +72,8 @@ void Bounds::add(Path const& path) {
         }
     }
 }
+
+double Bounds::size() const { return std::max(right - left, bottom - top); }
 
 Bounds Bounds::widened(double margin) const {
     return {left - margin, top - margin, right + margin, bottom + margin, isEmpty};
@@ -86,40 +92,39 @@ std::string Drawing::portName(unsigned long long patchId, unsigned long long por
     Patch const* const patch = index.findPatch(patchId);
     Port const* const output = index.findOutputPort(portId);
     Port const* const port = output != nullptr ? output : index.findInputPort(portId);
-    std::string text = patch != nullptr ? headingOf(*patch) : std::to_string(patchId);
+    std::string text = patch != nullptr ? nameOf(*patch) : std::to_string(patchId);
     if (port != nullptr && !port->name.empty()) text += " " + printable(port->name);
     return text;
 }
 
-std::string Drawing::portLabel(Port const& port, bool isInput) const {
-    std::ostringstream text;
-    text << (isInput ? "input " : "output ") << printable(port.name) << "; " << portTypeText(port)
-         << "; port " << port.id << ", tag " << port.tag;
+std::vector<std::string> Drawing::describe(Port const& port, bool isInput) const {
+    std::vector<std::string> parts{
+        (isInput ? "input " : "output ") + printable(port.name), portTypeText(port),
+        "port " + std::to_string(port.id) + ", tag " + std::to_string(port.tag)};
     if (isInput) {
         Connection const* const incoming = index.incomingConnection(port.id);
         if (incoming != nullptr) {
-            text << "; from " << portName(incoming->fromPatchId, incoming->fromPortId);
-        }
-    } else {
-        char const* before = "; to ";
-        for (Connection const& outgoing : index.outgoingConnections(port.id)) {
-            text << before << portName(outgoing.toPatchId, outgoing.toPortId);
-            before = ", ";
+            parts.push_back("from " + portName(incoming->fromPatchId, incoming->fromPortId));
         }
     }
-    text << attributesText(port.attributes);
-    return text.str();
+    for (Connection const& outgoing : index.outgoingConnections(port.id)) {
+        parts.push_back("to " + portName(outgoing.toPatchId, outgoing.toPortId));
+    }
+    addAttributes(parts, port.attributes);
+    return parts;
 }
 
-std::string Drawing::patchLabel(Patch const& patch) const {
-    std::ostringstream text;
-    text << headingOf(patch) << "; patch " << patch.id << ", " << kindName(patch);
-    if (!patch.descriptor.empty()) text << " (" << printable(patch.descriptor) << ")";
-    text << "; " << counted(patch.inputs->size(), "input") << ", "
-         << counted(patch.outputs->size(), "output");
-    if (!patch.children->empty()) text << "; a group of " << patch.children->size();
-    text << attributesText(patch.attributes);
-    return text.str();
+std::vector<std::string> Drawing::describe(Patch const& patch) const {
+    std::vector<std::string> parts{nameOf(patch)};
+    parts.push_back("patch " + std::to_string(patch.id) + ", " + kindName(patch));
+    if (!patch.descriptor.empty()) parts.push_back(printable(patch.descriptor));
+    parts.push_back(counted(patch.inputs->size(), "input") + ", " +
+                    counted(patch.outputs->size(), "output"));
+    if (!patch.children->empty()) {
+        parts.push_back("a group of " + std::to_string(patch.children->size()));
+    }
+    addAttributes(parts, patch.attributes);
+    return parts;
 }
 
 std::string Drawing::port(Port const& port, bool isInput, double width, double y) const {
@@ -128,10 +133,11 @@ std::string Drawing::port(Port const& port, bool isInput, double width, double y
     std::string const name = label.substr(0, label.size() - type.size());
     std::ostringstream text;
     text << "<g class=\"port t-" << typeToString(port.typeInfo.type)
-         << "\" role=\"img\" tabindex=\"-1\" aria-label=\"" << escaped(portLabel(port, isInput))
-         << "\"><rect class=\"row\" x=\"1\" y=\"" << number(y - kRowHeight / 2) << "\" width=\""
-         << number(width - 2) << "\" height=\"" << number(kRowHeight) << "\"/><circle cx=\""
-         << number(isInput ? 0 : width) << "\" cy=\"" << number(y) << "\" r=\"5\"/><text x=\""
+         << "\" role=\"img\" tabindex=\"-1\" data-port=\"" << port.id << "\" data-parts=\""
+         << partsText(describe(port, isInput)) << "\"><rect class=\"row\" x=\"1\" y=\""
+         << number(y - kRowHeight / 2) << "\" width=\"" << number(width - 2) << "\" height=\""
+         << number(kRowHeight) << "\"/><circle cx=\"" << number(isInput ? 0 : width) << "\" cy=\""
+         << number(y) << "\" r=\"5\"/><text x=\""
          << number(isInput ? kTextIndent : width - kTextIndent) << "\" y=\"" << number(y + 4)
          << "\"" << (isInput ? "" : " class=\"end\"") << ">" << escaped(name)
          << "<tspan class=\"type\">" << escaped(type) << "</tspan></text></g>\n";
@@ -145,7 +151,7 @@ std::string Drawing::box(Box const& box) const {
     text << "<g class=\"patch\" transform=\"translate(" << number(box.x) << " " << number(box.y)
          << ")\"><rect class=\"body\" width=\"" << number(box.width) << "\" height=\""
          << number(box.height) << "\" rx=\"6\"/>"
-         << "<g class=\"heading\" tabindex=\"-1\" aria-label=\"" << escaped(patchLabel(patch))
+         << "<g class=\"heading\" tabindex=\"-1\" data-parts=\"" << partsText(describe(patch))
          << "\"";
     if (isGroup) {
         text << " role=\"button\" aria-expanded=\"false\" data-level=\"level-" << patch.id << "\"";
@@ -189,7 +195,9 @@ std::string Drawing::graph(Level const& level, std::string const& attributes) co
     for (Connection const& connection : *level.group->connections) {
         auto const from = outputs.find(connection.fromPortId);
         auto const to = inputs.find(connection.toPortId);
-        if (from != outputs.end() && to != inputs.end()) text << wire(from->second, to->second);
+        if (from != outputs.end() && to != inputs.end()) {
+            text << wire(connection, from->second, to->second);
+        }
     }
     text << "</g>\n";
     for (Box const& drawn : level.boxes) text << box(drawn);
@@ -218,8 +226,8 @@ std::string pictureText(Document const& document, long long frame) {
     std::vector<Drawn> const drawn = scene.now();
     Bounds bounds;
     for (Drawn const& outline : drawn) bounds.add(outline.path);
-    bounds = bounds.widened(10.0);
-    Level const level = layOut(document.root).front();
+    bounds = bounds.widened(bounds.size() / 20.0);
+    Level const level = layOutOne(document.root);
 
     constexpr double kSceneHeight = 220.0;
     constexpr double kGap = 12.0;
@@ -228,7 +236,7 @@ std::string pictureText(Document const& document, long long frame) {
     std::ostringstream text;
     text << "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " << number(level.width) << " "
          << number(height) << "\" role=\"img\" aria-label=\"The graph of "
-         << escaped(headingOf(document.root)) << ", and what it draws in frame " << frame << "\">\n"
+         << escaped(nameOf(document.root)) << ", and what it draws in frame " << frame << "\">\n"
          << "<style>\n"
          << page_files::kGraphCss << "</style>\n"
          << "<rect class=\"paper\" width=\"" << number(level.width) << "\" height=\""

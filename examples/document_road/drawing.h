@@ -24,6 +24,8 @@ struct Bounds {
     bool isEmpty = true;
 
     void add(tarn::engine::Path const& path);
+    // The larger of width and height.
+    double size() const;
     // With a margin of `margin` on each side.
     Bounds widened(double margin) const;
 };
@@ -39,11 +41,13 @@ public:
     // opening tag.
     std::string graph(Level const& level, std::string const& attributes) const;
 
+    // What there is to say of a patch or port, in parts: the first is its name.
+    std::vector<std::string> describe(tarn::engine::Patch const& patch) const;
+    std::vector<std::string> describe(tarn::engine::Port const& port, bool isInput) const;
+
 private:
     std::string box(Box const& box) const;
     std::string port(tarn::engine::Port const& port, bool isInput, double width, double y) const;
-    std::string patchLabel(tarn::engine::Patch const& patch) const;
-    std::string portLabel(tarn::engine::Port const& port, bool isInput) const;
     std::string portName(unsigned long long patchId, unsigned long long portId) const;
 
     tarn::engine::PatchIndex index;

@@ -8,6 +8,18 @@
 
 using namespace tarn::engine;
 
+namespace {
+
+// A group's ports have bounds, as every port has.
+Loop castAll(Loop const& values, TypeInfo const& typeInfo) {
+    Loop result;
+    result.reserve(values.size());
+    for (Value const& value : values) result.push_back(castValueToType(value, typeInfo));
+    return result;
+}
+
+}  // namespace
+
 Evaluator::Evaluator(Document const& evaluatedDocument)
     : document(evaluatedDocument),
       evaluatedRoot(document.root),
@@ -77,12 +89,12 @@ void Evaluator::run(Level const& level, long long frame) const {
         if (patch.builtin == kGroupInputKind) {
             for (EvalPort& output : *patch.outputs) {
                 EvalPort const* const port = inPortForTag(*level.group, output.tag);
-                if (port != nullptr) output.values = port->values;
+                if (port != nullptr) output.values = castAll(port->values, port->typeInfo);
             }
         } else if (patch.builtin == kGroupOutputKind) {
             for (EvalPort const& input : *patch.inputs) {
                 for (EvalPort& port : *level.group->outputs) {
-                    if (port.tag == input.tag) port.values = input.values;
+                    if (port.tag == input.tag) port.values = castAll(input.values, port.typeInfo);
                 }
             }
         } else if (step.inside) {

@@ -206,6 +206,10 @@ void Field::refuseType(std::string const& wanted) const {
     refuse("expected " + wanted + ", found " + found);
 }
 
+std::string jsonText(Json const& json) {
+    return json.dump(-1, ' ', false, Json::error_handler_t::replace);
+}
+
 std::string printable(std::string const& text) {
     std::string result;
     for (char const c : text) {

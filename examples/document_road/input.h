@@ -73,6 +73,9 @@ private:
     std::string step;
 };
 
+// In one line. Bytes that are no UTF-8 become U+FFFD.
+std::string jsonText(Json const& json);
+
 // The text with what a terminal would act on, line ends included, written as escapes.
 std::string printable(std::string const& text);
 

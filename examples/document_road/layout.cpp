@@ -3,10 +3,15 @@
 #include "report.h"
 
 #include <algorithm>
+#include <chrono>
+#include <cmath>
+#include <csignal>
 #include <cstdio>
 #include <memory>
+#include <optional>
 #include <sstream>
 #include <stdexcept>
+#include <thread>
 #include <unordered_map>
 
 #include <spawn.h>
@@ -21,6 +26,9 @@ constexpr double kPixelsPerInch = 72.0;
 constexpr double kPadding = 14.0;
 constexpr double kMargin = 12.0;
 constexpr std::size_t kNarrowest = 12;
+constexpr auto kLongestWait = std::chrono::seconds(8);
+// From so many boxes on, a level is placed by a process of its own.
+constexpr std::size_t kMany = 200;
 
 struct CloseFile {
     void operator()(std::FILE* file) const { std::fclose(file); }
@@ -33,8 +41,24 @@ File temporaryFile() {
     return file;
 }
 
-// What `dot` answers to the text.
-std::string answerOfDot(std::string const& text) {
+// Waits until the process has ended; one that takes too long is ended. Whether it succeeded, or
+// nothing where it was ended.
+std::optional<bool> outcomeInTime(pid_t child) {
+    auto const start = std::chrono::steady_clock::now();
+    int status = 0;
+    while (waitpid(child, &status, WNOHANG) == 0) {
+        if (std::chrono::steady_clock::now() - start > kLongestWait) {
+            kill(child, SIGKILL);
+            waitpid(child, &status, 0);
+            return std::nullopt;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(2));
+    }
+    return WIFEXITED(status) && WEXITSTATUS(status) == 0;
+}
+
+// What `dot` answers to the text, or nothing where it takes too long.
+std::optional<std::string> answerOfDot(std::string const& text) {
     File const in = temporaryFile();
     File const out = temporaryFile();
     bool const written = std::fwrite(text.data(), 1, text.size(), in.get()) == text.size() &&
@@ -53,10 +77,9 @@ std::string answerOfDot(std::string const& text) {
     int const failed = posix_spawnp(&child, program, &actions, nullptr, arguments, environ);
     posix_spawn_file_actions_destroy(&actions);
     if (failed != 0) throw std::runtime_error("dot (Graphviz) cannot be run; is it installed?");
-    int status = 0;
-    if (waitpid(child, &status, 0) != child || !WIFEXITED(status) || WEXITSTATUS(status) != 0) {
-        throw std::runtime_error("dot (Graphviz) failed");
-    }
+    std::optional<bool> const succeeded = outcomeInTime(child);
+    if (!succeeded) return std::nullopt;
+    if (!*succeeded) throw std::runtime_error("dot (Graphviz) failed");
 
     std::rewind(out.get());
     std::string answer;
@@ -79,13 +102,17 @@ Box sizedBox(Patch const& patch) {
     return box;
 }
 
-void addLevels(Patch const& patch, std::vector<Level>& levels) {
-    Level level{&patch, 0.0, 0.0, {}};
+Level levelOf(Patch const& patch) {
+    Level level{&patch, 0.0, 0.0, {}, false};
     for (Patch const& child : *patch.children) {
         if (level.boxes.size() == kMostBoxes) break;
         level.boxes.push_back(sizedBox(child));
     }
-    levels.push_back(std::move(level));
+    return level;
+}
+
+void addLevels(Patch const& patch, std::vector<Level>& levels) {
+    levels.push_back(levelOf(patch));
     for (Patch const& child : *patch.children) {
         if (!child.children->empty()) addLevels(child, levels);
     }
@@ -94,7 +121,7 @@ void addLevels(Patch const& patch, std::vector<Level>& levels) {
 // Boxes are named by their position. Lines are not asked for: they are drawn from port to port.
 void writeDot(std::ostream& stream, Level const& level) {
     stream << "digraph {\n  graph [rankdir=LR, splines=false, nodesep=0.28, ranksep=0.7, "
-              "nslimit=2, nslimit1=2, mclimit=0.5];\n"
+              "nslimit=2, nslimit1=2, mclimit=0.5, maxiter=100];\n"
               "  node [shape=box, fixedsize=true, label=\"\"];\n";
     std::unordered_map<unsigned long long, std::size_t> positions;
     for (std::size_t i = 0; i < level.boxes.size(); ++i) {
@@ -137,6 +164,44 @@ void place(Level& level, std::istream& answer) {
     }
 }
 
+// About as wide as high.
+void placeInRows(Level& level) {
+    level.isInRows = true;
+    auto const inRow =
+        static_cast<std::size_t>(std::ceil(std::sqrt(static_cast<double>(level.boxes.size()))));
+    double x = kMargin;
+    double y = kMargin;
+    double rowHeight = 0.0;
+    for (std::size_t i = 0; i < level.boxes.size(); ++i) {
+        Box& box = level.boxes[i];
+        if (i > 0 && i % inRow == 0) {
+            x = kMargin;
+            y += rowHeight + 2 * kMargin;
+            rowHeight = 0.0;
+        }
+        box.x = x;
+        box.y = y;
+        x += box.width + 4 * kMargin;
+        rowHeight = std::max(rowHeight, box.height);
+        level.width = std::max(level.width, box.x + box.width + kMargin);
+        level.height = std::max(level.height, box.y + box.height + kMargin);
+    }
+}
+
+void placeAll(std::vector<Level*> const& levels) {
+    std::ostringstream text;
+    for (Level const* level : levels) writeDot(text, *level);
+    std::optional<std::string> const answer = answerOfDot(text.str());
+    std::istringstream lines(answer ? *answer : "");
+    for (Level* level : levels) {
+        if (answer) {
+            place(*level, lines);
+        } else {
+            placeInRows(*level);
+        }
+    }
+}
+
 }  // namespace
 
 std::size_t columnsOf(std::string const& text) {
@@ -165,9 +230,11 @@ std::string shortened(std::string const& text, std::size_t longest) {
     return result + "\u2026";
 }
 
-std::string headingOf(Patch const& patch) {
-    return shortened(printable(patch.name.empty() ? kindName(patch) : patch.name), kLongestLabel);
+std::string nameOf(Patch const& patch) {
+    return printable(patch.name.empty() ? kindName(patch) : patch.name);
 }
+
+std::string headingOf(Patch const& patch) { return shortened(nameOf(patch), kLongestLabel); }
 
 std::string labelOf(Port const& port) {
     std::string const type = portNameForTypeInfo(port.typeInfo, false);
@@ -175,12 +242,23 @@ std::string labelOf(Port const& port) {
     return shortened(printable(port.name), kLongestLabel - type.size() - 1) + " " + type;
 }
 
+Level layOutOne(Patch const& root) {
+    std::vector<Level> levels{levelOf(root)};
+    placeAll({&levels.front()});
+    return std::move(levels.front());
+}
+
 std::vector<Level> layOut(Patch const& root) {
     std::vector<Level> levels;
     addLevels(root, levels);
-    std::ostringstream text;
-    for (Level const& level : levels) writeDot(text, level);
-    std::istringstream answer(answerOfDot(text.str()));
-    for (Level& level : levels) place(level, answer);
+    std::vector<Level*> small;
+    for (Level& level : levels) {
+        if (level.boxes.size() < kMany) {
+            small.push_back(&level);
+        } else {
+            placeAll({&level});
+        }
+    }
+    placeAll(small);
     return levels;
 }

@@ -28,6 +28,8 @@ struct Level {
     double height = 0.0;
     // The children in order, up to `kMostBoxes`.
     std::vector<Box> boxes;
+    // Graphviz did not come to an end in time: the boxes are in rows, in the order of the document.
+    bool isInRows = false;
 };
 
 // More take too long to place, and nobody finds anything among them.
@@ -44,7 +46,8 @@ std::string shortened(std::string const& text, std::size_t longest);
 // How many columns a fixed-width face takes for it.
 std::size_t columnsOf(std::string const& text);
 
-// What a patch is called where it is drawn.
+// What a patch is called: its name, or else its kind; and where it is drawn, not longer than that.
+std::string nameOf(tarn::engine::Patch const& patch);
 std::string headingOf(tarn::engine::Patch const& patch);
 // "radius Number".
 std::string labelOf(tarn::engine::Port const& port);
@@ -52,5 +55,7 @@ std::string labelOf(tarn::engine::Port const& port);
 // A level for each patch with children, the root's first, in the order of the document; one, empty,
 // for a root without children. Throws a std::runtime_error where Graphviz is not there or fails.
 std::vector<Level> layOut(tarn::engine::Patch const& root);
+// The root's level alone.
+Level layOutOne(tarn::engine::Patch const& root);
 
 #endif

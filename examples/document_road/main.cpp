@@ -49,21 +49,39 @@ private:
     std::chrono::steady_clock::time_point last = std::chrono::steady_clock::now();
 };
 
-// Whole or not at all: a reader never finds half of it.
+// A file whole or not at all, so that a reader never finds half of it; anything else, such as a
+// pipe, is written to as it is.
 void writeFile(std::string const& name, std::string const& contents) {
-    std::string const unfinished = name + ".unfinished";
+    namespace fs = std::filesystem;
+    std::error_code error;
+    bool const isFile = !fs::exists(name, error) || fs::is_regular_file(name, error);
+    fs::path const file = isFile ? fs::weakly_canonical(name, error) : fs::path(name);
+    fs::path const written = isFile ? file.string() + ".unfinished" : file.string();
     bool done = false;
     {
-        std::ofstream stream(unfinished, std::ios::binary);
+        std::ofstream stream(written, std::ios::binary);
         stream << contents << std::flush;
         done = bool(stream);
     }
+    error.clear();
+    if (done && isFile) fs::rename(written, file, error);
+    if (done && !error) return;
+    if (isFile) fs::remove(written, error);
+    throw std::runtime_error(printable(name) + " cannot be written");
+}
+
+void refuseToReplace(std::string const& document, std::string const& written) {
     std::error_code error;
-    if (done) std::filesystem::rename(unfinished, name, error);
-    if (!done || error) {
-        std::filesystem::remove(unfinished, error);
-        throw std::runtime_error(printable(name) + " cannot be written");
+    if (std::filesystem::equivalent(document, written, error)) {
+        throw std::runtime_error(printable(written) + " is the document itself");
     }
+}
+
+// As a word of a shell.
+std::string quoted(std::string const& text) {
+    std::string result = "'";
+    for (char const c : text) result += c == '\'' ? std::string("'\\''") : std::string(1, c);
+    return result + "'";
 }
 
 }  // namespace
@@ -136,6 +154,7 @@ int main(int argc, char** argv) {
                                  [&](long long frame) { progress(frame); });
         }
         if (paths) output << "\n" << pathsText(document, frames, every);
+        for (std::string const& written : {picture, report}) refuseToReplace(file, written);
         if (!picture.empty()) {
             writeFile(picture, pictureText(document, std::max(frames - 1, 0LL)));
         }
@@ -144,8 +163,8 @@ int main(int argc, char** argv) {
             writeFile(report, pageText(document, fileName.string(), reportFrames));
             std::string const place = std::filesystem::absolute(report).string();
             output << "\nreport: " << printable(place)
-                   << "\nopen it in a browser, for example: xdg-open '" << printable(place)
-                   << "'\n";
+                   << "\nopen it in a browser, for example: xdg-open " << quoted(printable(place))
+                   << "\n";
         }
         std::cout << output.str() << std::flush;
         if (!std::cout) {

@@ -23,18 +23,29 @@ namespace {
 
 // Browsers nest elements no deeper than some hundred levels.
 constexpr int kDeepestTree = 64;
+// The frames of a page take about so many bytes at most.
+constexpr std::size_t kMostBytes = 32u << 20;
+constexpr std::size_t kBytesOfAPlace = 16;
+constexpr std::size_t kLongestText = 1000;
 
 // Texts that repeat from frame to frame are kept once.
 class Texts {
 public:
     std::size_t add(std::string const& text) {
         auto const [place, isNew] = places.emplace(text, list.size());
-        if (isNew) list.push_back(text);
+        if (isNew) {
+            list.push_back(text);
+            total += text.size();
+        }
         return place->second;
     }
+    std::string const& at(std::size_t place) const { return list[place]; }
+    // Of all of them.
+    std::size_t bytes() const { return total; }
     Json json() const { return list; }
 
 private:
+    std::size_t total = 0;
     std::vector<std::string> list;
     std::unordered_map<std::string, std::size_t> places;
 };
@@ -128,7 +139,6 @@ struct Film {
     Json frames = Json::array();
     Bounds bounds;
     std::vector<Drawn> first;
-    std::size_t mostOutlines = 0;
 };
 
 Film filmOf(Document const& document, long long frames) {
@@ -140,11 +150,14 @@ Film filmOf(Document const& document, long long frames) {
         film.plots.push_back({printable(output.name), output.port->typeInfo, {}, {}, {}, {}, 1});
     }
     double widest = 0.0;
+    std::size_t places = 0;
     for (long long frame = 0; frame < frames; ++frame) {
+        if (film.texts.bytes() + kBytesOfAPlace * places > kMostBytes) break;
         evaluator.evaluate(frame);
         for (std::size_t i = 0; i < outputs.size(); ++i) {
             addFrame(film.plots[i], outputs[i].port->values, frame);
-            film.plots[i].texts.push_back(film.texts.add(shownValues(outputs[i].port->values)));
+            film.plots[i].texts.push_back(
+                film.texts.add(shownValues(outputs[i].port->values, kLongestText)));
         }
         std::vector<Drawn> drawn = scene.now();
         Json items = Json::array();
@@ -161,10 +174,11 @@ Film filmOf(Document const& document, long long frames) {
             items.push_back(std::move(item));
         }
         film.frames.push_back(std::move(items));
-        film.mostOutlines = std::max(film.mostOutlines, drawn.size());
+        places += 3 * drawn.size() + outputs.size();
+        for (Plot const& plot : film.plots) places += plot.lines.size();
         if (frame == 0) film.first = std::move(drawn);
     }
-    film.bounds = film.bounds.widened(widest / 2.0 + 8.0);
+    film.bounds = film.bounds.widened(widest / 2.0 + film.bounds.size() / 20.0);
     return film;
 }
 
@@ -177,7 +191,9 @@ std::string lineData(std::vector<double> const& values, double least, double mos
             isDrawing = false;
             continue;
         }
-        double const y = most > least ? 100.0 - (values[i] - least) / (most - least) * 100.0 : 50.0;
+        // Halves, since the whole may be more than there is.
+        double const range = most / 2 - least / 2;
+        double const y = range > 0.0 ? 100.0 - (values[i] / 2 - least / 2) / range * 100.0 : 50.0;
         std::string const frame = std::to_string(i);
         if (!isDrawing) {
             data += "M" + frame + " " + number(y) + "h0";  // A line of one point is a dot.
@@ -234,12 +250,31 @@ std::string plotText(Plot const& plot, std::size_t position, long long frames,
     }
     text << "<path class=\"cursor\" d=\"M0 -3V103\"/></svg></div>\n";
     if (least <= most) {
-        text << "<p class=\"range\"><span>" << number(least) << " to " << number(most)
-             << "</span></p>\n";
+        text << "<p class=\"range\"><span>" << to_string(Value(least)) << " to "
+             << to_string(Value(most)) << "</span></p>\n";
     }
-    text << "<p class=\"now\"><span class=\"frame\">frame 0</span> <output>" << escaped(firstText)
-         << "</output></p></div>\n";
+    text << "<p class=\"now\" role=\"group\" tabindex=\"0\" aria-label=\"" << name
+         << ", the value\"><span class=\"frame\">frame 0</span> <span class=\"value\">"
+         << escaped(firstText) << "</span></p></div>\n";
     return text.str();
+}
+
+// The root is in no level: its ports are listed.
+std::string rootPortsText(Drawing const& drawing, Patch const& root) {
+    std::string items;
+    auto const add = [&](Port const& port, bool isInput) {
+        std::string line;
+        for (std::string const& part : drawing.describe(port, isInput)) {
+            line += (line.empty() ? "" : "; ") + part;
+        }
+        items += "<li>" + escaped(line) + "</li>\n";
+    };
+    for (Port const& input : *root.inputs) add(input, true);
+    for (Port const& output : *root.outputs) add(output, false);
+    if (items.empty()) return "";
+    return "<details><summary>The document's own ports, " +
+           std::to_string(root.inputs->size() + root.outputs->size()) +
+           "</summary><ul class=\"ports\">\n" + items + "</ul></details>\n";
 }
 
 std::string levelsText(Document const& document) {
@@ -251,7 +286,7 @@ std::string levelsText(Document const& document) {
     // A level's figure holds those of the groups in it: closing it closes them.
     std::function<void(Level const&, int)> const write = [&](Level const& level, int depth) {
         Patch const& group = *level.group;
-        std::string const name = escaped(headingOf(group));
+        std::string const name = escaped(nameOf(group));
         text << "<figure class=\"level\" id=\"level-" << group.id << "\""
              << (depth > 1 ? " hidden" : "") << ">\n<figcaption><span class=\"name\">" << name
              << "</span> <span class=\"type\">level " << depth << ", patch " << group.id << ", "
@@ -270,6 +305,11 @@ std::string levelsText(Document const& document) {
         if (level.boxes.size() < group.children->size()) {
             text << "<p>Shown are the first " << level.boxes.size() << ".</p>\n";
         }
+        if (level.isInRows) {
+            text << "<p>Graphviz takes too long for this level: its patches are in rows, in the "
+                    "order of the document.</p>\n";
+        }
+        if (depth == 1) text << rootPortsText(drawing, group);
         if (level.boxes.empty()) {
             text << "<p>There is nothing inside.</p>\n";
         } else {
@@ -374,10 +414,8 @@ void writeTree(std::ostream& stream, std::string const& name, Unstructured const
     Unstructured::Map const* const map = data.ifMap();
     Unstructured::Array const* const array = data.ifArray();
     if (map == nullptr && array == nullptr) {
-        Json const json = toJson(data);
         stream << "<li><span class=\"name\">" << escaped(printable(name)) << "</span> "
-               << escaped(printable(json.dump(-1, ' ', false, Json::error_handler_t::replace)))
-               << "</li>\n";
+               << escaped(jsonText(toJson(data))) << "</li>\n";
         return;
     }
     std::size_t const size = map != nullptr ? map->size() : array->size();
@@ -408,7 +446,7 @@ void writeAttributes(std::ostream& stream, std::string const& owner,
 std::string attributesText(Document const& document) {
     std::ostringstream text;
     std::function<void(Patch const&)> const write = [&](Patch const& patch) {
-        std::string const owner = headingOf(patch) + " (patch " + std::to_string(patch.id) + ")";
+        std::string const owner = nameOf(patch) + " (patch " + std::to_string(patch.id) + ")";
         writeAttributes(text, owner, patch.attributes);
         for (auto const& list : {patch.inputs, patch.outputs}) {
             for (Port const& port : *list) {
@@ -447,7 +485,7 @@ std::string dataText(Film const& film, Document const& document) {
                        {"texts", film.texts.json()},
                        {"frames", film.frames},
                        {"plots", plots}};
-    std::string const json = data.dump(-1, ' ', false, Json::error_handler_t::replace);
+    std::string const json = jsonText(data);
     // Nothing in it may look like the end of the element that it stands in.
     std::string text;
     for (char const c : json) text += c == '<' ? std::string("\\u003c") : std::string(1, c);
@@ -472,30 +510,36 @@ std::string filled(std::string const& page, std::map<std::string, std::string> c
 
 std::string pageText(Document const& document, std::string const& fileName, long long frames) {
     Film const film = filmOf(document, frames);
+    auto const shown = static_cast<long long>(film.frames.size());
     std::ostringstream plots;
     for (std::size_t i = 0; i < film.plots.size(); ++i) {
         Plot const& plot = film.plots[i];
-        std::string const first = film.texts.json().at(plot.texts.front());
-        plots << plotText(plot, i, frames, first);
+        plots << plotText(plot, i, shown, film.texts.at(plot.texts.front()));
     }
     if (film.plots.empty()) plots << "<p>The document has no outputs.</p>\n";
     std::string const name = escaped(printable(fileName));
-    return filled(page_files::kPageHtml, {{"TITLE", name},
-                                          {"NAME", escaped(headingOf(document.root))},
-                                          {"COUNTS", paragraphs(countsText(document))},
-                                          {"GRAPH_CSS", page_files::kGraphCss},
-                                          {"CSS", page_files::kPageCss},
-                                          {"SCRIPT", page_files::kPageJs},
-                                          {"DRAWN", film.bounds.isEmpty ? " hidden" : ""},
-                                          {"NOT_DRAWN", film.bounds.isEmpty ? "" : " hidden"},
-                                          {"VIEW", stageText(film)},
-                                          {"SCENE", scenePaths(film.first)},
-                                          {"LAST_FRAME", std::to_string(frames - 1)},
-                                          {"LEGEND", legendText(document)},
-                                          {"LEVELS", levelsText(document)},
-                                          {"PLOTS", plots.str()},
-                                          {"CURVES", curvesText()},
-                                          {"SHAPES", shapesText()},
-                                          {"ATTRIBUTES", attributesText(document)},
-                                          {"DATA", dataText(film, document)}});
+    return filled(
+        page_files::kPageHtml,
+        {{"TITLE", name},
+         {"NAME", escaped(nameOf(document.root))},
+         {"COUNTS", paragraphs(countsText(document))},
+         {"GRAPH_CSS", page_files::kGraphCss},
+         {"CSS", page_files::kPageCss},
+         {"SCRIPT", page_files::kPageJs},
+         {"DRAWN", film.bounds.isEmpty ? " hidden" : ""},
+         {"NOT_DRAWN", film.bounds.isEmpty ? "" : " hidden"},
+         {"VIEW", stageText(film)},
+         {"SCENE", scenePaths(film.first)},
+         {"LAST_FRAME", std::to_string(shown - 1)},
+         {"CUT_SHORT", shown == frames ? std::string()
+                                       : "<p>The page keeps the first " + std::to_string(shown) +
+                                             " of " + std::to_string(frames) +
+                                             " frames: more would be too large.</p>\n"},
+         {"LEGEND", legendText(document)},
+         {"LEVELS", levelsText(document)},
+         {"PLOTS", plots.str()},
+         {"CURVES", curvesText()},
+         {"SHAPES", shapesText()},
+         {"ATTRIBUTES", attributesText(document)},
+         {"DATA", dataText(film, document)}});
 }

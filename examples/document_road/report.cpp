@@ -14,7 +14,6 @@ namespace {
 
 // Wider lists of columns are no help to a reader.
 constexpr std::size_t kMostColumns = 12;
-constexpr std::size_t kWidestCell = 40;
 
 void forEachPatch(Patch const& root, std::function<void(Patch const&, std::size_t)> const& visit,
                   std::size_t level = 1) {
@@ -33,9 +32,9 @@ Patch const* parentOf(Patch const& root, Patch const& wanted) {
     return parent;
 }
 
-std::string cut(std::string text) {
-    if (text.size() <= kWidestCell) return text;
-    std::size_t end = kWidestCell - 3;
+std::string cut(std::string text, std::size_t longest = kWidestCell) {
+    if (text.size() <= longest) return text;
+    std::size_t end = longest - 3;
     while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xc0) == 0x80) --end;
     return text.substr(0, end) + "...";
 }
@@ -108,14 +107,14 @@ std::vector<ShownOutput> shownOutputs(Document const& document, EvalPatch const&
     return result;
 }
 
-std::string shownValues(Loop const& values) {
-    if (values.size() == 1) return cut(printable(to_string(values.front())));
+std::string shownValues(Loop const& values, std::size_t longest) {
+    if (values.size() == 1) return cut(printable(to_string(values.front())), longest);
     std::string text;
     for (Value const& value : values) {
         text += (text.empty() ? "[" : " | ") + printable(to_string(value));
-        if (text.size() > kWidestCell) break;
+        if (text.size() > longest) break;
     }
-    return cut(text + "]");
+    return cut(text + "]", longest);
 }
 
 std::string kindName(Patch const& patch) {

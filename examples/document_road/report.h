@@ -6,9 +6,13 @@
 #include "document.h"
 #include "evaluator.h"
 
+#include <cstddef>
 #include <functional>
 #include <string>
 #include <vector>
+
+// A column of a table takes no more bytes.
+constexpr std::size_t kWidestCell = 40;
 
 // An output whose values are shown.
 struct ShownOutput {
@@ -20,8 +24,9 @@ struct ShownOutput {
 std::vector<ShownOutput> shownOutputs(Document const& document,
                                       tarn::engine::EvalPatch const& root);
 
-// The value in one line; of a loop, all of them: "[1 | 2]". Long ones are cut.
-std::string shownValues(tarn::engine::Loop const& values);
+// The value in one line; of a loop, all of them: "[1 | 2]". Long ones are cut after `longest`
+// bytes.
+std::string shownValues(tarn::engine::Loop const& values, std::size_t longest = kWidestCell);
 
 // "oscillator".
 std::string kindName(tarn::engine::Patch const& patch);

@@ -8,11 +8,13 @@ let frame = 0;
 // The points of a path and what belongs to them, from the text of its `d`.
 function handlesOf(d) {
     let lines = "", points = "", controls = "";
-    let current = "0 0";
+    let start = "0 0";  // Of the outline: where a close goes back to.
+    let current = start;
     for (const [, letter, numbers] of d.matchAll(/([MLCQZ])([^MLCQZ]*)/g)) {
         const all = numbers.trim().split(/\s+/);
         const p = [];
         for (let i = 0; i + 1 < all.length; i += 2) p.push(all[i] + " " + all[i + 1]);
+        if (letter === "Z") current = start;
         if (p.length === 0) continue;
         const end = p[p.length - 1];
         if (letter === "C") lines += `M${current}L${p[0]}M${end}L${p[1]}`;
@@ -20,6 +22,7 @@ function handlesOf(d) {
         for (const control of p.slice(0, -1)) controls += `M${control}h0`;
         points += `M${end}h0`;
         current = end;
+        if (letter === "M") start = end;
     }
     return { handle: lines, control: controls, dot: points };
 }
@@ -75,7 +78,7 @@ function showPlot(chart, at) {
     chart.querySelector(".cursor").setAttribute("d", `M${at} -3V103`);
     const plot = chart.parentElement;
     plot.querySelector(".frame").textContent = `frame ${at}`;
-    plot.querySelector("output").textContent = plotText(chart, at);
+    plot.querySelector(".value").textContent = plotText(chart, at);
 }
 
 function showFrame(next) {
@@ -97,13 +100,12 @@ function setPlaying(on) {
     cancelAnimationFrame(playing);
     playing = 0;
     play.textContent = on ? "Pause" : "Play";
-    play.setAttribute("aria-pressed", String(on));
     if (!on) return;
     const startFrame = frame;
     const start = performance.now();
     const step = (now) => {
         const passed = Math.floor(Math.max(now - start, 0) / 1000 * data.framesPerSecond);
-        const next = (startFrame + passed) % (lastFrame + 1);
+        const next = (startFrame + Math.min(passed, Number.MAX_SAFE_INTEGER - startFrame)) % (lastFrame + 1);
         if (next !== frame) showFrame(next);
         playing = requestAnimationFrame(step);
     };
@@ -161,11 +163,16 @@ for (const chart of charts) {
 
 function showInfo(item) {
     const info = item.closest("figure").querySelector(":scope > .info");
-    info.replaceChildren(...item.getAttribute("aria-label").split("; ").map((line) => {
+    info.replaceChildren(...JSON.parse(item.dataset.parts).map((line) => {
         const paragraph = document.createElement("p");
         paragraph.textContent = line;
         return paragraph;
     }));
+    const graph = item.closest(".graph");
+    for (const wire of graph.querySelectorAll(".lit")) wire.classList.remove("lit");
+    const port = item.dataset.port;
+    if (port === undefined) return;
+    for (const wire of graph.querySelectorAll(`[data-from="${port}"], [data-to="${port}"]`)) wire.classList.add("lit");
 }
 
 function setOpen(heading, open) {
@@ -179,6 +186,7 @@ const toggle = (heading) => setOpen(heading, heading.getAttribute("aria-expanded
 // One stop of the tab key for each graph; the arrow keys go on from there.
 for (const graph of document.querySelectorAll(".graph")) {
     const items = [...graph.querySelectorAll("[tabindex]")];
+    for (const item of items) item.setAttribute("aria-label", JSON.parse(item.dataset.parts).join("; "));
     let current = items[0];
     showInfo(current);
     current.setAttribute("tabindex", "0");
