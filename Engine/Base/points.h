@@ -112,9 +112,7 @@ public:
 
     /// As of a vector: adding at the end takes constant time over many calls, and a failing
     /// allocation leaves this as it was.
-    void reserve(size_type wanted) {
-        if (wanted > room) moveTo(wanted);
-    }
+    void reserve(size_type wanted) { withRoomFor(wanted); }
     void shrink_to_fit() {
         if (isMany() && length < room) *this = Points(*this);
     }
@@ -130,8 +128,8 @@ public:
     }
     void pop_back() { --length; }
     void resize(size_type count, FloatVec2 point = FloatVec2()) {
-        reserve(count);
-        if (count > length) std::fill(data() + length, data() + count, point);
+        FloatVec2* const first = withRoomFor(count);
+        if (count > length) std::fill(first + length, first + count, point);
         length = static_cast<Count>(count);
     }
 
@@ -207,9 +205,14 @@ private:
                                    std::min<size_type>(2 * size_type(room), max_size()));
     }
     void append(FloatVec2 const* points, size_type count) {
-        reserve(length + count);
-        std::copy(points, points + count, data() + length);
+        std::copy(points, points + count, withRoomFor(length + count) + length);
         length += static_cast<Count>(count);
+    }
+    // Where the points are, then.
+    FloatVec2* withRoomFor(size_type wanted) {
+        if (wanted <= room) return data();
+        moveTo(wanted);
+        return held.many;
     }
     void moveTo(size_type newRoom) {
         if (newRoom > max_size()) throw std::length_error("Points");
