@@ -6,8 +6,13 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
+#include <functional>
+#include <iterator>
+#include <list>
 #include <stdexcept>
+#include <vector>
 
 using tarn::engine::FloatVec2;
 using tarn::engine::Points;
@@ -35,6 +40,24 @@ void expectSame(Points const& points, std::vector<FloatVec2> const& expected) {
         ASSERT_EQ(points.at(i), expected[i]);
     }
 }
+
+// The points of `counted` from a source that cannot be read twice, such as a stream.
+struct ReadOnce {
+    using iterator_category = std::input_iterator_tag;
+    using value_type = FloatVec2;
+    using difference_type = std::ptrdiff_t;
+    using pointer = FloatVec2 const*;
+    using reference = FloatVec2;
+
+    int position;
+
+    FloatVec2 operator*() const { return {static_cast<double>(position), position / 2.0}; }
+    ReadOnce& operator++() {
+        ++position;
+        return *this;
+    }
+    bool operator!=(ReadOnce const& other) const { return position != other.position; }
+};
 
 }  // namespace
 
@@ -103,6 +126,106 @@ TEST(Points, KeepRoomUntilTheyShrink) {
     EXPECT_EQ(points, (Points{{1, 2}, {3, 4}}));
 }
 
+TEST(Points, GrowGeometricallyHoweverTheyAreAppended) {
+    struct Row {
+        char const* label;
+        std::function<void(Points&)> append;
+    };
+    std::vector<FloatVec2> const two = counted(2);
+    Row const rows[] = {
+        {"push_back",
+         [](Points& points) {
+             points.push_back({1, 2});
+         }},
+        {"emplace_back", [](Points& points) { points.emplace_back(1.0, 2.0); }},
+        {"insert of one",
+         [](Points& points) {
+             points.insert(points.end(), FloatVec2{1, 2});
+         }},
+        {"insert of copies",
+         [](Points& points) {
+             points.insert(points.end(), 2, {1, 2});
+         }},
+        {"insert of a range",
+         [&](Points& points) { points.insert(points.end(), two.begin(), two.end()); }},
+        {"insert of a list",
+         [](Points& points) {
+             points.insert(points.end(), {{1, 2}, {3, 4}});
+         }},
+        {"emplace", [](Points& points) { points.emplace(points.end(), 1.0, 2.0); }},
+        {"resize", [](Points& points) { points.resize(points.size() + 1); }},
+    };
+    for (Row const& row : rows) {
+        SCOPED_TRACE(row.label);
+        Points points;
+        tests::AllocationCounter counter;
+        for (int i = 0; i < 1000; ++i) row.append(points);
+        EXPECT_LE(counter.count(), 10u);
+    }
+}
+
+TEST(Points, AreAssignedIntoTheRoomThereIs) {
+    struct Row {
+        char const* label;
+        std::function<void(Points&)> assign;
+        std::size_t size;
+    };
+    Points const few = counted(2);
+    Points const many = counted(10);
+    Row const rows[] = {
+        {"copy of few", [&](Points& points) { points = few; }, 2},
+        {"copy of many", [&](Points& points) { points = many; }, 10},
+        {"list",
+         [](Points& points) {
+             points = {{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}};
+         },
+         4},
+        {"assign a list",
+         [](Points& points) {
+             points.assign({{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}});
+         },
+         4},
+        {"assign equal points",
+         [](Points& points) {
+             points.assign(1, {0, 0});
+         },
+         1},
+        {"itself", [](Points& points) { points = *&points; }, 20},
+    };
+    for (Row const& row : rows) {
+        SCOPED_TRACE(row.label);
+        Points points = counted(20);
+        FloatVec2 const* const before = points.data();
+        tests::AllocationCounter counter;
+        row.assign(points);
+        EXPECT_EQ(counter.count(), 0u);
+        EXPECT_EQ(points.data(), before);
+        EXPECT_EQ(points.capacity(), 20u);
+        expectSame(points, counted(row.size));
+    }
+    Points points = counted(20);
+    points.assign(points.begin() + 5, points.end());
+    points.assign(points.begin(), points.begin() + 3);
+    EXPECT_EQ(points, (Points{{5, 2.5}, {6, 3}, {7, 3.5}}));
+    EXPECT_EQ(points.capacity(), 20u);
+}
+
+TEST(Points, AllocateOnceForARangeThatCanBeCounted) {
+    std::list<FloatVec2> const list(1000, {1, 2});
+    tests::AllocationCounter counter;
+    Points const points(list.begin(), list.end());
+    EXPECT_EQ(counter.count(), 1u);
+    EXPECT_EQ(points.capacity(), 1000u);
+}
+
+TEST(Points, GiveBackWhatARangeThatFailsHasTaken) {
+    tests::AllocationCounter counter;
+    EXPECT_EQ(tests::failEachAllocation([] { Points(ReadOnce{0}, ReadOnce{20}); },
+                                        [&] { EXPECT_EQ(counter.held(), 0u); }),
+              3u);
+    expectSame(Points(ReadOnce{0}, ReadOnce{20}), counted(20));
+}
+
 TEST(Points, GiveBothEndsToThoseWhoOnlyRead) {
     Points const few{{1, 2}, {3, 4}};
     Points const many{{1, 2}, {3, 4}, {5, 6}, {7, 8}};
@@ -145,9 +268,14 @@ TEST(Points, StayAsTheyWereWhenAllocationFails) {
     points = counted(3);
     EXPECT_EQ(tests::failEachAllocation([&] { points.reserve(100); }, untouched), 1u);
     EXPECT_EQ(points.capacity(), 100u);
+    points.shrink_to_fit();
     Points const more = counted(50);
     EXPECT_EQ(tests::failEachAllocation([&] { points = more; }, untouched), 1u);
     expectSame(points, counted(50));
+    points = counted(3);
+    points.shrink_to_fit();
+    EXPECT_EQ(tests::failEachAllocation([&] { points.assign(50, {9, 9}); }, untouched), 1u);
+    expectSame(points, std::vector<FloatVec2>(50, {9, 9}));
 }
 
 TEST(Points, DoWhatAVectorDoes) {

@@ -22,9 +22,10 @@
 
 namespace tarn::engine {
 
-/// A `std::vector<FloatVec2>` in its interface, its guarantees and its costs, but for two things:
-/// up to three points are held in place, without an allocation, and so a move invalidates iterators
-/// and takes longer for those. Made from a vector and convertible to one, at the cost of a copy.
+/// A `std::vector<FloatVec2>` in its interface, its guarantees and its costs, without an allocator.
+/// Up to three points are held in place, without an allocation, and so a move and a swap invalidate
+/// iterators. A range that is inserted or assigned is copied first, and so may be a part of the
+/// list. Made from a vector and convertible to one, at the cost of a copy.
 class Points {
 public:
     /// As those of a vector.
@@ -47,7 +48,11 @@ public:
     Points(std::initializer_list<FloatVec2> points) { append(points.begin(), points.size()); }
     Points(std::vector<FloatVec2> const& points) { append(points.data(), points.size()); }
     template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
-    Points(Iterator first, Iterator last) {
+    Points(Iterator first, Iterator last) : Points() {  // Whole by now: released on failure.
+        using Category = typename std::iterator_traits<Iterator>::iterator_category;
+        if constexpr (std::is_base_of_v<std::forward_iterator_tag, Category>) {
+            reserve(static_cast<size_type>(std::distance(first, last)));
+        }
         for (; first != last; ++first) push_back(*first);
     }
     Points(Points const& other) {
@@ -61,9 +66,9 @@ public:
     Points(Points&& other) noexcept { take(other); }
     ~Points() { release(); }
 
-    /// A failing allocation leaves this as it was.
+    /// Into the room that there is, when it is enough. A failing allocation leaves this as it was.
     Points& operator=(Points const& other) {
-        if (this != &other) *this = Points(other);
+        if (this != &other) replace(other.begin(), other.length);
         return *this;
     }
     Points& operator=(Points&& other) noexcept {
@@ -72,7 +77,10 @@ public:
         take(other);
         return *this;
     }
-    Points& operator=(std::initializer_list<FloatVec2> points) { return *this = Points(points); }
+    Points& operator=(std::initializer_list<FloatVec2> points) {
+        replace(points.begin(), points.size());
+        return *this;
+    }
 
     /// A copy.
     operator std::vector<FloatVec2>() const { return {begin(), end()}; }
@@ -118,7 +126,7 @@ public:
     }
     void clear() { length = 0; }
     void push_back(FloatVec2 point) {
-        if (length == room) moveTo(roomForMore());
+        if (length == room) moveTo(grownRoom(size_type(length) + 1));
         data()[length++] = point;
     }
     template <class... Coordinates>
@@ -128,12 +136,12 @@ public:
     }
     void pop_back() { --length; }
     void resize(size_type count, FloatVec2 point = FloatVec2()) {
-        FloatVec2* const first = withRoomFor(count);
+        FloatVec2* const first = withGrownRoomFor(count);
         if (count > length) std::fill(first + length, first + count, point);
         length = static_cast<Count>(count);
     }
 
-    /// Linear in what follows the place. What is inserted may be a part of this.
+    /// Linear in what is inserted and what follows the place.
     iterator insert(const_iterator position, FloatVec2 point) {
         return insert(position, &point, &point + 1);
     }
@@ -148,7 +156,7 @@ public:
     iterator insert(const_iterator position, Iterator first, Iterator last) {
         auto const index = static_cast<size_type>(position - begin());
         auto const before = static_cast<difference_type>(length);
-        Points const added(first, last);  // What is inserted may be a part of this.
+        Points const added(first, last);
         append(added.data(), added.length);
         std::rotate(begin() + index, begin() + before, end());
         return begin() + index;
@@ -163,12 +171,20 @@ public:
         length = static_cast<Count>(std::copy(last, cend(), to) - begin());
         return to;
     }
-    /// As the constructors.
-    void assign(size_type count, FloatVec2 point) { *this = Points(count, point); }
+    /// As assigning what the constructors make.
+    void assign(size_type count, FloatVec2 point) {
+        if (count > room) {
+            *this = Points(count, point);
+        } else {
+            std::fill_n(data(), count, point);
+            length = static_cast<Count>(count);
+        }
+    }
     void assign(std::initializer_list<FloatVec2> points) { *this = points; }
     template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
     void assign(Iterator first, Iterator last) {
-        *this = Points(first, last);
+        Points const points(first, last);
+        *this = points;
     }
     /// Constant time.
     void swap(Points& other) noexcept { std::swap(*this, other); }
@@ -199,14 +215,27 @@ private:
         if (i >= length) throw std::out_of_range("Points::at");
         return i;
     }
-    // Twice the room, or at least one more.
-    size_type roomForMore() const {
-        return std::max<size_type>(size_type(length) + 1,
-                                   std::min<size_type>(2 * size_type(room), max_size()));
-    }
     void append(FloatVec2 const* points, size_type count) {
-        std::copy(points, points + count, withRoomFor(length + count) + length);
+        std::copy(points, points + count, withGrownRoomFor(length + count) + length);
         length += static_cast<Count>(count);
+    }
+    void replace(FloatVec2 const* points, size_type count) {
+        if (count > room) {
+            Points larger;
+            larger.append(points, count);
+            *this = std::move(larger);
+        } else {
+            std::copy(points, points + count, data());
+            length = static_cast<Count>(count);
+        }
+    }
+    // Twice what there is, or all that is wanted if that is more.
+    size_type grownRoom(size_type wanted) const {
+        size_type const doubled = 2 * size_type(length);
+        return std::max(wanted, std::min(doubled, max_size()));
+    }
+    FloatVec2* withGrownRoomFor(size_type wanted) {
+        return withRoomFor(wanted <= room ? wanted : grownRoom(wanted));
     }
     // Where the points are, then.
     FloatVec2* withRoomFor(size_type wanted) {
