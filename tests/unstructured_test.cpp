@@ -308,6 +308,10 @@ TEST(Unstructured, ReadsAsAVector) {
              Row{"array", List{2.0}, {2, 0, 0, 0}},
              Row{"long array", List{1, 2, 3, 4, 5}, {1, 2, 3, 4}},
              Row{"array of no numbers", List{5u, "6", List{1}, {}}, {}},
+             Row{"array of maps", List{Map{{"X", 1}}, 2, Map{{"Y", 3}}, 4}, {0, 2, 0, 4}},
+             Row{"map of arrays",
+                 Map{{"X", List{1}}, {"Y", 2}, {"Z", List{3}}, {"W", 4}},
+                 {0, 2, 0, 4}},
              Row{"empty array", List{}, {}},
              Row{"double", 0.5, {0.5, 0.5, 0.5, 0.5}},
              Row{"integer", -3, {-3, -3, -3, -3}},
@@ -389,6 +393,14 @@ TEST(Unstructured, SurvivesFailingAllocations) {
                   [&] { EXPECT_EQ(target, source); }),
               8u);
     EXPECT_EQ(target, source);
+    Map map{{"a", 1}, {"b", "text"}};
+    EXPECT_EQ(tests::failEachAllocation([&] { target = std::move(map); },
+                                        [&] { EXPECT_EQ(map.size(), 2u); }),
+              1u);
+    List list{1, "text"};
+    EXPECT_EQ(tests::failEachAllocation([&] { target = std::move(list); },
+                                        [&] { EXPECT_EQ(list.size(), 2u); }),
+              1u);
 }
 
 namespace {

@@ -89,7 +89,7 @@ std::uint32_t Unstructured::height() const {
 bool Unstructured::isDeep() const { return height() > kDeepestRecursion; }
 
 template <class T>
-Unstructured::Storage Unstructured::made(T content) {
+Unstructured::Storage Unstructured::made(T&& content) {
     std::uint32_t levels = 0;
     for (auto const& element : content) levels = std::max(levels, elementOf(element).height());
     levels = std::max(levels, levels + 1);  // Stays at the largest there is.

@@ -38,6 +38,8 @@ using EnableIfDataSource = std::enable_if_t<
 /// fail and leaves null behind. No reading fails: what has no answer is zero, false or empty.
 /// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons
 /// of trees of more than 256 levels allocate a list of what is still to do; destruction never does.
+/// For that a tree counts its levels when it takes a map or an array over: from then on no element
+/// may be changed through a reference from before.
 ///
 /// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
 class Unstructured {
@@ -95,7 +97,8 @@ public:
         : storage(std::move(other.storage)) {
         other.forget();
     }
-    /// A failing allocation leaves this as it was; either side may be part of the other.
+    /// A failing allocation leaves this as it was. What is assigned may be a part of this; a whole
+    /// may be copied, but not moved, into a part of itself.
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured const& other);
     TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured&& other) noexcept;
     TARN_ENGINE_BASE_EXPORT_INLINE ~Unstructured() {
@@ -196,7 +199,7 @@ private:
     std::uint32_t height() const;
     bool isDeep() const;
     template <class T>
-    static Storage made(T content);
+    static Storage made(T&& content);
     template <class T>
     static Storage copied(Node<T> const& node);
     static void copyDeep(Unstructured const& from, Unstructured& to);
