@@ -11,6 +11,8 @@
 #include <algorithm>
 #include <climits>
 #include <cstdint>
+#include <ctime>
+#include <functional>
 #include <iterator>
 
 using namespace tarn::engine;
@@ -118,6 +120,69 @@ TEST(PatchIndex, TellsConnectionsOfOneHashApart) {
     ASSERT_EQ(expected.size(), 25u);
     expectView(index.outgoingConnections(22), &index.root(), expected);
     expectView(index.outgoingConnectionsFromPatch(2), &index.root(), expected);
+}
+
+namespace {
+
+// The identifier whose hash, but for a seed, is `hash`.
+unsigned long long unmixed(std::uint64_t hash) {
+    constexpr std::uint64_t kFactor = 0xd6e8feb86659fd93;
+    std::uint64_t inverse = kFactor;
+    for (int i = 0; i < 6; ++i) inverse *= 2 - kFactor * inverse;
+    for (int i = 0; i < 2; ++i) {
+        hash *= inverse;
+        hash ^= hash >> 32;
+    }
+    return hash;
+}
+
+// Seconds of the processor for the fastest of five builds.
+double secondsToIndex(Patch const& root) {
+    double fastest = 1e9;
+    for (int i = 0; i < 5; ++i) {
+        std::clock_t const start = std::clock();
+        PatchIndex const index(root);
+        fastest = std::min(fastest, static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC);
+    }
+    return fastest;
+}
+
+}  // namespace
+
+TEST(PatchIndex, IsNotSlowedByIdentifiersThatWereChosenForIt) {
+    constexpr unsigned long long kCount = 30000;
+    struct Row {
+        char const* label;
+        std::function<unsigned long long(unsigned long long)> idOf;
+        std::function<Connection(unsigned long long)> connectionOf;
+    };
+    auto const counted = [](unsigned long long i) { return i + 10; };
+    auto const plain = [](unsigned long long i) { return Connection{2, i, 3, i}; };
+    Row const rows[] = {
+        {"ports that come to one slot", [](unsigned long long i) { return unmixed(i + 1); }, plain},
+        {"connections of one hash", counted,
+         [](unsigned long long i) { return withHash(2, i, 3, 77); }},
+    };
+    auto const graph = [](auto const& idOf, auto const& connectionOf) {
+        std::vector<Port> ports;
+        std::vector<Connection> connections;
+        for (unsigned long long i = 0; i < kCount; ++i) {
+            ports.push_back(port(idOf(i)));
+            connections.push_back(connectionOf(i));
+        }
+        return patch(1, {withPorts(patch(2), {}, ports), patch(3)}, connections);
+    };
+    double const usual = secondsToIndex(graph(counted, plain));
+    for (Row const& row : rows) {
+        SCOPED_TRACE(row.label);
+        Patch const chosen = graph(row.idOf, row.connectionOf);
+        EXPECT_LT(secondsToIndex(chosen), 40 * usual + 0.01);
+        PatchIndex const index(chosen);
+        EXPECT_EQ(index.outgoingConnectionsFromPatch(2).size(), kCount);
+        for (unsigned long long i = 0; i < kCount; i += 100) {
+            ASSERT_EQ(index.findOutputPort(row.idOf(i)), &chosen.children->at(0).outputs->at(i));
+        }
+    }
 }
 
 TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {

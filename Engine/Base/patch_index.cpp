@@ -3,8 +3,12 @@
 #include <Engine/Base/prefetch.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <limits>
+#include <set>
+#include <stdexcept>
+#include <tuple>
 #include <unordered_map>
 #include <utility>
 #include <vector>
@@ -24,6 +28,18 @@ std::uint64_t mixed(std::uint64_t key) {
     return key;
 }
 
+// Different in every table, by where it is in memory: a document cannot choose its identifiers so
+// that all of them come to the same slot.
+struct SeededHash {
+    std::uint64_t seed = mixed(reinterpret_cast<std::uintptr_t>(this));
+    std::uint64_t operator()(std::uint64_t key) const { return mixed(key ^ seed); }
+};
+
+// Positions take 32 bits here, of which one pattern stands for none.
+void requireCountable(std::size_t count) {
+    if (count >= kNone) throw std::length_error("PatchIndex");
+}
+
 // Tables and documents are larger than caches: what is needed a few steps on is asked for early.
 constexpr std::size_t kAhead = 8;
 
@@ -34,6 +50,7 @@ class Table {
 public:
     // A quarter more slots than keys keeps the probes short, and one is always free.
     explicit Table(std::vector<Slot> const& filled) : slots(filled.size() + filled.size() / 4 + 1) {
+        requireCountable(slots.size());
         for (std::size_t i = 0; i < filled.size(); ++i) {
             if (i + kAhead < filled.size()) prefetch(filled[i + kAhead].key);
             Slot& slot = at(filled[i].key);
@@ -53,7 +70,7 @@ public:
 private:
     // The upper half of the hash, scaled to the number of slots.
     std::size_t startOf(std::uint64_t key) const {
-        return static_cast<std::size_t>((mixed(key) >> 32) * slots.size() >> 32);
+        return static_cast<std::size_t>((hash(key) >> 32) * slots.size() >> 32);
     }
     std::size_t positionOf(std::uint64_t key) const {
         std::size_t i = startOf(key);
@@ -62,6 +79,7 @@ private:
     }
 
     std::vector<Slot> slots;
+    SeededHash hash;
 };
 
 struct PatchSlot {
@@ -109,6 +127,7 @@ struct Graph {
             for (AnyPatch const& child : *found[parent].patch->children) {
                 found.push_back({&child, parent});
             }
+            requireCountable(found.size());
             for (auto i = static_cast<std::uint32_t>(found.size()); i > first; --i) {
                 if (!found[i - 1].patch->children->empty()) toEnter.push_back(i - 1);
             }
@@ -174,6 +193,7 @@ struct Place {
 // Appends the connections of the list, each once.
 void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
                 std::vector<Place>& places) {
+    requireCountable(list.size());
     constexpr std::size_t kFew = 16;
     struct Slot {
         std::uint64_t key = 0;
@@ -188,13 +208,17 @@ void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
         }
     }
     Table<Slot> const firstOfHash(slots);
-    std::unordered_map<std::size_t, std::unordered_set<Connection>> collisions;
+    auto const before = [](Connection const& a, Connection const& b) {
+        return std::tie(a.fromPatchId, a.fromPortId, a.toPatchId, a.toPortId) <
+               std::tie(b.fromPatchId, b.fromPortId, b.toPatchId, b.toPortId);
+    };
+    std::set<Connection, decltype(before)> others(before);
     for (std::uint32_t i = 0; i < list.size(); ++i) {
         bool isFirst = true;
         if (slots.empty()) {
             isFirst = std::find(list.begin(), list.begin() + i, list[i]) == list.begin() + i;
         } else if (std::uint32_t const first = firstOfHash.at(slots[i].key).position; first != i) {
-            isFirst = list[first] != list[i] && collisions[slots[i].key].insert(list[i]).second;
+            isFirst = list[first] != list[i] && others.insert(list[i]).second;
         }
         if (isFirst) places.push_back({&list[i], parent, i});
     }
@@ -223,6 +247,7 @@ struct PatchIndex::Tables {
             if (group == kNone) return;
             std::size_t const start = size;
             size += 1 + group;
+            requireCountable(size);
             group = static_cast<std::uint32_t>(start);
         };
         for (auto& record : graph.records) {
@@ -322,8 +347,8 @@ struct PatchIndex::Tables {
     Graph<Patch, Port> graph;
     std::vector<std::uint32_t> positions;
     // Both are empty but for graphs that use one identifier for ports of two kinds.
-    std::unordered_map<unsigned long long, std::uint32_t> innerOwners;
-    std::unordered_map<unsigned long long, std::uint32_t> incomingToOutputs;
+    std::unordered_map<unsigned long long, std::uint32_t, SeededHash> innerOwners;
+    std::unordered_map<unsigned long long, std::uint32_t, SeededHash> incomingToOutputs;
 };
 
 PatchIndex::PatchIndex(Patch root) : tables(std::make_shared<Tables const>(std::move(root))) {}

@@ -72,16 +72,18 @@ private:
 };
 
 /// Answers about a graph exactly as the walking queries of patch.h do, duplicate identifiers and
-/// identifier 0 included, in constant time and without an allocation. Building takes one pass over
-/// the patches, ports and connections.
+/// identifier 0 included, in constant time and without an allocation, whatever the identifiers are.
+/// (`findInputPort` and `findOutputPort` search the whole graph, where the walks know a patch and
+/// its children.) Building takes one pass over the patches, ports and connections.
 ///
 /// An index shares the lists of its root, which never change: it and its answers stay valid for its
 /// own life, whatever happens to the caller's record. Copies share the tables; queries may run on
 /// any number of threads. One that was moved from is only to be assigned to or destroyed.
 class PatchIndex {
 public:
-    /// At most 2^32 - 2 patches, and as many connections in a patch; the stack does not grow with
-    /// the depth.
+    /// Positions take 32 bits: a graph of more than a thousand million patches, ports or
+    /// connections, shared lists counted wherever they occur, may throw `std::length_error`. The
+    /// stack does not grow with the depth.
     TARN_ENGINE_BASE_EXPORT explicit PatchIndex(Patch root);
 
     /// The patch that the index was made of, in the place where its answers refer to it.
