@@ -21,7 +21,9 @@
 #include <string_view>
 #include <utility>
 
+#if __has_include(<langinfo.h>)
 #include <langinfo.h>
+#endif
 
 namespace tarn::engine {
 
@@ -235,8 +237,12 @@ std::string const& negativeZero() {
 
 // Whether the C library formats as everyone expects: to the nearest, ties to even, with a point.
 bool formatsPlainly() {
+#if __has_include(<langinfo.h>)
     char const* const radix = nl_langinfo(RADIXCHAR);
     return std::fegetround() == FE_TONEAREST && radix[0] == '.' && radix[1] == '\0';
+#else
+    return false;  // The standard library's own question may not be asked on two threads at once.
+#endif
 }
 
 // The number text of a double below 1000 without the C library: the mantissa times 100, shifted

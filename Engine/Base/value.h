@@ -268,10 +268,10 @@ public:
 
     /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
     /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
-    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero. A
-    /// string is the number that `strtod` reads from all of it, else 1, and 0 when it is empty;
-    /// its truth is not being empty. A double becomes an integer towards zero, kept in range, and
-    /// 0 for a NaN.
+    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
+    /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
+    /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
+    /// integer towards zero, kept in range, and 0 for a NaN.
     TARN_ENGINE_BASE_EXPORT operator long long() const;
     TARN_ENGINE_BASE_EXPORT_INLINE operator double() const {
         double const* number = boost::get<double>(&storage);
