@@ -31,25 +31,55 @@ RenderLayerHierarchy hierarchy(unsigned long long id,
 }  // namespace
 
 TEST(ModelLayer, EqualsDeeplyInOrder) {
-    ModelLayer const base{1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}};
+    ModelLayer const base{1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}, {6, {}, {}}}};
     struct Row {
         char const* what;
-        ModelLayer other;
+        void (*change)(ModelLayer&);
         bool equal;
     };
     for (Row const& row : {
-             Row{"same", {1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, true},
-             Row{"id", {9, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, false},
-             Row{"order", {1, {{3, {}, {}}, {2, {}, {}}}, {{4, {}, {}}}}, false},
-             Row{"fewer children", {1, {{2, {}, {}}}, {{4, {}, {}}}}, false},
-             Row{"grandchild", {1, {{2, {{5, {}, {}}}, {}}, {3, {}, {}}}, {{4, {}, {}}}}, false},
-             Row{"additional layer", {1, {{2, {}, {}}, {3, {}, {}}}, {{5, {}, {}}}}, false},
-             Row{"no additional layer", {1, {{2, {}, {}}, {3, {}, {}}}, {}}, false},
+             Row{"nothing", [](ModelLayer&) {}, true},
+             Row{"id", [](ModelLayer& layer) { layer.id = 9; }, false},
+             Row{"order of children",
+                 [](ModelLayer& layer) { std::swap(layer.children[0], layer.children[1]); }, false},
+             Row{"fewer children", [](ModelLayer& layer) { layer.children.pop_back(); }, false},
+             Row{"grandchild",
+                 [](ModelLayer& layer) {
+                     layer.children[0].children.push_back({5, {}, {}});
+                 },
+                 false},
+             Row{"additional layer", [](ModelLayer& layer) { layer.additionalLayers[0].id = 5; },
+                 false},
+             Row{"order of additional layers",
+                 [](ModelLayer& layer) {
+                     std::swap(layer.additionalLayers[0], layer.additionalLayers[1]);
+                 },
+                 false},
+             Row{"fewer additional layers",
+                 [](ModelLayer& layer) { layer.additionalLayers.pop_back(); }, false},
+             Row{"additional layer's child",
+                 [](ModelLayer& layer) {
+                     layer.additionalLayers[1].children.push_back({5, {}, {}});
+                 },
+                 false},
          }) {
         SCOPED_TRACE(row.what);
-        EXPECT_EQ(base == row.other, row.equal);
-        EXPECT_EQ(base != row.other, !row.equal);
+        ModelLayer other = base;
+        row.change(other);
+        EXPECT_EQ(base == other, row.equal);
+        EXPECT_EQ(other == base, row.equal);
+        EXPECT_EQ(base != other, !row.equal);
     }
+    EXPECT_EQ(base, (ModelLayer{1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}, {6, {}, {}}}}));
+}
+
+TEST(ModelLayer, CopiesAreIndependent) {
+    ModelLayer const original{1, {{2, {{3, {}, {}}}, {}}}, {{4, {}, {}}}};
+    ModelLayer copy = original;
+    copy.children[0].children[0].id = 9;
+    copy.additionalLayers[0].children.push_back({5, {}, {}});
+    EXPECT_EQ(original, (ModelLayer{1, {{2, {{3, {}, {}}}, {}}}, {{4, {}, {}}}}));
+    EXPECT_EQ(copy, (ModelLayer{1, {{2, {{9, {}, {}}}, {}}}, {{4, {{5, {}, {}}}, {}}}}));
 }
 
 TEST(ModelLayer, WritesItsTreeWithoutAdditionalLayers) {

@@ -94,7 +94,12 @@ TEST(Port, EqualsFieldByField) {
              Row{"id", [](Port& p) { p.id = 9; }, false},
              Row{"tag", [](Port& p) { p.tag = 9; }, false},
              Row{"name", [](Port& p) { p.name = "other"; }, false},
-             Row{"type info", [](Port& p) { p.typeInfo.subtype = 1; }, false},
+             Row{"type", [](Port& p) { p.typeInfo.type = Type::Int; }, false},
+             Row{"subtype", [](Port& p) { p.typeInfo.subtype = 1; }, false},
+             Row{"lower bound", [](Port& p) { p.typeInfo.min = Value(0.5); }, false},
+             Row{"no lower bound", [](Port& p) { p.typeInfo.min = {}; }, false},
+             Row{"upper bound", [](Port& p) { p.typeInfo.max = Value(1.0); }, false},
+             Row{"extra", [](Port& p) { p.typeInfo.extra = Value("mm"); }, false},
              Row{"default value", [](Port& p) { p.defaultValue = 2; }, false},
              Row{"attribute's value", [](Port& p) { p.attributes["a"] = 2; }, false},
              Row{"attribute's key",
@@ -156,6 +161,11 @@ TEST(Connection, EqualsAndHashesByAllFields) {
 }
 
 TEST(Patch, EqualsFieldByField) {
+    auto const withAttributes = [] {
+        Patch p = document();
+        p.attributes = {{"a", 1}, {"b", "two"}};
+        return p;
+    };
     struct Row {
         char const* what;
         void (*change)(Patch&);
@@ -176,7 +186,28 @@ TEST(Patch, EqualsFieldByField) {
                      p.connections = listOf<Connection>({{2, 21, 2, 12}, {2, 21, 3, 31}});
                  },
                  false},
-             Row{"attributes", [](Patch& p) { p.attributes["a"] = 1; }, false},
+             Row{"other end of a connection",
+                 [](Patch& p) {
+                     p.connections = listOf<Connection>({{2, 21, 3, 31}, {2, 21, 9, 12}});
+                 },
+                 false},
+             Row{"other start of a connection",
+                 [](Patch& p) {
+                     p.connections = listOf<Connection>({{9, 21, 3, 31}, {2, 21, 2, 12}});
+                 },
+                 false},
+             Row{"other ports of a connection",
+                 [](Patch& p) {
+                     p.connections = listOf<Connection>({{2, 21, 3, 32}, {2, 22, 2, 12}});
+                 },
+                 false},
+             Row{"another attribute", [](Patch& p) { p.attributes["c"] = 1; }, false},
+             Row{"attribute's value", [](Patch& p) { p.attributes["a"] = 2; }, false},
+             Row{"attribute's key",
+                 [](Patch& p) {
+                     p.attributes = {{"A", 1}, {"b", "two"}};
+                 },
+                 false},
              Row{"fewer children", [](Patch& p) { p.children = listOf<Patch>({}); }, false},
              Row{"grandchild's port",
                  [](Patch& p) {
@@ -203,8 +234,8 @@ TEST(Patch, EqualsFieldByField) {
                  false},
          }) {
         SCOPED_TRACE(row.what);
-        Patch const base = document();
-        Patch other = document();
+        Patch const base = withAttributes();
+        Patch other = withAttributes();
         row.change(other);
         EXPECT_EQ(base == other, row.equal);
         EXPECT_EQ(other == base, row.equal);
@@ -329,6 +360,9 @@ TEST(EvalPort, EqualsFieldByField) {
 TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
     Patch source = document();
     source.modelLayer = {3, {{4, {}, {}}}, {{5, {}, {}}}};
+    Patch child = source.children->at(1);
+    child.modelLayer = {6, {{7, {}, {}}}, {{8, {}, {}}}};
+    source.children = listOf<Patch>({source.children->at(0), child});
     for (EvalPatch const& evaluated : {EvalPatch(source), toEvalPatch(source)}) {
         EXPECT_EQ(evaluated.id, 1u);
         EXPECT_EQ(evaluated.builtin, 77u);
@@ -347,6 +381,7 @@ TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
         ASSERT_NE(middle.children->at(1).children, nullptr);
         EXPECT_TRUE(middle.children->at(1).children->empty());
         EXPECT_EQ(evaluated.children->at(1).id, 3u);
+        EXPECT_EQ(evaluated.children->at(1).modelLayer, child.modelLayer);
     }
 }
 
@@ -368,6 +403,10 @@ TEST(EvalPatch, RecordsWhetherPortsAreCounted) {
         source.attributes = row.attributes;
         EXPECT_EQ(EvalPatch(source).hasInputCount, row.in);
         EXPECT_EQ(EvalPatch(source).hasOutputCount, row.out);
+        EvalPatch const parent(patch(1, {source}));
+        EXPECT_EQ(parent.children->at(0).hasInputCount, row.in);
+        EXPECT_EQ(parent.children->at(0).hasOutputCount, row.out);
+        EXPECT_FALSE(parent.hasInputCount || parent.hasOutputCount);
     }
 }
 
@@ -548,6 +587,8 @@ TEST(PortForTag, IsTheFirstOfThePatchsOwn) {
     EXPECT_EQ(inPortForTag(evaluated, 3), nullptr);
     EXPECT_EQ(outPortForTag(evaluated, 3), &evaluated.outputs->at(1));
     EXPECT_EQ(outPortForTag(evaluated, 2), nullptr);
+    EXPECT_EQ(inPortForTag(evaluated, 5), nullptr);
+    EXPECT_EQ(outPortForTag(evaluated, 6), nullptr);
 }
 
 TEST(GraphText, OfPortsAndConnections) {

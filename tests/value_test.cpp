@@ -53,6 +53,33 @@ Value movedFrom(Value value) {
     return value;  // NOLINT(bugprone-use-after-move): what is left is what is tested.
 }
 
+// One of each, not zero, and data of two kinds.
+std::vector<Value> everyAlternative() {
+    return {7,
+            2.5,
+            FloatVec2{1, 2},
+            FloatVec3{1, 2, 3},
+            FloatVec4{1, 2, 3, 4},
+            countingMatrix(),
+            true,
+            Value::Image(11),
+            Value::Video(12),
+            Value::Sound(13),
+            Value::Model(14),
+            linePath(),
+            smallMap(),
+            Unstructured("s"),
+            "15"};
+}
+
+// Where the content is, for those that share it.
+void const* payload(Value const& value) {
+    if (void const* path = value.ifPath()) return path;
+    if (void const* text = value.ifString()) return text;
+    if (void const* data = value.ifUnstructured()) return data;
+    return value.asFloatMat4();
+}
+
 Value nullPath() { return Value(std::shared_ptr<Path const>()); }
 Value nullMatrix() { return movedFrom(countingMatrix()); }
 Value nullString() { return movedFrom("text"); }
@@ -459,6 +486,8 @@ TEST(Value, ReadsAStringAsTheNumberThatAllOfItIs) {
              Row{"trailing letter", "12x", 1.0, 1},
              Row{"exponent", "1e3", 1000.0, 1000},
              Row{"cut exponent", "1e", 1.0, 1},
+             Row{"more digits than a double has", "9007199254740993", 9007199254740992.0,
+                 9007199254740992},
              Row{"hexadecimal", "0x1p4", 16.0, 16},
              Row{"plus", "+5", 5.0, 5},
              Row{"sign alone", "-", 1.0, 1},
@@ -551,7 +580,9 @@ TEST(Value, ReadsAsEveryVector) {
 TEST(Value, ReadsAsAMatrix) {
     EXPECT_TRUE(sameBytes(FloatMat4(Value(countingMatrix())), countingMatrix()));
     EXPECT_TRUE(sameBytes(FloatMat4(nullMatrix()), identityMatrix()));
-    for (Value const& value : {Value(1.0), Value("m"), Value(smallMap()), Value(linePath())}) {
+    for (Value const& value : everyAlternative()) {
+        if (value.type() == Type::Mat4) continue;
+        SCOPED_TRACE(to_string(value));
         EXPECT_TRUE(sameBytes(FloatMat4(value), identityMatrix()));
     }
 }
@@ -559,7 +590,9 @@ TEST(Value, ReadsAsAMatrix) {
 TEST(Value, ReadsAsAPath) {
     EXPECT_EQ(Path(Value(linePath())), linePath());
     EXPECT_EQ(Path(nullPath()), Path());
-    for (Value const& value : {Value(1.0), Value("p"), Value(smallMap()), Value::Image(4)}) {
+    for (Value const& value : everyAlternative()) {
+        if (value.type() == Type::Path) continue;
+        SCOPED_TRACE(to_string(value));
         EXPECT_EQ(Path(value), Path());
     }
 }
@@ -730,25 +763,10 @@ TEST(Value, ReadingsOfScalarsAndVectorsAllocateNothing) {
 }
 
 TEST(Value, BecomesAnyType) {
-    std::vector<Value> const values{7,
-                                    2.5,
-                                    FloatVec2{1, 2},
-                                    FloatVec3{1, 2, 3},
-                                    FloatVec4{1, 2, 3, 4},
-                                    countingMatrix(),
-                                    true,
-                                    Value::Image(11),
-                                    Value::Video(12),
-                                    Value::Sound(13),
-                                    Value::Model(14),
-                                    linePath(),
-                                    smallMap(),
-                                    Unstructured("s"),
-                                    "15",
-                                    nullPath(),
-                                    nullData(),
-                                    nullString(),
-                                    nullMatrix()};
+    std::vector<Value> values = everyAlternative();
+    for (Value const& value : {nullPath(), nullData(), nullString(), nullMatrix()}) {
+        values.push_back(value);
+    }
     for (Value const& value : values) {
         SCOPED_TRACE(to_string(value));
         struct Row {
@@ -788,6 +806,18 @@ TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
     EXPECT_NE(path.asType(Type::Path).ifPath(), path.ifPath());
     EXPECT_NE(data.asType(Type::Unstructured).ifUnstructured(), data.ifUnstructured());
     EXPECT_NE(text.asType(Type::String).ifString(), text.ifString());
+    for (Value const& value : everyAlternative()) {
+        SCOPED_TRACE(to_string(value));
+        for (Type const type : {Type::Mat4, Type::Path, Type::Unstructured, Type::String}) {
+            SCOPED_TRACE(typeToString(type));
+            Value const first = value.asType(type);
+            Value const second = value.asType(type);
+            EXPECT_NE(payload(first), nullptr);
+            EXPECT_NE(payload(first), payload(second));
+            EXPECT_NE(payload(first), payload(value));
+            EXPECT_NE(payload(first), Path::EmptyPath().get());
+        }
+    }
 }
 
 TEST(ValueDeathTest, BecomesNothingOutOfRange) {
@@ -825,6 +855,14 @@ TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
              Row{"vectors, NaN", FloatVec2{1, NAN}, FloatVec2{1, NAN}, false},
              Row{"vectors of 3", FloatVec3{1, 2, 3}, FloatVec3{1, 2, 4}, false},
              Row{"vectors of 4", FloatVec4{1, 2, 3, 4}, FloatVec4{1, 2, 3, 4}, true},
+             Row{"vectors, x", FloatVec2{1, 2}, FloatVec2{9, 2}, false},
+             Row{"vectors, y", FloatVec2{1, 2}, FloatVec2{1, 9}, false},
+             Row{"vectors of 3, x", FloatVec3{1, 2, 3}, FloatVec3{9, 2, 3}, false},
+             Row{"vectors of 3, y", FloatVec3{1, 2, 3}, FloatVec3{1, 9, 3}, false},
+             Row{"vectors of 4, x", FloatVec4{1, 2, 3, 4}, FloatVec4{9, 2, 3, 4}, false},
+             Row{"vectors of 4, y", FloatVec4{1, 2, 3, 4}, FloatVec4{1, 9, 3, 4}, false},
+             Row{"vectors of 4, z", FloatVec4{1, 2, 3, 4}, FloatVec4{1, 2, 9, 4}, false},
+             Row{"vectors of 4, w", FloatVec4{1, 2, 3, 4}, FloatVec4{1, 2, 3, 9}, false},
              Row{"vectors of two lengths", FloatVec2{1, 0}, FloatVec3{1, 0, 0}, false},
              Row{"matrices", countingMatrix(), countingMatrix(), true},
              Row{"matrices, zeros", zeroMatrix, negativeZeroMatrix, false},
@@ -837,8 +875,11 @@ TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
              Row{"other images", Value::Image(4), Value::Image(5), false},
              Row{"image and video", Value::Image(4), Value::Video(4), false},
              Row{"videos", Value::Video(4), Value::Video(4), true},
-             Row{"sounds", Value::Sound(4), Value::Sound(5), false},
+             Row{"other videos", Value::Video(4), Value::Video(5), false},
+             Row{"sounds", Value::Sound(4), Value::Sound(4), true},
+             Row{"other sounds", Value::Sound(4), Value::Sound(5), false},
              Row{"models", Value::Model(4), Value::Model(4), true},
+             Row{"other models", Value::Model(4), Value::Model(5), false},
              Row{"paths", linePath(), linePath(), true},
              Row{"other paths", linePath(), Path(), false},
              Row{"path with NaN", *nanPath, *nanPath, false},
@@ -1045,6 +1086,26 @@ TEST(TypeInfo, IsAFloatPortWithoutBoundsUnlessGiven) {
     EXPECT_EQ(*reinterpret_cast<unsigned char const*>(&all), 6);
     EXPECT_EQ(all.min.value(), Value(1));
     EXPECT_EQ(all.extra.value(), Value("x"));
+}
+
+TEST(TypeInfo, CopiesItsOptionalsAndReleasesTheLastFirst) {
+    std::string released;
+    auto const noted = [&released](char name) {
+        return Value(std::shared_ptr<Path const>(new Path(), [&released, name](Path const* path) {
+            released += name;
+            delete path;
+        }));
+    };
+    {
+        TypeInfo copy;
+        {
+            TypeInfo const info{Type::Path, 0, noted('i'), noted('a'), noted('e')};
+            copy = info;
+            EXPECT_EQ(copy.max.value().ifPath(), info.max.value().ifPath());
+        }
+        EXPECT_EQ(released, "");
+    }
+    EXPECT_EQ(released, "eai");
 }
 
 TEST(TypeInfo, EqualsFieldByField) {
