@@ -93,7 +93,7 @@ Unstructured::Storage Unstructured::made(T&& content) {
     std::uint32_t levels = 0;
     for (auto const& element : content) levels = std::max(levels, elementOf(element).height());
     levels = std::max(levels, levels + 1);  // Stays at the largest there is.
-    return new Node<T>{std::move(content), levels};
+    return new Node<T>{std::forward<T>(content), levels};
 }
 
 template <class T>
