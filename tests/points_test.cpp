@@ -11,6 +11,7 @@
 #include <functional>
 #include <iterator>
 #include <list>
+#include <new>
 #include <stdexcept>
 #include <vector>
 
@@ -107,7 +108,16 @@ TEST(Points, OfUpToThreeAllocateNothing) {
 
 TEST(Points, KeepRoomUntilTheyShrink) {
     EXPECT_EQ(Points().max_size(), 4294967295u);
-    EXPECT_THROW(Points().reserve(4294967296u), std::length_error);
+    {
+        tests::FailingAllocation failing(0);  // Asked for, but not to be had.
+        EXPECT_THROW(Points().reserve(4294967295u), std::bad_alloc);
+    }
+    try {
+        Points().reserve(4294967296u);
+        FAIL();
+    } catch (std::length_error const& error) {
+        EXPECT_STREQ(error.what(), "Points");
+    }
     Points points{{1, 2}, {3, 4}, {5, 6}, {7, 8}, {9, 10}};
     points.reserve(100);
     FloatVec2 const* const before = points.data();
@@ -172,9 +182,11 @@ TEST(Points, AreAssignedIntoTheRoomThereIs) {
     };
     Points const few = counted(2);
     Points const many = counted(10);
+    Points const full = counted(20);
     Row const rows[] = {
         {"copy of few", [&](Points& points) { points = few; }, 2},
         {"copy of many", [&](Points& points) { points = many; }, 10},
+        {"copy of as many as there is room for", [&](Points& points) { points = full; }, 20},
         {"list",
          [](Points& points) {
              points = {{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}};
@@ -191,6 +203,12 @@ TEST(Points, AreAssignedIntoTheRoomThereIs) {
          },
          1},
         {"itself", [](Points& points) { points = *&points; }, 20},
+        {"assign as many equal points as there is room for",
+         [&](Points& points) {
+             points.assign(20, {0, 0});
+             points = full;
+         },
+         20},
     };
     for (Row const& row : rows) {
         SCOPED_TRACE(row.label);
