@@ -300,8 +300,8 @@ TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
     Outcome const outcome = run(file + " --frames 1 --patch 5 --port 3");
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.errors, "");
-    EXPECT_EQ(outcome.output, "read a node graph: 5 patches in 3 levels, 3 ports, 1 connections\n"
-                              "ports: 1 Numbers, 1 Pulses, 1 Unstructured\n"
+    EXPECT_EQ(outcome.output, "read a node graph: 5 patches in 3 levels, 3 ports, 1 connection\n"
+                              "ports: 1 Number, 1 Pulse, 1 Unstructured\n"
                               "not implemented, inputs' defaults handed on: odd x\n"
                               "/links/2: link 2 left out: there is no output 1 of node 5\n"
                               "/links/3: link 3 left out: there is no input 2 of node -3\n"
@@ -339,7 +339,7 @@ TEST_F(DocumentRoad, ReadsTheDocumentThatItsFormIsExplainedWith) {
     Outcome const outcome = run(
         write("page.json", page.substr(start, page.find("```", start) - start)) + " --frames 1");
     EXPECT_EQ(outcome.errors, "");
-    EXPECT_EQ(outcome.output, "read a document: 3 patches in 2 levels, 4 ports, 1 connections\n"
+    EXPECT_EQ(outcome.output, "read a document: 3 patches in 2 levels, 4 ports, 1 connection\n"
                               "ports: 4 Numbers\n"
                               "\n"
                               "frame  radius\n0      0\n");
@@ -459,7 +459,7 @@ TEST_F(DocumentRoad, EvaluatesCirclesOfConnectionsWithTheFrameBefore) {
         R"([{"from":[2,23],"to":[2,21]}])");
     Outcome const outcome = run(write("circle.json", counter) + " --frames 4");
     EXPECT_EQ(outcome.errors, "");
-    EXPECT_EQ(outcome.output, "read a document: 2 patches in 2 levels, 4 ports, 1 connections\n"
+    EXPECT_EQ(outcome.output, "read a document: 2 patches in 2 levels, 4 ports, 1 connection\n"
                               "ports: 4 Numbers\n"
                               "\n"
                               "frame  2\n0      1\n1      2\n2      3\n3      4\n");

@@ -41,10 +41,6 @@ std::string wire(Connection const& connection, Anchor const& from, Anchor const&
            std::to_string(connection.toPortId) + "\" d=\"" + svg::pathData(path) + "\"/>\n";
 }
 
-std::string counted(std::size_t count, std::string const& what) {
-    return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
-}
-
 void addAttributes(std::vector<std::string>& parts,
                    std::map<std::string, Unstructured> const& attributes) {
     for (auto const& [key, value] : attributes) {
@@ -118,8 +114,8 @@ std::vector<std::string> Drawing::describe(Patch const& patch) const {
     std::vector<std::string> parts{nameOf(patch)};
     parts.push_back("patch " + std::to_string(patch.id) + ", " + kindName(patch));
     if (!patch.descriptor.empty()) parts.push_back(printable(patch.descriptor));
-    parts.push_back(counted(patch.inputs->size(), "input") + ", " +
-                    counted(patch.outputs->size(), "output"));
+    parts.push_back(counted(patch.inputs->size(), "input", "inputs") + ", " +
+                    counted(patch.outputs->size(), "output", "outputs"));
     if (!patch.children->empty()) {
         parts.push_back("a group of " + std::to_string(patch.children->size()));
     }

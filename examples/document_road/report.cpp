@@ -131,12 +131,16 @@ std::string portTypeText(Port const& port) {
     return text.str();
 }
 
+std::string counted(std::size_t count, std::string const& one, std::string const& more) {
+    return std::to_string(count) + " " + (count == 1 ? one : more);
+}
+
 std::string countsText(Document const& document) {
     std::size_t patches = 0;
     std::size_t levels = 0;
     std::size_t ports = 0;
     std::size_t connections = 0;
-    std::map<std::string, std::size_t> types;
+    std::map<std::string, std::vector<TypeInfo>> types;
     std::set<std::string> unknown;
     forEachPatch(document.root, [&](Patch const& patch, std::size_t level) {
         ++patches;
@@ -145,16 +149,20 @@ std::string countsText(Document const& document) {
         if (patch.builtin == kUnknownKind) unknown.insert(printable(patch.descriptor));
         for (auto const& list : {patch.inputs, patch.outputs}) {
             ports += list->size();
-            for (Port const& port : *list) ++types[portNameForTypeInfo(port.typeInfo, true)];
+            for (Port const& port : *list) {
+                types[portNameForTypeInfo(port.typeInfo, true)].push_back(port.typeInfo);
+            }
         }
     });
     std::ostringstream text;
-    text << "read " << document.form << ": " << patches << " patches in " << levels << " levels, "
-         << ports << " ports, " << connections << " connections\n";
+    text << "read " << document.form << ": " << counted(patches, "patch", "patches") << " in "
+         << counted(levels, "level", "levels") << ", " << counted(ports, "port", "ports") << ", "
+         << counted(connections, "connection", "connections") << "\n";
     if (!types.empty()) {
         text << "ports:";
-        for (auto const& [name, count] : types) {
-            text << (name == types.begin()->first ? " " : ", ") << count << " " << name;
+        for (auto const& [name, infos] : types) {
+            text << (name == types.begin()->first ? " " : ", ") << infos.size() << " "
+                 << portNameForTypeInfo(infos.front(), infos.size() > 1);
         }
         text << "\n";
     }

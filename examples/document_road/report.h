@@ -34,6 +34,9 @@ std::string kindName(tarn::engine::Patch const& patch);
 // "Number [type: float] from 0 to 1, default 0".
 std::string portTypeText(tarn::engine::Port const& port);
 
+// "1 input", "2 inputs".
+std::string counted(std::size_t count, std::string const& one, std::string const& more);
+
 // How many patches, ports and connections there are, and of which types; what was left out.
 std::string countsText(Document const& document);
 
