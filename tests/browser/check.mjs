@@ -133,6 +133,9 @@ const misplacedTexts = () => {
 };
 
 async function checkLooks(page, name, size, scheme) {
+    const paper = await page.evaluate(() => getComputedStyle(document.body).backgroundColor);
+    const brightest = Math.max(...paper.match(/\d+/g).map(Number));
+    checkEqual(brightest < 128 ? "dark" : "light", scheme, `${name} is on ${paper}`);
     const { found, count } = await page.evaluate(misplacedTexts);
     checkEqual(found, [], `${name}, ${size.width}, ${scheme}`);
     check(count > 50, "texts were looked at");
