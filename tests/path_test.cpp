@@ -355,6 +355,26 @@ TEST(PathShapes, RoundRectLimitsItsRadiusFromAbove) {
     }
 }
 
+TEST(PathShapes, RoundRectTakesTheLaterOfTwoZeros) {
+    struct Row {
+        char const* what;
+        FloatVec2 size;
+        double radius;
+        double used;
+    };
+    for (Row const& row : {
+             Row{"height and width", {-0.0, 0.0}, 9, -0.0},
+             Row{"width and height", {0.0, -0.0}, 9, 0.0},
+             Row{"radius and size", {0.0, 0.0}, -0.0, 0.0},
+             Row{"size and radius", {-0.0, -0.0}, 0.0, -0.0},
+         }) {
+        SCOPED_TRACE(row.what);
+        PathBuilder builder;
+        builder.roundRect({-0.0, 0}, row.size, row.radius);
+        EXPECT_EQ(tests::bits(builder.elements[0].points[0].x), tests::bits(row.used));
+    }
+}
+
 TEST(PathShapes, RoundRectKeepsElementsOfNoLength) {
     PathBuilder builder;
     builder.roundRect({0, 0}, {4, 4}, 0);
