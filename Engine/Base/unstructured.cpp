@@ -91,7 +91,10 @@ bool Unstructured::isDeep() const { return height() > kDeepestRecursion; }
 template <class T>
 Unstructured::Storage Unstructured::made(T&& content) {
     std::uint32_t levels = 0;
-    for (auto const& element : content) levels = std::max(levels, elementOf(element).height());
+    for (auto const& element : content) {
+        Unstructured const& tree = elementOf(element);
+        if (tree.ownsContent()) levels = std::max(levels, tree.height());
+    }
     levels = std::max(levels, levels + 1);  // Stays at the largest there is.
     return new Node<T>{std::forward<T>(content), levels};
 }
