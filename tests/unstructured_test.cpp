@@ -279,6 +279,22 @@ TEST(Unstructured, IsAssignedFromAPartOfItself) {
     EXPECT_EQ(tree.ifMap()->at("inner"), inner);
 }
 
+TEST(Unstructured, GivesBackWhatItHeld) {
+    std::string const text = "a text that is longer than a short one";
+    tests::AllocationCounter counter;
+    {
+        Unstructured tree = Map{{"list", List{1, text, Map{{"deep", text}}}}, {"text", text}};
+        Unstructured copy = tree;
+        Unstructured const moved = std::move(copy);
+        copy = moved;
+        copy = text;
+        copy = 5;
+        tree = List{moved, moved};
+        EXPECT_GT(counter.held(), 10u);
+    }
+    EXPECT_EQ(counter.held(), 0u);
+}
+
 TEST(Unstructured, RemovesEmptyValuesOneLevelDeep) {
     Unstructured const inner = Map{{"g", ""}};
     Map const map{{"a", ""}, {"b", List{}}, {"c", Map{}}, {"d", Unstructured::Undefined()},
