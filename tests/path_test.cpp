@@ -355,6 +355,48 @@ TEST(PathShapes, RoundRectLimitsItsRadiusFromAbove) {
     }
 }
 
+TEST(PathShapes, TakeTheRoomTheyNeedAndTwiceThatWhenItIsMore) {
+    struct Row {
+        char const* what;
+        void (*append)(PathBuilder&);
+        std::size_t size;
+    };
+    for (Row const& row : {
+             Row{"ellipse",
+                 [](PathBuilder& b) {
+                     b.ellipse({0, 0}, {2, 1});
+                 },
+                 6},
+             Row{"circle",
+                 [](PathBuilder& b) {
+                     b.circle({0, 0}, 1);
+                 },
+                 6},
+             Row{"roundRect",
+                 [](PathBuilder& b) {
+                     b.roundRect({0, 0}, {4, 4}, 1);
+                 },
+                 10},
+             Row{"hexaRect",
+                 [](PathBuilder& b) {
+                     b.hexaRect({0, 0}, {4, 4}, 1);
+                 },
+                 9},
+         }) {
+        SCOPED_TRACE(row.what);
+        PathBuilder builder;
+        row.append(builder);
+        EXPECT_EQ(builder.elements.size(), row.size);
+        EXPECT_EQ(builder.elements.capacity(), row.size);
+        row.append(builder);
+        EXPECT_EQ(builder.elements.capacity(), 2 * row.size);
+        row.append(builder);
+        EXPECT_EQ(builder.elements.capacity(), 4 * row.size);
+        row.append(builder);  // Which just fits.
+        EXPECT_EQ(builder.elements.capacity(), 4 * row.size);
+    }
+}
+
 TEST(PathShapes, RoundRectTakesTheLaterOfTwoZeros) {
     struct Row {
         char const* what;

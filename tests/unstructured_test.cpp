@@ -490,6 +490,28 @@ TEST(Unstructured, SurvivesAMillionLevelsOnASmallStack) {
     }
 }
 
+TEST(Unstructured, ComparesUpTo256LevelsWithoutAllocating) {
+    auto const maps = [](std::size_t levels) {
+        Unstructured tree = 1;
+        for (std::size_t i = 0; i < levels; ++i) {
+            Map map;
+            map["a"] = std::move(tree);
+            tree = std::move(map);
+        }
+        return tree;
+    };
+    auto const arrays = [](std::size_t levels) { return nested(levels, 0, 1); };
+    auto const allocations = [](Unstructured const& tree, Unstructured const& twin) {
+        tests::AllocationCounter counter;
+        EXPECT_EQ(tree, twin);
+        return counter.count();
+    };
+    EXPECT_EQ(allocations(arrays(256), arrays(256)), 0u);
+    EXPECT_GT(allocations(arrays(257), arrays(257)), 0u);
+    EXPECT_EQ(allocations(maps(256), maps(256)), 0u);
+    EXPECT_GT(allocations(maps(257), maps(257)), 0u);
+}
+
 TEST(Unstructured, HandlesEveryDepthAlike) {
     for (std::size_t levels : {1u, 2u, 255u, 256u, 257u, 258u, 300u, 520u}) {
         for (int kind : {0, 1, 2}) {
