@@ -68,7 +68,8 @@ public:
 
     /// Into the room that there is, when it is enough. A failing allocation leaves this as it was.
     Points& operator=(Points const& other) {
-        if (this != &other) replace(other.begin(), other.length);
+        if (other.length > room) return *this = Points(other);
+        if (this != &other) overwrite(other.begin(), other.length);
         return *this;
     }
     Points& operator=(Points&& other) noexcept {
@@ -78,7 +79,8 @@ public:
         return *this;
     }
     Points& operator=(std::initializer_list<FloatVec2> points) {
-        replace(points.begin(), points.size());
+        if (points.size() > room) return *this = Points(points);
+        overwrite(points.begin(), points.size());
         return *this;
     }
 
@@ -219,15 +221,9 @@ private:
         std::copy(points, points + count, withGrownRoomFor(length + count) + length);
         length += static_cast<Count>(count);
     }
-    void replace(FloatVec2 const* points, size_type count) {
-        if (count > room) {
-            Points larger;
-            larger.append(points, count);
-            *this = std::move(larger);
-        } else {
-            std::copy(points, points + count, data());
-            length = static_cast<Count>(count);
-        }
+    void overwrite(FloatVec2 const* points, size_type count) {
+        std::copy(points, points + count, data());
+        length = static_cast<Count>(count);
     }
     // Twice what there is, or all that is wanted if that is more.
     size_type grownRoom(size_type wanted) const {
