@@ -19,8 +19,7 @@ install(EXPORT TarnEngineBaseTargets
 install(DIRECTORY Engine/Base
     DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/Engine" COMPONENT development
     FILES_MATCHING PATTERN "*.h"
-    PATTERN "prefetch.h" EXCLUDE
-    PATTERN "truncate.h" EXCLUDE)
+    PATTERN "detail" EXCLUDE)
 
 configure_package_config_file(cmake/TarnEngineBaseConfig.cmake.in
     "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfig.cmake"

@@ -1,6 +1,6 @@
 #include <Engine/Base/easing.h>
 
-#include <Engine/Base/truncate.h>
+#include <Engine/Base/detail/truncate.h>
 
 #include <array>
 #include <cmath>
@@ -59,7 +59,7 @@ FloatVec4 eachComponent(FloatVec4 from, FloatVec4 to, Formula formula) {
 }
 template <class Formula>
 long long eachComponent(long long from, long long to, Formula formula) {
-    return truncate<long long>(
+    return detail::truncate<long long>(
         formula(static_cast<double>(from), static_cast<double>(difference(to, from))));
 }
 
@@ -185,16 +185,16 @@ long long ease(EasingFunction function, long long from, long long to, double t) 
     double const u = 2.0 * t;
     double const v = u - 1.0;
     if (function == EasingFunction::QuadraticOut) {
-        return truncate<long long>((t - 2.0) * (back * t) + a);
+        return detail::truncate<long long>((t - 2.0) * (back * t) + a);
     }
     if (function == EasingFunction::QuadraticInOut && !(u < 1.0)) {
-        return truncate<long long>(a + ((v - 2.0) * v - 1.0) * (back * 0.5));
+        return detail::truncate<long long>(a + ((v - 2.0) * v - 1.0) * (back * 0.5));
     }
     if (function == EasingFunction::SinusoidalIn) {
-        return truncate<long long>(a + (delta + std::cos(t * kHalfPi) * back));
+        return detail::truncate<long long>(a + (delta + std::cos(t * kHalfPi) * back));
     }
     if (function == EasingFunction::SinusoidalInOut) {
-        return truncate<long long>(a + (std::cos(t * kPi) - 1.0) * (back * 0.5));
+        return detail::truncate<long long>(a + (std::cos(t * kPi) - 1.0) * (back * 0.5));
     }
     return easeAlong(function, from, to, t);
 }

@@ -1,6 +1,6 @@
 #include <Engine/Base/patch.h>
 
-#include <Engine/Base/prefetch.h>
+#include <Engine/Base/detail/prefetch.h>
 
 #include <cstdint>
 #include <ostream>

@@ -1,6 +1,6 @@
 #include <Engine/Base/patch_index.h>
 
-#include <Engine/Base/prefetch.h>
+#include <Engine/Base/detail/prefetch.h>
 
 #include <algorithm>
 #include <cstddef>

@@ -1,6 +1,6 @@
 #include <Engine/Base/unstructured.h>
 
-#include <Engine/Base/truncate.h>
+#include <Engine/Base/detail/truncate.h>
 
 #include <boost/variant/get.hpp>
 
@@ -253,7 +253,8 @@ std::string Unstructured::asString() const { return ifString() ? *ifString() : s
 
 long long Unstructured::asInteger() const {
     if (auto const* integer = boost::get<long long>(&storage)) return *integer;
-    if (auto const* number = boost::get<double>(&storage)) return truncate<long long>(*number);
+    if (auto const* number = boost::get<double>(&storage))
+        return detail::truncate<long long>(*number);
     return 0;
 }
 
@@ -276,7 +277,7 @@ unsigned long long Unstructured::asId() const {
         return static_cast<unsigned long long>(*integer);
     }
     if (auto const* number = boost::get<double>(&storage)) {
-        return truncate<unsigned long long>(*number);
+        return detail::truncate<unsigned long long>(*number);
     }
     return 0;
 }

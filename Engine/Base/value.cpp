@@ -1,7 +1,7 @@
 #include <Engine/Base/value.h>
 
+#include <Engine/Base/detail/truncate.h>
 #include <Engine/Base/path.h>
-#include <Engine/Base/truncate.h>
 #include <Engine/Base/unstructured.h>
 
 #include <boost/variant/apply_visitor.hpp>
@@ -76,10 +76,10 @@ double numberFromString(std::shared_ptr<std::string const> const& text) {
 
 struct AsInteger : boost::static_visitor<long long> {
     long long operator()(long long i) const { return i; }
-    long long operator()(double d) const { return truncate<long long>(d); }
-    long long operator()(FloatVec2 const& v) const { return truncate<long long>(v.x); }
-    long long operator()(FloatVec3 const& v) const { return truncate<long long>(v.x); }
-    long long operator()(FloatVec4 const& v) const { return truncate<long long>(v.x); }
+    long long operator()(double d) const { return detail::truncate<long long>(d); }
+    long long operator()(FloatVec2 const& v) const { return detail::truncate<long long>(v.x); }
+    long long operator()(FloatVec3 const& v) const { return detail::truncate<long long>(v.x); }
+    long long operator()(FloatVec4 const& v) const { return detail::truncate<long long>(v.x); }
     long long operator()(std::shared_ptr<FloatMat4 const> const&) const { return 0; }
     long long operator()(bool b) const { return b ? 1 : 0; }
     template <Type resource>
@@ -93,7 +93,7 @@ struct AsInteger : boost::static_visitor<long long> {
         return u ? u->asInteger() : 0;
     }
     long long operator()(std::shared_ptr<std::string const> const& s) const {
-        return truncate<long long>(numberFromString(s));
+        return detail::truncate<long long>(numberFromString(s));
     }
     template <class T>
     long long operator()(T const&) const = delete;

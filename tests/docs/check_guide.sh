@@ -35,7 +35,6 @@ done
 headers=0
 for header in "$root"/Engine/Base/*.h; do
     name=$(basename "$header")
-    case $name in prefetch.h) continue ;; esac
     {
         printf '#include <Engine/Base/%s>\n#include <Engine/Base/assertion.h>\n' "$name"
         printf '#include <Engine/Base/patch.h>\n#include <Engine/Base/path.h>\n#include <iostream>\n'

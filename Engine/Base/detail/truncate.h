@@ -1,14 +1,15 @@
-// Engine/Base/truncate.h: from doubles to integers without undefined behaviour. Not installed.
+// Engine/Base/detail/truncate.h: from doubles to integers without undefined behaviour. Not
+// installed.
 //
 //     long long i = truncate<long long>(-2.9);  // -2
 
-#ifndef TARN_ENGINE_BASE_TRUNCATE_H
-#define TARN_ENGINE_BASE_TRUNCATE_H
+#ifndef TARN_ENGINE_BASE_DETAIL_TRUNCATE_H
+#define TARN_ENGINE_BASE_DETAIL_TRUNCATE_H
 
 #include <cmath>
 #include <limits>
 
-namespace tarn::engine {
+namespace tarn::engine::detail {
 
 /// `d` towards zero; the nearest integer of the type where it does not fit, and 0 for a NaN.
 template <class Integer>
@@ -21,6 +22,6 @@ Integer truncate(double d) {
     return static_cast<Integer>(d);
 }
 
-}  // namespace tarn::engine
+}  // namespace tarn::engine::detail
 
 #endif

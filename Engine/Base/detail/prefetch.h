@@ -1,7 +1,9 @@
-// Engine/Base/prefetch.h: internal. A word to the processor about what comes next.
+// Engine/Base/detail/prefetch.h: a word to the processor about what comes next. Not installed.
+//
+//     prefetch(&list[i + 6]);
 
-#ifndef TARN_ENGINE_BASE_PREFETCH_H
-#define TARN_ENGINE_BASE_PREFETCH_H
+#ifndef TARN_ENGINE_BASE_DETAIL_PREFETCH_H
+#define TARN_ENGINE_BASE_DETAIL_PREFETCH_H
 
 namespace tarn::engine::detail {
 
