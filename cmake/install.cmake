@@ -15,11 +15,17 @@ install(TARGETS tarn_engine_base
     INCLUDES DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
 install(EXPORT TarnEngineBaseTargets
     NAMESPACE tarn:: DESTINATION "${cmake_dir}" COMPONENT development)
+# For projects that export their own build tree, with the library in it.
+export(EXPORT TarnEngineBaseTargets
+    NAMESPACE tarn:: FILE "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseTargets.cmake")
 
 install(DIRECTORY Engine/Base
     DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/Engine" COMPONENT development
     FILES_MATCHING PATTERN "*.h"
     PATTERN "detail" EXCLUDE)
+if(NOT TARN_ENGINE_BASE_DEBIAN_PACKAGES)
+    install(FILES LICENSE DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/tarn-engine-base" COMPONENT development)
+endif()
 
 configure_package_config_file(cmake/TarnEngineBaseConfig.cmake.in
     "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfig.cmake"
@@ -34,16 +40,21 @@ install(FILES
 # Relative to its own place, so that a tree that was moved still works.
 file(RELATIVE_PATH TARN_ENGINE_BASE_PREFIX_FROM_PC "/${pkgconfig_dir}" "/")
 string(REGEX REPLACE "/$" "" TARN_ENGINE_BASE_PREFIX_FROM_PC "${TARN_ENGINE_BASE_PREFIX_FROM_PC}")
+set(TARN_ENGINE_BASE_PC_DEFINITIONS "")
+if(library_type STREQUAL STATIC)
+    set(TARN_ENGINE_BASE_PC_DEFINITIONS " -DTARN_ENGINE_BASE_STATIC")
+endif()
 configure_file(cmake/tarn_engine_base.pc.in
     "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc" @ONLY)
 install(FILES "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc"
     DESTINATION "${pkgconfig_dir}" COMPONENT development)
 
 # gdb loads a script by the full name of the library, beneath its auto-load folder.
-set(library_file "libtarn_engine_base.so.${PROJECT_VERSION}")
-install(FILES tools/gdb/tarn_engine_base.py
-    DESTINATION "${CMAKE_INSTALL_DATADIR}/gdb/auto-load${CMAKE_INSTALL_FULL_LIBDIR}"
-    RENAME "${library_file}-gdb.py" COMPONENT development)
+if(UNIX AND library_type STREQUAL SHARED)
+    install(FILES tools/gdb/tarn_engine_base.py
+        DESTINATION "${CMAKE_INSTALL_DATADIR}/gdb/auto-load${CMAKE_INSTALL_FULL_LIBDIR}"
+        RENAME "libtarn_engine_base.so.${PROJECT_VERSION}-gdb.py" COMPONENT development)
+endif()
 install(FILES tools/gdb/tarn_engine_base.py
     DESTINATION "${CMAKE_INSTALL_DATADIR}/tarn-engine-base/gdb" COMPONENT development)
 install(FILES tools/lldb/tarn_engine_base_lldb.py

@@ -55,7 +55,7 @@ foreach(component runtime development)
  -- ${CPACK_PACKAGE_CONTACT}  ${date}
 ")
     if(GZIP)
-        execute_process(COMMAND "${GZIP}" -9nf "${changelog}" COMMAND_ERROR_IS_FATAL ANY)
+        execute_process(COMMAND "${GZIP}" -9nf "${changelog}")
         install(FILES "${changelog}.gz" DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/${package}"
             RENAME changelog.Debian.gz COMPONENT ${component})
     endif()

@@ -12,8 +12,10 @@ set(CMAKE_CXX_EXTENSIONS OFF)
 
 add_library(tarn_warnings INTERFACE)
 if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
-    target_compile_options(tarn_warnings INTERFACE
-        -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+    target_compile_options(tarn_warnings INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow)
+    if(TARN_ENGINE_BASE_WARNINGS_AS_ERRORS)
+        target_compile_options(tarn_warnings INTERFACE -Werror)
+    endif()
     if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
         # From C++20 on, g++ 12 sees an overlap in "text" + std::string that is not there.
         target_compile_options(tarn_warnings INTERFACE -Wno-restrict)

@@ -7,6 +7,7 @@
 #ifndef TARN_ENGINE_BASE_POINTS_H
 #define TARN_ENGINE_BASE_POINTS_H
 
+#include <Engine/Base/export.h>
 #include <Engine/Base/value.h>
 
 #include <algorithm>
@@ -15,12 +16,20 @@
 #include <initializer_list>
 #include <iterator>
 #include <limits>
-#include <stdexcept>
 #include <type_traits>
 #include <utility>
 #include <vector>
 
 namespace tarn::engine {
+
+namespace detail {
+
+// `std::out_of_range` and `std::length_error`, out of line: callers may be compiled without
+// exceptions.
+[[noreturn]] TARN_ENGINE_BASE_EXPORT void throwOutOfRange(char const* what);
+[[noreturn]] TARN_ENGINE_BASE_EXPORT void throwLengthError(char const* what);
+
+}  // namespace detail
 
 /// A `std::vector<FloatVec2>` in its interface, its guarantees and its costs, without an allocator.
 /// Up to three points are held in place, without an allocation, and so a move and a swap invalidate
@@ -214,7 +223,7 @@ private:
         if (isMany()) delete[] held.many;
     }
     size_type checked(size_type i) const {
-        if (i >= length) throw std::out_of_range("Points::at");
+        if (i >= length) detail::throwOutOfRange("Points::at");
         return i;
     }
     void append(FloatVec2 const* points, size_type count) {
@@ -240,7 +249,7 @@ private:
         return held.many;
     }
     void moveTo(size_type newRoom) {
-        if (newRoom > max_size()) throw std::length_error("Points");
+        if (newRoom > max_size()) detail::throwLengthError("Points");
         auto* const larger = new FloatVec2[newRoom];
         std::copy(begin(), end(), larger);
         release();

@@ -8,9 +8,14 @@
 #ifndef TARN_ENGINE_BASE_VALUE_H
 #define TARN_ENGINE_BASE_VALUE_H
 
+#include <Engine/Base/comparison.h>
 #include <Engine/Base/export.h>
 #include <Engine/Base/optional.h>
 
+#if defined(BOOST_VARIANT_MINIMIZE_SIZE)
+#error                                                                                             \
+    "Tarn Engine Base has Boost's usual variant in its binary interface: undefine BOOST_VARIANT_MINIMIZE_SIZE"
+#endif
 #include <boost/variant/get.hpp>
 #include <boost/variant/variant.hpp>
 
@@ -56,7 +61,7 @@ struct FloatVec2 {
 
     /// Component by component.
     friend constexpr bool operator==(FloatVec2 const& a, FloatVec2 const& b) {
-        return a.x == b.x && a.y == b.y;
+        return detail::equalNumbers(a.x, b.x) && detail::equalNumbers(a.y, b.y);
     }
     friend constexpr bool operator!=(FloatVec2 const& a, FloatVec2 const& b) { return !(a == b); }
 };
@@ -70,7 +75,8 @@ struct FloatVec3 {
 
     /// Component by component.
     friend constexpr bool operator==(FloatVec3 const& a, FloatVec3 const& b) {
-        return a.x == b.x && a.y == b.y && a.z == b.z;
+        return detail::equalNumbers(a.x, b.x) && detail::equalNumbers(a.y, b.y) &&
+               detail::equalNumbers(a.z, b.z);
     }
     friend constexpr bool operator!=(FloatVec3 const& a, FloatVec3 const& b) { return !(a == b); }
 };
@@ -85,7 +91,8 @@ struct FloatVec4 {
 
     /// Component by component.
     friend constexpr bool operator==(FloatVec4 const& a, FloatVec4 const& b) {
-        return a.x == b.x && a.y == b.y && a.z == b.z && a.w == b.w;
+        return detail::equalNumbers(a.x, b.x) && detail::equalNumbers(a.y, b.y) &&
+               detail::equalNumbers(a.z, b.z) && detail::equalNumbers(a.w, b.w);
     }
     friend constexpr bool operator!=(FloatVec4 const& a, FloatVec4 const& b) { return !(a == b); }
 };
@@ -333,7 +340,8 @@ public:
     TARN_ENGINE_BASE_EXPORT_INLINE bool operator==(Value const& other) const {
         if (storage.which() != other.storage.which()) return false;
         double const* number = boost::get<double>(&storage);
-        return number != nullptr ? *number == double(other) : contentEquals(other);
+        return number != nullptr ? detail::equalNumbers(*number, double(other))
+                                 : contentEquals(other);
     }
     TARN_ENGINE_BASE_EXPORT_INLINE bool operator!=(Value const& other) const {
         return !(*this == other);
@@ -456,8 +464,8 @@ TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo);
 inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) {
     if (typeInfo.type != Type::Float || (!typeInfo.min && !typeInfo.max)) return value;
     double const number = value;
-    if (typeInfo.min && double(*typeInfo.min) > number) return *typeInfo.min;
-    if (typeInfo.max && number > double(*typeInfo.max)) return *typeInfo.max;
+    if (typeInfo.min && detail::lessNumber(number, double(*typeInfo.min))) return *typeInfo.min;
+    if (typeInfo.max && detail::lessNumber(double(*typeInfo.max), number)) return *typeInfo.max;
     return value;
 }
 

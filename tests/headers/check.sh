@@ -1,5 +1,6 @@
 #!/bin/sh
-# Compiles every public header by itself, twice included, with all warnings as errors.
+# Compiles every public header by itself, twice included, with all warnings as errors; and all of them
+# without exceptions and run-time type information. Boost's macro for smaller variants is refused.
 #
 #     check.sh COMPILER STANDARD INCLUDE_DIR
 set -eu
@@ -18,3 +19,13 @@ for header in "$root"/Engine/Base/*.h; do
 done
 echo "$standard: $count headers compile alone"
 [ "$count" -gt 0 ]
+
+everything() { for header in "$root"/Engine/Base/*.h; do echo "#include <Engine/Base/$(basename "$header")>"; done; }
+everything | "$compiler" "-std=$standard" "-I$root" -fno-exceptions -fno-rtti -Wall -Wextra -Werror -fsyntax-only -x c++ -
+echo "$standard: without exceptions and run-time type information"
+
+everything | "$compiler" "-std=$standard" "-I$root" -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - \
+    2> /dev/null && { echo "smaller variants are not refused"; exit 1; }
+everything | LC_ALL=C "$compiler" "-std=$standard" "-I$root" -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - 2>&1 \
+    | grep -q 'error: .*undefine BOOST_VARIANT_MINIMIZE_SIZE'
+echo "$standard: smaller variants are refused"

@@ -1,0 +1,32 @@
+// Engine/Base/comparison.h: comparisons of doubles that no flag of a caller's compiler bends.
+//
+//     bool equal = detail::equalNumbers(a, b);  // False for a NaN, with -ffast-math too.
+
+#ifndef TARN_ENGINE_BASE_COMPARISON_H
+#define TARN_ENGINE_BASE_COMPARISON_H
+
+#include <Engine/Base/export.h>
+
+namespace tarn::engine::detail {
+
+// `a == b` and `a < b`, compiled into the library, which knows of NaNs whatever its callers do.
+TARN_ENGINE_BASE_EXPORT bool equalNumbersInLibrary(double a, double b) noexcept;
+TARN_ENGINE_BASE_EXPORT bool lessNumberInLibrary(double a, double b) noexcept;
+
+#if defined(__FINITE_MATH_ONLY__) && __FINITE_MATH_ONLY__
+// The caller's compiler takes every number for finite: a comparison in place could call a NaN equal
+// or smaller. Constants are compared by the compiler itself, which does it right.
+constexpr bool equalNumbers(double a, double b) noexcept {
+    return __builtin_is_constant_evaluated() ? a == b : equalNumbersInLibrary(a, b);
+}
+constexpr bool lessNumber(double a, double b) noexcept {
+    return __builtin_is_constant_evaluated() ? a < b : lessNumberInLibrary(a, b);
+}
+#else
+constexpr bool equalNumbers(double a, double b) noexcept { return a == b; }
+constexpr bool lessNumber(double a, double b) noexcept { return a < b; }
+#endif
+
+}  // namespace tarn::engine::detail
+
+#endif
