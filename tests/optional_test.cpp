@@ -56,8 +56,7 @@ TEST(Optional, ComparesEmptinessThenValues) {
 TEST(OptionalDeathTest, ReadingAnEmptyOneStopsTheProgram) {
     Optional<std::string> empty;
     Optional<std::string> const constant;
-    std::string const line =
-        tests::failedAssertion("hasValue\\(\\)", "value", "Engine/Base/optional");
+    auto const line = tests::failedAssertion("hasValue()", "value", "Engine/Base/optional");
     EXPECT_DEATH(empty.value(), line);
     EXPECT_DEATH(*empty, line);
     EXPECT_DEATH(empty->size(), line);

@@ -235,69 +235,119 @@ std::string const& negativeZero() {
     return text;
 }
 
-// Whether the C library formats as everyone expects: to the nearest, ties to even, with a point.
-bool formatsPlainly() {
+// The C library's decimal point, which is a string of its own. Its other questions about it may not
+// be asked on two threads at once.
 #if __has_include(<langinfo.h>)
-    char const* const radix = nl_langinfo(RADIXCHAR);
-    return std::fegetround() == FE_TONEAREST && radix[0] == '.' && radix[1] == '\0';
+struct RadixPoint {
+    char const* const text = nl_langinfo(RADIXCHAR);
+};
 #else
-    return false;  // The standard library's own question may not be asked on two threads at once.
+struct RadixPoint {
+    RadixPoint() {
+        std::snprintf(half, sizeof half, "%.1f", 0.5);
+        half[std::strlen(half) - 1] = '\0';  // The 5.
+    }
+    char half[16];
+    char const* const text = half + 1;
+};
 #endif
-}
 
-// The number text of a double below 1000 without the C library: the mantissa times 100, shifted
-// down, is exact in 64 bits, and so is its rounding.
-std::string shortText(double d) {
+// Where numbers have no fraction and one decimal still fits into 64 bits.
+constexpr double kTwo52 = 4503599627370496.0;
+
+// The magnitude of `d` times `scale`, as an integer, rounded as the C library rounds. Exact: the
+// mantissa times the scale fits into 64 bits. For a `d` between -2^52 and 2^52 and a scale of at
+// most 100.
+std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     std::uint64_t bits = 0;
     std::memcpy(&bits, &d, sizeof bits);
     int const biased = static_cast<int>(bits >> 52 & 0x7ff);
     std::uint64_t const fraction = bits & 0xfffffffffffff;
     std::uint64_t const mantissa = biased == 0 ? fraction : fraction | std::uint64_t(1) << 52;
-    int const shift = 1075 - (biased == 0 ? 1 : biased);  // At least 43, for a number below 1000.
-    std::uint64_t hundredths = 0;
-    if (shift < 62) {  // Further down it is less than half of a hundredth.
-        std::uint64_t const product = mantissa * 100;  // Below 2^60.
-        std::uint64_t const half = std::uint64_t(1) << (shift - 1);
-        hundredths = product >> shift;
-        std::uint64_t const rest = product - (hundredths << shift);
-        hundredths += rest > half || (rest == half && hundredths % 2 != 0) ? 1 : 0;
+    int const shift = 1075 - (biased == 0 ? 1 : biased);  // At least 1, for a number below 2^52.
+    std::uint64_t const product = mantissa * scale;       // Below 2^60.
+    // From 62 on, the product is less than a quarter of what it is shifted by.
+    std::uint64_t const whole = shift < 62 ? product >> shift : 0;
+    std::uint64_t const rest = shift < 62 ? product - (whole << shift) : product;
+    std::uint64_t const half = std::uint64_t(1) << (shift < 62 ? shift - 1 : 61);
+    [[maybe_unused]] bool const negative = bits >> 63 != 0;
+    if (rest == 0) return whole;
+    switch (std::fegetround()) {
+#if defined(FE_UPWARD)
+        case FE_UPWARD: return negative ? whole : whole + 1;
+#endif
+#if defined(FE_DOWNWARD)
+        case FE_DOWNWARD: return negative ? whole + 1 : whole;
+#endif
+#if defined(FE_TOWARDZERO)
+        case FE_TOWARDZERO: return whole;
+#endif
+        default: return whole + (rest > half || (rest == half && whole % 2 != 0) ? 1 : 0);
     }
-    if (hundredths == 0) return "0";
+}
 
-    char buffer[8];
-    char* const end = buffer + sizeof buffer;
-    char* begin = end;
-    std::uint64_t whole = hundredths / 100;
-    auto const digit = [](std::uint64_t value) { return static_cast<char>('0' + value); };
-    if (std::uint64_t const decimals = hundredths % 100; decimals != 0) {
-        if (decimals % 10 != 0) *--begin = digit(decimals % 10);
-        *--begin = digit(decimals / 10);
-        *--begin = '.';
+// A number's text from the end to the beginning.
+class Digits {
+public:
+    // `decimals` places behind `point`, of `multiple`, which is that many powers of ten too large.
+    // Those that are zero are left out where `trimmed`, and so is a point with nothing behind it.
+    Digits(std::uint64_t multiple, int decimals, char const* point, bool trimmed, bool negative) {
+        bool shown = !trimmed;
+        for (; decimals > 0; --decimals, multiple /= 10) {
+            shown = shown || multiple % 10 != 0;
+            if (shown) *--begin = static_cast<char>('0' + multiple % 10);
+        }
+        if (shown) {
+            std::size_t const length = std::strlen(point);
+            begin -= length;
+            std::memcpy(begin, point, length);
+        }
+        do {
+            *--begin = static_cast<char>('0' + multiple % 10);
+            multiple /= 10;
+        } while (multiple != 0);
+        if (negative) *--begin = '-';
     }
-    do {
-        *--begin = digit(whole % 10);
-        whole /= 10;
-    } while (whole != 0);
-    if (bits >> 63 != 0) *--begin = '-';
-    return std::string(begin, end);
+    operator std::string() const {
+        return std::string(static_cast<char const*>(begin), std::end(buffer));
+    }
+
+private:
+    char buffer[48];  // A sign, 16 digits, a point of a few bytes, two decimals.
+    char* begin = buffer + sizeof buffer;
+};
+
+// As the C library formats with "%.1f" from 1000.0 on and with "%.2f" below, without the zeros
+// that end it. What is no finite number is "nan" or "inf" behind its sign, on every platform.
+std::string numberText(double d) {
+    char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
+    bool const isNegative = std::signbit(d);
+    std::string text;
+    if (std::abs(d) < kTwo52) {
+        RadixPoint const radix;
+        bool const isUsual = point == '.' && radix.text[0] == '.' && radix.text[1] == '\0';
+        int const decimals = std::abs(d) >= 1000.0 ? 1 : 2;
+        std::uint64_t const multiple = roundedMultiple(d, decimals == 1 ? 10 : 100);
+        if (isUsual) return Digits(multiple, decimals, ".", true, isNegative && multiple != 0);
+        text = Digits(multiple, decimals, radix.text, false, isNegative);
+    } else if (std::isfinite(d)) {
+        char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
+        std::snprintf(buffer, sizeof buffer, "%.1f", d);
+        text = buffer;
+    } else {
+        text = std::string(isNegative ? "-" : "") + (std::isnan(d) ? "nan" : "inf");
+    }
+    if (std::size_t const position = text.find(point); position != std::string::npos) {
+        while (text.size() > position + 1 && text.back() == '0') text.pop_back();
+        if (text.size() == position + 1) text.pop_back();
+    }
+    return text == negativeZero() ? "0" : text;
 }
 
 struct ToStringVisitor : boost::static_visitor<std::string> {
     std::string operator()(long long i) const { return std::to_string(i); }
 
-    std::string operator()(double d) const {
-        char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
-        if (std::abs(d) < 1000.0 && point == '.' && formatsPlainly()) return shortText(d);
-        char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
-        std::snprintf(buffer, sizeof buffer, std::abs(d) >= 1000.0 ? "%.1f" : "%.2f", d);
-        std::string text = buffer;
-        if (std::size_t const position = text.find(point); position != std::string::npos) {
-            while (text.size() > position + 1 && text.back() == '0') text.pop_back();
-            if (text.size() == position + 1) text.pop_back();
-        }
-        return text == negativeZero() ? "0" : text;
-    }
-
+    std::string operator()(double d) const { return numberText(d); }
     std::string operator()(FloatVec2 const& v) const { return number(v.x) + ", " + number(v.y); }
     std::string operator()(FloatVec3 const& v) const {
         return number(v.x) + ", " + number(v.y) + ", " + number(v.z);

@@ -126,9 +126,8 @@ private:
         if (ownId < 0 || static_cast<unsigned long long>(ownId) != id)
             patch.attributes["id"] = ownId;
         if (field.has("order")) field.at("order").integer();
-        Json const noProperties = Json::object();
-        Json const& properties =
-            field.has("properties") ? field.at("properties").object() : noProperties;
+        Json properties = Json::object();
+        if (field.has("properties")) properties = field.at("properties").object();
         patch.inputs = ports(field, "inputs", properties);
         patch.outputs = ports(field, "outputs", properties);
         if (patch.builtin == kindByName("time")->number) retagTime(patch.outputs);

@@ -31,12 +31,16 @@ private:
 /// While it lives, the C library writes and reads numbers with a decimal comma.
 class CLocaleWithComma {
 public:
-    CLocaleWithComma() { set = std::setlocale(LC_NUMERIC, "de_DE.UTF-8") != nullptr; }
+    CLocaleWithComma() {
+        for (char const* name : {"de_DE.UTF-8", "German_Germany.1252"}) {
+            set = set || std::setlocale(LC_NUMERIC, name) != nullptr;
+        }
+    }
     ~CLocaleWithComma() { std::setlocale(LC_NUMERIC, "C"); }
     CLocaleWithComma(CLocaleWithComma const&) = delete;
     CLocaleWithComma& operator=(CLocaleWithComma const&) = delete;
 
-    /// The tests' build makes the locale, so that it is there.
+    /// The tests' build makes the locale where the system has none of its own.
     bool isSet() const { return set; }
 
 private:

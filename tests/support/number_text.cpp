@@ -26,20 +26,35 @@ std::string wholeDigits(std::uint64_t mantissa, int exponent) {
     return reversed;
 }
 
-// mantissa * scale / 2^shift, rounded to the nearest integer, ties to even.
-std::uint64_t roundedQuotient(std::uint64_t mantissa, std::uint64_t scale, int shift) {
+enum class Rounding { ToNearest, AwayFromZero, TowardsZero };
+
+Rounding roundingOf([[maybe_unused]] bool negative, int mode) {
+#if defined(FE_UPWARD)
+    if (mode == FE_UPWARD) return negative ? Rounding::TowardsZero : Rounding::AwayFromZero;
+#endif
+#if defined(FE_DOWNWARD)
+    if (mode == FE_DOWNWARD) return negative ? Rounding::AwayFromZero : Rounding::TowardsZero;
+#endif
+    return mode == FE_TONEAREST ? Rounding::ToNearest : Rounding::TowardsZero;
+}
+
+// mantissa * scale / 2^shift, rounded to an integer; to the nearest with ties to even.
+std::uint64_t roundedQuotient(std::uint64_t mantissa, std::uint64_t scale, int shift,
+                              Rounding rounding) {
     std::uint64_t const product = mantissa * scale;  // Below 2^60.
-    if (shift > 62) return 0;
+    if (shift > 62) return rounding == Rounding::AwayFromZero && product != 0 ? 1 : 0;
     std::uint64_t const quotient = product >> shift;
     std::uint64_t const rest = product - (quotient << shift);
     std::uint64_t const half = std::uint64_t(1) << (shift - 1);
-    bool const up = rest > half || (rest == half && quotient % 2 == 1);
+    bool const up = rounding == Rounding::ToNearest
+                        ? rest > half || (rest == half && quotient % 2 == 1)
+                        : rounding == Rounding::AwayFromZero && rest != 0;
     return quotient + (up ? 1 : 0);
 }
 
 }  // namespace
 
-std::string modelNumberText(double number, char formatted, char trimmed) {
+std::string modelNumberText(double number, char formatted, char trimmed, int roundingMode) {
     std::uint64_t const all = bits(number);
     bool const negative = (all >> 63) != 0;
     int const biased = static_cast<int>(all >> 52 & 0x7ff);
@@ -56,7 +71,8 @@ std::string modelNumberText(double number, char formatted, char trimmed) {
     if (exponent >= 0) {
         digits = wholeDigits(mantissa, exponent) + std::string(decimals, '0');
     } else {
-        digits = std::to_string(roundedQuotient(mantissa, decimals == 1 ? 10 : 100, -exponent));
+        digits = std::to_string(roundedQuotient(mantissa, decimals == 1 ? 10 : 100, -exponent,
+                                                roundingOf(negative, roundingMode)));
         if (digits.size() <= decimals) digits.insert(0, decimals + 1 - digits.size(), '0');
     }
     digits.insert(digits.size() - decimals, 1, formatted);

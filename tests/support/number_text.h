@@ -5,13 +5,16 @@
 #ifndef TARN_TESTS_SUPPORT_NUMBER_TEXT_H
 #define TARN_TESTS_SUPPORT_NUMBER_TEXT_H
 
+#include <cfenv>
 #include <string>
 
 namespace tests {
 
 /// `formatted` is the decimal point that the number is written with, `trimmed` the one that
-/// trailing zeros are looked for behind. Rounds to the nearest, ties to even.
-std::string modelNumberText(double number, char formatted, char trimmed);
+/// trailing zeros are looked for behind. Rounds as `roundingMode` says, to the nearest
+/// with ties to even.
+std::string modelNumberText(double number, char formatted, char trimmed,
+                            int roundingMode = FE_TONEAREST);
 
 }  // namespace tests
 
