@@ -59,10 +59,10 @@ TEST(OptionalDeathTest, ReadingAnEmptyOneStopsTheProgram) {
     auto const line = tests::failedAssertion("hasValue()", "value", "Engine/Base/optional");
     EXPECT_DEATH(empty.value(), line);
     EXPECT_DEATH(*empty, line);
-    EXPECT_DEATH(empty->size(), line);
+    EXPECT_DEATH(static_cast<void>(empty->size()), line);
     EXPECT_DEATH(constant.value(), line);
     EXPECT_DEATH(*constant, line);
-    EXPECT_DEATH(constant->size(), line);
+    EXPECT_DEATH(static_cast<void>(constant->size()), line);
     EXPECT_DEATH(Optional<std::string>().value(), line);
     EXPECT_DEATH(*Optional<std::string>(), line);
 }

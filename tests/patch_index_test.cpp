@@ -191,7 +191,8 @@ TEST(PatchIndex, IsNotSlowedByIdentifiersThatWereChosenForIt) {
         PatchIndex const index(chosen);
         EXPECT_EQ(index.outgoingConnectionsFromPatch(2).size(), kCount);
         for (unsigned long long i = 0; i < kCount; i += 100) {
-            ASSERT_EQ(index.findOutputPort(row.idOf(i)), &chosen.children->at(0).outputs->at(i));
+            ASSERT_EQ(index.findOutputPort(row.idOf(i)),
+                      &chosen.children->at(0).outputs->at(static_cast<std::size_t>(i)));
         }
     }
 }

@@ -137,14 +137,14 @@ TEST(Connection, EqualsAndHashesByAllFields) {
     }
     struct Row {
         Connection connection;
-        std::size_t hash;
+        std::uint64_t hash;  // Of which a `std::size_t` of 32 bits holds the lower half.
     };
     for (Row const& row : {
              Row{{1, 2, 3, 4}, 0x28253c81ad382},
              Row{{3, 4, 1, 2}, 0x28253c81259e0},
              Row{{0, 0, 0, 0}, 0x28253c84d221a},
          }) {
-        EXPECT_EQ(std::hash<Connection>()(row.connection), row.hash);
+        EXPECT_EQ(std::hash<Connection>()(row.connection), static_cast<std::size_t>(row.hash));
     }
     EXPECT_EQ(Set().max_load_factor(), 1.0f);
 
@@ -156,7 +156,8 @@ TEST(Connection, EqualsAndHashesByAllFields) {
         for (unsigned long long v : fields) {
             seed = seed ^ (v + 2654435769ULL + seed * 64 + seed / 4);
         }
-        ASSERT_EQ(std::hash<Connection>()({fields[0], fields[1], fields[2], fields[3]}), seed);
+        ASSERT_EQ(std::hash<Connection>()({fields[0], fields[1], fields[2], fields[3]}),
+                  static_cast<std::size_t>(seed));
     }
 }
 

@@ -66,7 +66,8 @@ struct Connection {
 }  // namespace tarn::engine
 
 /// The four fields in their order, each combined as
-/// `seed ^= v + 0x9e3779b9 + (seed << 6) + (seed >> 2)` in 64 bits. The same on every platform.
+/// `seed ^= v + 0x9e3779b9 + (seed << 6) + (seed >> 2)` in 64 bits. The same on every platform;
+/// where `std::size_t` has 32 bits, its lower half.
 template <>
 struct std::hash<tarn::engine::Connection> {
     TARN_ENGINE_BASE_EXPORT std::size_t

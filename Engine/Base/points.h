@@ -102,7 +102,11 @@ public:
     FloatVec2 const* data() const { return isMany() ? held.many : held.few; }
     size_type size() const { return length; }
     size_type capacity() const { return room; }
-    size_type max_size() const { return std::numeric_limits<Count>::max(); }
+    size_type max_size() const {
+        constexpr auto kAddressable =
+            static_cast<size_type>(std::numeric_limits<difference_type>::max() / sizeof(FloatVec2));
+        return std::min<size_type>(std::numeric_limits<Count>::max(), kAddressable);
+    }
     bool empty() const { return length == 0; }
 
     /// Valid until points are added or this is moved from.

@@ -473,7 +473,7 @@ inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo
 inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
                                      unsigned long long index) {
     if (loop.empty()) return detail::castNullValue(typeInfo);
-    return castValueToType(loop[index % loop.size()], typeInfo);
+    return castValueToType(loop[static_cast<std::size_t>(index % loop.size())], typeInfo);
 }
 
 }  // namespace tarn::engine

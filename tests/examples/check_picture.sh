@@ -1,5 +1,6 @@
 #!/bin/sh
-# Has a program write a picture and compares it with a file, whole.
+# Has a program write a picture and compares it with a file: whole where Graphviz is of the series that laid
+# it out, and but for its numbers where it is of another, which puts things a little elsewhere.
 #
 #     check_picture.sh EXPECTED PROGRAM [ARGUMENT...]
 set -eu
@@ -10,4 +11,13 @@ work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 "$@" --picture "$work/picture.svg" > /dev/null
 [ -s "$expected" ]
-cmp "$expected" "$work/picture.svg" || { diff "$expected" "$work/picture.svg"; exit 1; }
+case $(dot -V 2>&1) in
+    *" version 2.4"*)
+        cp "$expected" "$work/expected.svg"
+        ;;
+    *)
+        sed 's/[0-9.]\{1,\}/N/g' "$expected" > "$work/expected.svg"
+        sed -i 's/[0-9.]\{1,\}/N/g' "$work/picture.svg"
+        ;;
+esac
+cmp "$work/expected.svg" "$work/picture.svg" || { diff "$work/expected.svg" "$work/picture.svg"; exit 1; }

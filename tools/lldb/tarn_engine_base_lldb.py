@@ -207,9 +207,10 @@ def type_info_text(value):
 def points_text(value):
     kind = record(value, "FloatVec2")
     held = member(value, "held")
-    few = member(held, "few")
-    is_many = member(value, "room").GetValueAsUnsigned() > few.GetNumChildren()
-    start = member(held, "many").GetValueAsUnsigned() if is_many else few.GetLoadAddress()
+    # Some versions take the array of those in place for one of no elements.
+    in_place = held.GetByteSize() // kind.GetByteSize()
+    is_many = member(value, "room").GetValueAsUnsigned() > in_place
+    start = member(held, "many").GetValueAsUnsigned() if is_many else held.GetLoadAddress()
     count = member(value, "length").GetValueAsUnsigned()
     return " ".join(vector(at(value, "p", start + i * kind.GetByteSize(), kind)) for i in range(count))
 
