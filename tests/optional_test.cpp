@@ -57,12 +57,12 @@ TEST(OptionalDeathTest, ReadingAnEmptyOneStopsTheProgram) {
     Optional<std::string> empty;
     Optional<std::string> const constant;
     auto const line = tests::failedAssertion("hasValue()", "value", "Engine/Base/optional");
-    EXPECT_DEATH(empty.value(), line);
-    EXPECT_DEATH(*empty, line);
-    EXPECT_DEATH(static_cast<void>(empty->size()), line);
-    EXPECT_DEATH(constant.value(), line);
-    EXPECT_DEATH(*constant, line);
-    EXPECT_DEATH(static_cast<void>(constant->size()), line);
-    EXPECT_DEATH(Optional<std::string>().value(), line);
-    EXPECT_DEATH(*Optional<std::string>(), line);
+    EXPECT_ENDS(empty.value(), line);
+    EXPECT_ENDS(*empty, line);
+    EXPECT_ENDS(static_cast<void>(empty->size()), line);
+    EXPECT_ENDS(constant.value(), line);
+    EXPECT_ENDS(*constant, line);
+    EXPECT_ENDS(static_cast<void>(constant->size()), line);
+    EXPECT_ENDS(Optional<std::string>().value(), line);
+    EXPECT_ENDS(*Optional<std::string>(), line);
 }

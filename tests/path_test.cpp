@@ -62,12 +62,12 @@ TEST(PathInstruction, HasItsNumberAndItsName) {
 
 TEST(PathInstructionDeathTest, HasNoOtherNames) {
     for (char const* name : {"Close", "close ", " close", "", "moveto", "curve"}) {
-        EXPECT_DEATH(stringToPathInstruction(name),
-                     tests::failedAssertion("0", "stringToPathInstruction", "Engine/Base/path"))
-            << name;
+        SCOPED_TRACE(name);
+        EXPECT_ENDS(stringToPathInstruction(name),
+                    tests::failedAssertion("0", "stringToPathInstruction", "Engine/Base/path"));
     }
-    EXPECT_DEATH(pathInstructionToString(PathInstruction(5)),
-                 tests::failedAssertion("0", "pathInstructionToString", "Engine/Base/path"));
+    EXPECT_ENDS(pathInstructionToString(PathInstruction(5)),
+                tests::failedAssertion("0", "pathInstructionToString", "Engine/Base/path"));
 }
 
 TEST(PathElement, EqualsByInstructionAndPoints) {

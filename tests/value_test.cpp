@@ -137,8 +137,8 @@ TEST(Type, OutOfRangeIsInNoClass) {
 }
 
 TEST(TypeDeathTest, OutOfRangeHasNoName) {
-    EXPECT_DEATH(typeToString(outOfRange()),
-                 tests::failedAssertion("0", "typeToString", "Engine/Base/value"));
+    EXPECT_ENDS(typeToString(outOfRange()),
+                tests::failedAssertion("0", "typeToString", "Engine/Base/value"));
 }
 
 TEST(TarnType, NamesTheTypeOfANativeOne) {
@@ -228,8 +228,8 @@ TEST(Value, MakersAreTheConstructorOfTheirType) {
 TEST(ValueDeathTest, AnIdentifierOfNoResourceIsRefused) {
     for (Type type : {Type::Float, Type::Vec2, Type::Vec3, Type::Vec4, Type::Mat4, Type::Boolean,
                       Type::Int, Type::Path, Type::String, Type::Unstructured, outOfRange()}) {
-        EXPECT_DEATH(Value(5, type), tests::failedAssertion("0", "Value", "Engine/Base/value", 161))
-            << int(type);
+        SCOPED_TRACE(int(type));
+        EXPECT_ENDS(Value(5, type), tests::failedAssertion("0", "Value", "Engine/Base/value", 161));
     }
 }
 
@@ -277,8 +277,8 @@ TEST(Value, DefaultsAreNeutral) {
 }
 
 TEST(ValueDeathTest, OutOfRangeHasNoDefault) {
-    EXPECT_DEATH(Value::defaultValue(outOfRange()),
-                 tests::failedAssertion("0", "defaultValue", "Engine/Base/value"));
+    EXPECT_ENDS(Value::defaultValue(outOfRange()),
+                tests::failedAssertion("0", "defaultValue", "Engine/Base/value"));
 }
 
 TEST(Value, AllocatesForPayloadsAloneAndOnce) {
@@ -820,8 +820,8 @@ TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
 }
 
 TEST(ValueDeathTest, BecomesNothingOutOfRange) {
-    EXPECT_DEATH(Value().asType(outOfRange()),
-                 tests::failedAssertion("0", "asType", "Engine/Base/value"));
+    EXPECT_ENDS(Value().asType(outOfRange()),
+                tests::failedAssertion("0", "asType", "Engine/Base/value"));
 }
 
 TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
@@ -1057,6 +1057,7 @@ TEST(NumberText, FollowsTheRoundingMode) {
          }) {
         SCOPED_TRACE(row.what);
         ASSERT_EQ(std::fesetround(row.mode), 0);
+        if (std::fegetround() != row.mode) GTEST_SKIP() << "there is one rounding mode alone";
         std::string const text = to_string(Value(0.125));
         std::string const negative = to_string(Value(-0.125));
         std::fesetround(FE_TONEAREST);
@@ -1225,8 +1226,8 @@ TEST(TypeInfo, NamesItsPortByTheSubtypeOfTwoTypesAlone) {
 TEST(TypeInfoDeathTest, OutOfRangeNamesNoPort) {
     TypeInfo info;
     info.type = outOfRange();
-    EXPECT_DEATH(portNameForTypeInfo(info, false),
-                 tests::failedAssertion("0", "portNameForTypeInfo", "Engine/Base/value"));
+    EXPECT_ENDS(portNameForTypeInfo(info, false),
+                tests::failedAssertion("0", "portNameForTypeInfo", "Engine/Base/value"));
 }
 
 TEST(CastValueToType, ClampsFloatPortsAndKeepsTheAlternative) {

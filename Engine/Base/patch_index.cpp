@@ -216,7 +216,8 @@ void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
     for (std::uint32_t i = 0; i < list.size(); ++i) {
         bool isFirst = true;
         if (slots.empty()) {
-            isFirst = std::find(list.begin(), list.begin() + i, list[i]) == list.begin() + i;
+            auto const place = list.begin() + static_cast<std::ptrdiff_t>(i);
+            isFirst = std::find(list.begin(), place, list[i]) == place;
         } else if (std::uint32_t const first = firstOfHash.at(slots[i].key).position; first != i) {
             isFirst = list[first] != list[i] && others.insert(list[i]).second;
         }

@@ -228,7 +228,7 @@ struct AsUnstructured : boost::static_visitor<Unstructured> {
 // The text that "%.f" gives for negative zero.
 std::string const& negativeZero() {
     static std::string const text = [] {
-        char buffer[8];
+        char buffer[16];
         std::snprintf(buffer, sizeof buffer, "%.f", -0.0);
         return std::string(buffer);
     }();

@@ -2,18 +2,21 @@
 # Compiles every public header by itself, twice included, with all warnings as errors; and all of them
 # without exceptions and run-time type information. Boost's macro for smaller variants is refused.
 #
-#     check.sh COMPILER STANDARD INCLUDE_DIR
+#     check.sh COMPILER STANDARD INCLUDE_DIR BOOST_DIR
 set -eu
 
 compiler=$1
 standard=$2
 root=$3
+# The system's own folder is to keep its place among the others.
+boost="-isystem $4"
+[ "$4" != /usr/include ] || boost=""
 
 count=0
 for header in "$root"/Engine/Base/*.h; do
     name=Engine/Base/$(basename "$header")
     printf '#include <%s>\n#include <%s>\n' "$name" "$name" \
-        | "$compiler" "-std=$standard" "-I$root" -Wall -Wextra -Wpedantic -Wconversion -Wshadow \
+        | "$compiler" "-std=$standard" "-I$root" $boost -Wall -Wextra -Wpedantic -Wconversion -Wshadow \
             -Werror -fsyntax-only -x c++ -
     count=$((count + 1))
 done
@@ -21,11 +24,11 @@ echo "$standard: $count headers compile alone"
 [ "$count" -gt 0 ]
 
 everything() { for header in "$root"/Engine/Base/*.h; do echo "#include <Engine/Base/$(basename "$header")>"; done; }
-everything | "$compiler" "-std=$standard" "-I$root" -fno-exceptions -fno-rtti -Wall -Wextra -Werror -fsyntax-only -x c++ -
+everything | "$compiler" "-std=$standard" "-I$root" $boost -fno-exceptions -fno-rtti -Wall -Wextra -Werror -fsyntax-only -x c++ -
 echo "$standard: without exceptions and run-time type information"
 
-everything | "$compiler" "-std=$standard" "-I$root" -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - \
+everything | "$compiler" "-std=$standard" "-I$root" $boost -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - \
     2> /dev/null && { echo "smaller variants are not refused"; exit 1; }
-everything | LC_ALL=C "$compiler" "-std=$standard" "-I$root" -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - 2>&1 \
+everything | LC_ALL=C "$compiler" "-std=$standard" "-I$root" $boost -DBOOST_VARIANT_MINIMIZE_SIZE -fsyntax-only -x c++ - 2>&1 \
     | grep -q 'error: .*undefine BOOST_VARIANT_MINIMIZE_SIZE'
 echo "$standard: smaller variants are refused"
