@@ -1,6 +1,7 @@
 #!/bin/sh
 # Builds the program of README.md with the CMakeLists.txt of README.md, as a stranger's project that
-# adds this one as a folder, and compares what it prints with what README.md says.
+# adds this one as a folder, and compares what it prints with what README.md says. Runs the commands that install
+# the library.
 #
 #     check_readme.sh SOURCE_DIR COMPILER
 set -eu
@@ -14,6 +15,7 @@ block() { awk -v start="\`\`\`$1" '$0 == start { on = 1; next } /^```/ { if (on)
 block cpp > "$work/main.cpp"
 block cmake > "$work/CMakeLists.txt"
 block text > "$work/expected"
+block sh > "$work/install.sh"
 ln -s "$root" "$work/tarn-engine-base"
 
 cmake -S "$work" -B "$work/build" -G Ninja -DCMAKE_CXX_COMPILER="$compiler" \
@@ -32,10 +34,15 @@ if grep -E '_test\.cpp|document_road' "$work/build/compile_commands.json"; then
     exit 1
 fi
 for test in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`[A-Z][A-Za-z]+\.[A-Z][A-Za-z]+`' | tr -d '`'); do
-    grep -qE "^TEST(_F)?\(${test%.*}, ${test#*.}\)" "$root"/tests/*_test.cpp || { echo "no such test: $test"; exit 1; }
+    grep -qE "^TEST(_F)?\(${test%.*}, ${test#*.}\)" "$root"/tests/*_test.cpp "$root"/tests/*/*_test.cpp || { echo "no such test: $test"; exit 1; }
 done
 for script in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`(scripts/[a-z]+|\.ci/run)' | tr -d '`'); do
     [ -x "$root/$script" ] || { echo "no such script: $script"; exit 1; }
 done
+mkdir "$work/sources"
+cp -R "$root/CMakeLists.txt" "$root/LICENSE" "$root/Engine" "$root/cmake" "$root/tools" "$work/sources"
+(cd "$work/sources" && HOME=$work CXX=$compiler sh -eu ../install.sh) > "$work/log" || { cat "$work/log"; exit 1; }
+for file in include/Engine/Base/value.h share/doc/tarn-engine-base/LICENSE; do [ -e "$work/tarn/$file" ]; done
+if find "$work/tarn" -name 'changelog*' | grep .; then exit 1; fi
 lines=$(wc -l < "$work/main.cpp")
 echo "README.md: $lines lines compile and print what they say"

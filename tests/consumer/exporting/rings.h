@@ -1,0 +1,8 @@
+#ifndef RINGS_H
+#define RINGS_H
+
+#include <Engine/Base/path.h>
+
+tarn::engine::Path ring(double inner, double outer);
+
+#endif
