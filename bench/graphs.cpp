@@ -16,11 +16,6 @@ namespace {
 
 constexpr std::size_t kChildren = 10;
 
-template <class T>
-Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-
 Port port(unsigned long long id, unsigned long long tag) {
     Port result;
     result.id = id;
@@ -36,8 +31,8 @@ Patch tree(std::size_t size, unsigned long long& next) {
     Patch patch;
     patch.id = ++next;
     patch.name = "patch " + std::to_string(patch.id);
-    patch.inputs = listOf<Port>({port(patch.id * 2, 1)});
-    patch.outputs = listOf<Port>({port(patch.id * 2 + 1, 1)});
+    patch.inputs = arrayOf<Port>({port(patch.id * 2, 1)});
+    patch.outputs = arrayOf<Port>({port(patch.id * 2 + 1, 1)});
     std::vector<Patch> children;
     std::size_t rest = size - 1;
     for (std::size_t i = 0; i < kChildren && rest > 0; ++i) {
@@ -51,8 +46,8 @@ Patch tree(std::size_t size, unsigned long long& next) {
         unsigned long long const to = children[i].id;
         connections.push_back({from, from * 2 + 1, to, to * 2});
     }
-    patch.children = listOf(std::move(children));
-    patch.connections = listOf(std::move(connections));
+    patch.children = arrayOf(std::move(children));
+    patch.connections = arrayOf(std::move(connections));
     return patch;
 }
 

@@ -3,29 +3,15 @@
 //     easing_by_name "Cubic Out" Bounce
 
 #include <Engine/Base/easing.h>
-#include <Engine/Base/optional.h>
 
-#include <algorithm>
 #include <iostream>
 
 using namespace tarn::engine;
 
-namespace {
-
-// Nothing for a name that no curve has. A name stands at its enumerator's position.
-Optional<EasingFunction> easingFunctionByName(std::string const& name) {
-    std::vector<std::string> const names = easingFunctionNames();
-    auto const found = std::find(names.begin(), names.end(), name);
-    if (found == names.end()) return {};
-    return EasingFunction(found - names.begin());
-}
-
-}  // namespace
-
 int main(int argc, char** argv) {
     int unknown = 0;
     for (int i = 1; i < argc; ++i) {
-        Optional<EasingFunction> const function = easingFunctionByName(argv[i]);
+        Optional<EasingFunction> const function = stringToEasingFunction(argv[i]);
         if (function) {
             std::cout << argv[i] << " is number " << static_cast<int>(*function)
                       << ", and half way " << ease(*function, 0.0, 100.0, 0.5) << "\n";

@@ -62,11 +62,6 @@ void writePatch(std::ostream& stream, Patch const& patch, std::string const& pla
     if (isGroup) stream << "}\n";
 }
 
-template <class T>
-Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-
 }  // namespace
 
 int main() {
@@ -77,19 +72,19 @@ int main() {
     Patch time;
     time.id = 2;
     time.name = "time";
-    time.outputs = listOf<Port>({{21, 1, "seconds", {}, {}, {}}});
-    time.children = listOf<Patch>({clock});
+    time.outputs = arrayOf<Port>({{21, 1, "seconds", {}, {}, {}}});
+    time.children = arrayOf<Patch>({clock});
 
     Patch ring;
     ring.id = 4;
     ring.name = "ring <round>";
-    ring.inputs = listOf<Port>({{41, 1, "radius", {}, {}, {}}});
+    ring.inputs = arrayOf<Port>({{41, 1, "radius", {}, {}, {}}});
 
     Patch root;
     root.id = 1;
     root.name = "pulsing ring";
-    root.children = listOf<Patch>({time, ring});
-    root.connections = listOf<Connection>({{2, 21, 4, 41}});
+    root.children = arrayOf<Patch>({time, ring});
+    root.connections = arrayOf<Connection>({{2, 21, 4, 41}});
 
     std::cout << "digraph {\nnode [shape=record];\n";
     writePatch(std::cout, root, "1");

@@ -154,6 +154,18 @@ TEST(EasingFunction, HasItsNumberAndItsName) {
     static_assert(std::is_same_v<std::underlying_type_t<EF>, std::int32_t>);
 }
 
+TEST(EasingFunction, IsFoundByItsName) {
+    std::vector<std::string> const names = easingFunctionNames();
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        EXPECT_EQ(stringToEasingFunction(names[i]), EasingFunction(i)) << names[i];
+    }
+    for (char const* name :
+         {"", "linear", "Linear ", " Linear", "Cubic", "Cubic In-out", "Bounce"}) {
+        EXPECT_FALSE(stringToEasingFunction(name).hasValue()) << name;
+    }
+    EXPECT_FALSE(stringToEasingFunction(std::string("Linear\0", 7)).hasValue());
+}
+
 TEST(Ease, GivesKnownPoints) {
     struct Row {
         EF function;

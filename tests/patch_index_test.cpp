@@ -1,6 +1,7 @@
 #include <Engine/Base/patch_index.h>
 
 #include "support/allocations.h"
+#include "support/death.h"
 #include "support/graph_model.h"
 #include "support/graphs.h"
 #include "support/random.h"
@@ -54,6 +55,28 @@ Patch smallGraph() {
 }
 
 }  // namespace
+
+TEST(PatchIndexDeathTest, ANullListIsNamed) {
+    struct Row {
+        char const* condition;
+        void (*damage)(Patch&);
+    };
+    for (Row const& row : {Row{"inputs != nullptr", [](Patch& p) { p.inputs = nullptr; }},
+                           Row{"outputs != nullptr", [](Patch& p) { p.outputs = nullptr; }},
+                           Row{"connections != nullptr", [](Patch& p) { p.connections = nullptr; }},
+                           Row{"children != nullptr", [](Patch& p) { p.children = nullptr; }}}) {
+        SCOPED_TRACE(row.condition);
+        Patch child;
+        child.id = 2;
+        row.damage(child);
+        Patch root{1};
+        root.children = arrayOf({child});
+        EXPECT_ENDS(PatchIndex{root},
+                    tests::failedAssertion(row.condition, "elementsOf", "Engine/Base/patch"));
+        EXPECT_ENDS(PatchIndex{child},
+                    tests::failedAssertion(row.condition, "elementsOf", "Engine/Base/patch"));
+    }
+}
 
 TEST(PatchIndex, AnswersAboutASmallGraph) {
     PatchIndex const index(smallGraph());

@@ -3,6 +3,7 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/death.h"
 #include "support/graph_model.h"
 #include "support/graphs.h"
 #include "support/random.h"
@@ -161,6 +162,75 @@ TEST(Connection, EqualsAndHashesByAllFields) {
     }
 }
 
+TEST(Patch, SharesItsEmptyListsAndAllocatesNothing) {
+    Patch const first;  // What is made at first use.
+    tests::AllocationCounter counter;
+    {
+        Patch const patch;
+        Patch const copy = patch;
+        Port const port;
+        EXPECT_EQ(patch.inputs, first.inputs);
+        EXPECT_EQ(copy.outputs, first.inputs);
+        EXPECT_EQ(patch.children, first.children);
+        EXPECT_EQ(patch.connections, first.connections);
+        EXPECT_TRUE(patch.inputs != nullptr && patch.inputs->empty());
+        EXPECT_TRUE(patch.children != nullptr && patch.children->empty());
+        EXPECT_TRUE(patch.connections != nullptr && patch.connections->empty());
+        // Without a count that threads would fight over.
+        EXPECT_EQ(patch.inputs.use_count(), 0);
+    }
+    EXPECT_EQ(counter.count(), 0u);
+}
+
+TEST(Array, IsMadeOfAVectorOrInBraces) {
+    Array<Port> const ofVector = arrayOf(std::vector<Port>{Port{1}, Port{2}});
+    EXPECT_EQ(ofVector->size(), 2u);
+    EXPECT_EQ((*ofVector)[1].id, 2u);
+    EXPECT_EQ(*arrayOf<Port>({Port{1}, Port{2}}), *ofVector);
+    EXPECT_EQ(arrayOf<Port>({})->size(), 0u);
+    std::vector<Port> ports{Port{1}};
+    Port const* const before = ports.data();
+    EXPECT_EQ(arrayOf(std::move(ports))->data(), before);
+}
+
+TEST(Map, TakesWhateverCanBeInvoked) {
+    Array<Port> const list = arrayOf<Port>({Port{7}, Port{8, 0, "second"}});
+    EXPECT_EQ(*map(&Port::id, list), (std::vector<unsigned long long>{7, 8}));
+    EXPECT_EQ(*map(&Port::name, list), (std::vector<std::string>{"", "second"}));
+    auto const twice = [](Port const& port) { return 2 * port.id; };
+    EXPECT_EQ(*map(twice, list), (std::vector<unsigned long long>{14, 16}));
+}
+
+TEST(PatchDeathTest, ANullListIsNamed) {
+    auto const said = [](char const* condition) {
+        return tests::failedAssertion(condition, "elementsOf", "Engine/Base/patch");
+    };
+    Patch const noInputs{1, 2, "", {}, "", {}};
+    Patch noOutputs;
+    noOutputs.outputs = nullptr;
+    Patch noConnections;
+    noConnections.connections = nullptr;
+    Patch noChildren;
+    noChildren.children = nullptr;
+    std::ostringstream stream;
+    EXPECT_ENDS(inPortForTag(noInputs, 1), said("inputs != nullptr"));
+    EXPECT_ENDS(outPortForTag(noOutputs, 1), said("outputs != nullptr"));
+    EXPECT_ENDS(findPatchRecursive(noChildren, 7), said("children != nullptr"));
+    EXPECT_ENDS(findIncomingConnectionToPort(noConnections, 7), said("connections != nullptr"));
+    EXPECT_ENDS(findOutgoingConnectionsFromPatch(noConnections, 7), said("connections != nullptr"));
+    EXPECT_ENDS(findOutgoingConnectionsFromPort(noChildren, 7), said("children != nullptr"));
+    EXPECT_ENDS(static_cast<void>(noInputs == Patch{1, 2}), said("inputs != nullptr"));
+    EXPECT_ENDS(static_cast<void>(Patch() == noChildren), said("children != nullptr"));
+    EXPECT_ENDS(stream << noInputs, said("inputs != nullptr"));
+    EXPECT_ENDS(stream << noConnections, said("connections != nullptr"));
+    EXPECT_ENDS(EvalPatch{noOutputs}, said("outputs != nullptr"));
+    EXPECT_ENDS(EvalPatch{noChildren}, said("children != nullptr"));
+    EXPECT_ENDS(map(toEvalPort, Array<Port>()), said("list != nullptr"));
+    EvalPatch noEvalChildren;
+    noEvalChildren.children = nullptr;
+    EXPECT_ENDS(findInputPort(noEvalChildren, 1), said("children != nullptr"));
+}
+
 TEST(Patch, EqualsFieldByField) {
     auto const withAttributes = [] {
         Patch p = document();
@@ -179,27 +249,27 @@ TEST(Patch, EqualsFieldByField) {
              Row{"descriptor", [](Patch& p) { p.descriptor = "other"; }, false},
              Row{"name", [](Patch& p) { p.name = "other"; }, false},
              Row{"model layer", [](Patch& p) { p.modelLayer.id = 9; }, false},
-             Row{"inputs", [](Patch& p) { p.inputs = listOf<Port>({port(9)}); }, false},
-             Row{"outputs", [](Patch& p) { p.outputs = listOf<Port>({port(9)}); }, false},
-             Row{"connections", [](Patch& p) { p.connections = listOf<Connection>({}); }, false},
+             Row{"inputs", [](Patch& p) { p.inputs = arrayOf<Port>({port(9)}); }, false},
+             Row{"outputs", [](Patch& p) { p.outputs = arrayOf<Port>({port(9)}); }, false},
+             Row{"connections", [](Patch& p) { p.connections = arrayOf<Connection>({}); }, false},
              Row{"order of connections",
                  [](Patch& p) {
-                     p.connections = listOf<Connection>({{2, 21, 2, 12}, {2, 21, 3, 31}});
+                     p.connections = arrayOf<Connection>({{2, 21, 2, 12}, {2, 21, 3, 31}});
                  },
                  false},
              Row{"other end of a connection",
                  [](Patch& p) {
-                     p.connections = listOf<Connection>({{2, 21, 3, 31}, {2, 21, 9, 12}});
+                     p.connections = arrayOf<Connection>({{2, 21, 3, 31}, {2, 21, 9, 12}});
                  },
                  false},
              Row{"other start of a connection",
                  [](Patch& p) {
-                     p.connections = listOf<Connection>({{9, 21, 3, 31}, {2, 21, 2, 12}});
+                     p.connections = arrayOf<Connection>({{9, 21, 3, 31}, {2, 21, 2, 12}});
                  },
                  false},
              Row{"other ports of a connection",
                  [](Patch& p) {
-                     p.connections = listOf<Connection>({{2, 21, 3, 32}, {2, 22, 2, 12}});
+                     p.connections = arrayOf<Connection>({{2, 21, 3, 32}, {2, 22, 2, 12}});
                  },
                  false},
              Row{"another attribute", [](Patch& p) { p.attributes["c"] = 1; }, false},
@@ -209,28 +279,28 @@ TEST(Patch, EqualsFieldByField) {
                      p.attributes = {{"A", 1}, {"b", "two"}};
                  },
                  false},
-             Row{"fewer children", [](Patch& p) { p.children = listOf<Patch>({}); }, false},
+             Row{"fewer children", [](Patch& p) { p.children = arrayOf<Patch>({}); }, false},
              Row{"grandchild's port",
                  [](Patch& p) {
                      Patch middle = p.children->at(0);
                      Patch leaf = middle.children->at(0);
                      Port changed = leaf.inputs->at(0);
                      changed.attributes["x"] = 0;
-                     leaf.inputs = listOf<Port>({changed});
-                     middle.children = listOf<Patch>({leaf, middle.children->at(1)});
-                     p.children = listOf<Patch>({middle, p.children->at(1)});
+                     leaf.inputs = arrayOf<Port>({changed});
+                     middle.children = arrayOf<Patch>({leaf, middle.children->at(1)});
+                     p.children = arrayOf<Patch>({middle, p.children->at(1)});
                  },
                  false},
              Row{"grandchild's inputs in another order",
                  [](Patch& p) {
                      Patch middle = p.children->at(0);
-                     middle.inputs = listOf<Port>({middle.inputs->at(1), middle.inputs->at(0)});
-                     p.children = listOf<Patch>({middle, p.children->at(1)});
+                     middle.inputs = arrayOf<Port>({middle.inputs->at(1), middle.inputs->at(0)});
+                     p.children = arrayOf<Patch>({middle, p.children->at(1)});
                  },
                  false},
              Row{"order of children",
                  [](Patch& p) {
-                     p.children = listOf<Patch>({p.children->at(1), p.children->at(0)});
+                     p.children = arrayOf<Patch>({p.children->at(1), p.children->at(0)});
                  },
                  false},
          }) {
@@ -249,9 +319,9 @@ TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
     nan.defaultValue = double(NAN);
     for (Array<Port> Patch::*ports : {&Patch::inputs, &Patch::outputs}) {
         Patch a;
-        a.*ports = listOf<Port>({nan});
+        a.*ports = arrayOf<Port>({nan});
         Patch b;
-        b.*ports = listOf<Port>({nan});
+        b.*ports = arrayOf<Port>({nan});
         EXPECT_FALSE(a == b);
         b.*ports = a.*ports;
         EXPECT_TRUE(a == b);
@@ -262,7 +332,7 @@ TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
         EXPECT_TRUE(c == patch(1, {a}));
         EXPECT_FALSE(c == patch(1, {[&] {
                                     Patch d;
-                                    d.*ports = listOf<Port>({nan});
+                                    d.*ports = arrayOf<Port>({nan});
                                     return d;
                                 }()}));
     }
@@ -363,7 +433,7 @@ TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
     source.modelLayer = {3, {{4, {}, {}}}, {{5, {}, {}}}};
     Patch child = source.children->at(1);
     child.modelLayer = {6, {{7, {}, {}}}, {{8, {}, {}}}};
-    source.children = listOf<Patch>({source.children->at(0), child});
+    source.children = arrayOf<Patch>({source.children->at(0), child});
     for (EvalPatch const& evaluated : {EvalPatch(source), toEvalPatch(source)}) {
         EXPECT_EQ(evaluated.id, 1u);
         EXPECT_EQ(evaluated.builtin, 77u);
@@ -466,14 +536,14 @@ TEST(EvalPatch, EqualsFieldByField) {
 }
 
 TEST(Map, AppliesAFunctionInOrderWithOneAllocationForTheList) {
-    Array<Port> const ports = listOf<Port>({port(1), port(2), port(3)});
+    Array<Port> const ports = arrayOf<Port>({port(1), port(2), port(3)});
     MutableArray<unsigned long long> const ids =
         map([](Port const& p) { return p.id * 10; }, ports);
     EXPECT_EQ(*ids, (std::vector<unsigned long long>{10, 20, 30}));
     tests::AllocationCounter counter;
     EXPECT_EQ(map([](Port const& p) { return p.id; }, ports)->size(), 3u);
     EXPECT_EQ(counter.count(), 2u);  // The elements, and the list with its count.
-    MutableArray<EvalPort> const none = map(toEvalPort, listOf<Port>({}));
+    MutableArray<EvalPort> const none = map(toEvalPort, arrayOf<Port>({}));
     ASSERT_NE(none, nullptr);
     EXPECT_TRUE(none->empty());
 }

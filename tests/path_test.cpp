@@ -60,6 +60,16 @@ TEST(PathInstruction, HasItsNumberAndItsName) {
     static_assert(std::is_same_v<std::underlying_type_t<PathInstruction>, unsigned char>);
 }
 
+TEST(PathInstruction, IsParsedWhereTheNameMayBeAnything) {
+    for (unsigned char i = 0; i < 5; ++i) {
+        EXPECT_EQ(parsePathInstruction(pathInstructionToString(PathInstruction(i))),
+                  PathInstruction(i));
+    }
+    for (char const* name : {"Close", "close ", " close", "", "moveto", "curve"}) {
+        EXPECT_FALSE(parsePathInstruction(name).hasValue()) << name;
+    }
+}
+
 TEST(PathInstructionDeathTest, HasNoOtherNames) {
     for (char const* name : {"Close", "close ", " close", "", "moveto", "curve"}) {
         SCOPED_TRACE(name);

@@ -1,6 +1,7 @@
 #include <Engine/Base/points.h>
 
 #include "support/allocations.h"
+#include "support/death.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>
@@ -104,6 +105,56 @@ TEST(Points, OfUpToThreeAllocateNothing) {
     EXPECT_EQ(counter.count(), 1u);
     static_assert(sizeof(Points) <= 72);
 }
+
+TEST(Points, AreMadeInPlaceFromNumbersOfAnyKind) {
+    Points points;
+    FloatVec2& made = points.emplace_back(1, 2);
+    EXPECT_EQ(made, (FloatVec2{1, 2}));
+    points.emplace_back(2.5f, 3LL);
+    points.emplace_back(7);
+    points.emplace_back();
+    points.emplace(points.begin(), 9, 8u);
+    EXPECT_EQ(points, (Points{{9, 8}, {1, 2}, {2.5, 3}, {7, 0}, {0, 0}}));
+}
+
+TEST(Points, AreErasedByValueAndByPredicate) {
+    Points points{{1, 2}, {3, 4}, {1, 2}, {0.0, 5}, {-0.0, 5}, {NAN, 0}};
+    EXPECT_EQ(erase(points, FloatVec2{1, 2}), 2u);
+    EXPECT_EQ(erase(points, FloatVec2{-0.0, 5}), 2u);
+    EXPECT_EQ(erase(points, FloatVec2{NAN, 0}), 0u);
+    EXPECT_EQ(points.size(), 2u);
+    EXPECT_EQ(erase(points, points.front()), 1u);
+    EXPECT_EQ(erase_if(points, [](FloatVec2 const& p) { return p.y == 0; }), 1u);
+    EXPECT_TRUE(points.empty());
+    EXPECT_EQ(erase_if(points, [](FloatVec2 const&) { return true; }), 0u);
+}
+
+TEST(Points, FailNowhereThatAVectorDoesNot) {
+    Points points;
+    static_assert(
+        noexcept(points.begin(), points.end(), points.cbegin(), points.rbegin(), points.crend()));
+    static_assert(noexcept(points.size(), points.empty(), points.capacity(), points.max_size()));
+    static_assert(noexcept(points.data(), points.clear(), points.swap(points)));
+    static_assert(std::is_nothrow_default_constructible_v<Points>);
+    static_assert(std::is_nothrow_move_assignable_v<Points>);
+}
+
+#if defined(_GLIBCXX_ASSERTIONS)
+TEST(PointsDeathTest, CheckTheirIndicesWhereAVectorDoes) {
+    Points points{{1, 2}, {3, 4}};
+    Points const constant;
+    Points empty;
+    auto const said = [](char const* condition, char const* function) {
+        return tests::failedAssertion(condition, function, "Engine/Base/points");
+    };
+    EXPECT_ENDS(points[2] = FloatVec2(), said("i < size()", "operator[]"));
+    EXPECT_ENDS(static_cast<void>(constant[0]), said("i < size()", "operator[]"));
+    EXPECT_ENDS(static_cast<void>(empty.front()), said("!empty()", "front"));
+    EXPECT_ENDS(static_cast<void>(constant.back()), said("!empty()", "back"));
+    EXPECT_ENDS(empty.pop_back(), said("!empty()", "pop_back"));
+    EXPECT_ENDS(points.erase(points.end()), said("last <= end()", "erase"));
+}
+#endif
 
 TEST(Points, KeepRoomUntilTheyShrink) {
     EXPECT_EQ(Points().max_size(), sizeof(std::size_t) == 8 ? 4294967295u : 134217727u);

@@ -11,6 +11,7 @@
 #include <climits>
 #include <cmath>
 #include <functional>
+#include <sstream>
 
 using namespace tarn::engine;
 
@@ -393,6 +394,155 @@ TEST(Unstructured, InAValueIsACopyOfItsOwn) {
     Value const value = tree;
     tree = 5;
     EXPECT_EQ(*value.ifUnstructured(), Unstructured(Map{{"a", 1}}));
+}
+
+Unstructured settings() {
+    Unstructured::Map render;
+    render["size"] = Unstructured::Array{640, 480.0};
+    render["scale"] = 1.5;
+    render["name"] = "preview";
+    render["alpha"] = 1;
+    render["owner"] = 7u;
+    render["none"] = Unstructured();
+    Unstructured::Map root;
+    root["render"] = std::move(render);
+    root[""] = "the empty key";
+    return root;
+}
+
+TEST(Unstructured, FindsItsElements) {
+    Unstructured const data = settings();
+    Unstructured const* const render = data.find("render");
+    ASSERT_NE(render, nullptr);
+    EXPECT_EQ(render, &data.ifMap()->at("render"));
+    EXPECT_EQ(data.find(""), &data.ifMap()->at(""));
+    EXPECT_EQ(data.find("Render"), nullptr);
+    EXPECT_EQ(data.find(0), nullptr);
+    Unstructured const* const size = render->find("size");
+    ASSERT_NE(size, nullptr);
+    EXPECT_EQ(*size->find(0), Unstructured(640));
+    EXPECT_EQ(size->find(1), &size->ifArray()->back());
+    EXPECT_EQ(size->find(2), nullptr);
+    EXPECT_EQ(size->find("0"), nullptr);
+    for (Unstructured const& scalar : {Unstructured(), Unstructured(1), Unstructured(1u),
+                                       Unstructured(1.0), Unstructured("text")}) {
+        EXPECT_EQ(scalar.find("x"), nullptr);
+        EXPECT_EQ(scalar.find(0), nullptr);
+        EXPECT_EQ(scalar.find({"x", 0}), nullptr);
+        EXPECT_EQ(scalar.find({}), &scalar);
+    }
+}
+
+TEST(Unstructured, FindsAlongAPath) {
+    Unstructured const data = settings();
+    Unstructured const* const size = data.find("render")->find("size");
+    std::string const key = "size";
+    EXPECT_EQ(data.find({"render", "size", 0}), size->find(0));
+    EXPECT_EQ(data.find({"render", key, std::size_t(1)}), size->find(1));
+    EXPECT_EQ(data.find({"render", "size"}), size);
+    EXPECT_EQ(data.find({"render"}), data.find("render"));
+    EXPECT_EQ(data.find({}), &data);
+    EXPECT_EQ(data.find({"render", "size", 2}), nullptr);
+    EXPECT_EQ(data.find({"render", "size", -1}), nullptr);
+    EXPECT_EQ(data.find({"render", 0}), nullptr);
+    EXPECT_EQ(data.find({"render", "size", "0"}), nullptr);
+    EXPECT_EQ(data.find({"nothing", "size", 0}), nullptr);
+    EXPECT_EQ(data.find({"render", "scale", "deeper"}), nullptr);
+}
+
+TEST(Unstructured, ReadsWithADefaultAndTellsWhatItFound) {
+    using Lookup = Unstructured::Lookup;
+    Unstructured const data = settings();
+    struct Row {
+        char const* key;
+        double number;
+        Lookup numberLookup;
+        long long integer;
+        Lookup integerLookup;
+        bool truth;
+        Lookup truthLookup;
+        char const* text;
+        Lookup textLookup;
+    };
+    auto const wrong = Lookup::WrongKind;
+    auto const found = Lookup::Found;
+    auto const missing = Lookup::Missing;
+    for (Row const& row : {
+             Row{"size", 9, wrong, 9, wrong, true, wrong, "else", wrong},
+             Row{"scale", 1.5, found, 9, wrong, true, wrong, "else", wrong},
+             Row{"name", 9, wrong, 9, wrong, true, wrong, "preview", found},
+             Row{"alpha", 1, found, 1, found, true, found, "else", wrong},
+             Row{"owner", 9, wrong, 9, wrong, true, wrong, "else", wrong},
+             Row{"none", 9, wrong, 9, wrong, true, wrong, "else", wrong},
+             Row{"other", 9, missing, 9, missing, true, missing, "else", missing},
+         }) {
+        SCOPED_TRACE(row.key);
+        Lookup lookup = Lookup::Found;
+        EXPECT_EQ(data.numberAt({"render", row.key}, 9, &lookup), row.number);
+        EXPECT_EQ(lookup, row.numberLookup);
+        EXPECT_EQ(data.integerAt({"render", row.key}, 9, &lookup), row.integer);
+        EXPECT_EQ(lookup, row.integerLookup);
+        EXPECT_EQ(data.boolAt({"render", row.key}, true, &lookup), row.truth);
+        EXPECT_EQ(lookup, row.truthLookup);
+        EXPECT_EQ(data.stringAt({"render", row.key}, "else", &lookup), row.text);
+        EXPECT_EQ(lookup, row.textLookup);
+        EXPECT_EQ(data.numberAt({"render", row.key}, 9), row.number);
+    }
+    Lookup lookup = Lookup::Missing;
+    EXPECT_EQ(data.integerAt({"render", "size", 1}, 9, &lookup), 480);
+    EXPECT_EQ(lookup, Lookup::Found);
+    EXPECT_EQ(Unstructured(0).boolAt({}, true), false);
+    EXPECT_EQ(Unstructured(2).boolAt({}, true, &lookup), true);
+    EXPECT_EQ(lookup, Lookup::WrongKind);
+    struct Double {
+        char const* what;
+        double in;
+        long long out;
+    };
+    for (Double const& row : {Double{"whole", -3.0, -3}, Double{"with a fraction", 2.5, 9},
+                              Double{"too large", 9223372036854775808.0, 9},
+                              Double{"the smallest", -9223372036854775808.0, LLONG_MIN},
+                              Double{"not a number", NAN, 9}, Double{"infinity", INFINITY, 9}}) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(Unstructured(row.in).integerAt({}, 9), row.out);
+    }
+}
+
+TEST(Unstructured, KnowsItsKindAndItsSize) {
+    struct Row {
+        Unstructured data;
+        Kind kind;
+        char const* name;
+        std::size_t size;
+        bool isNumber;
+    };
+    for (Row const& row : {
+             Row{{}, Kind::Null, "null", 0, false},
+             Row{Unstructured::Map{{"a", 1}, {"b", 2}}, Kind::Map, "map", 2, false},
+             Row{Unstructured::Map(), Kind::Map, "map", 0, false},
+             Row{Unstructured::Array{1, 2, 3}, Kind::Array, "array", 3, false},
+             Row{Unstructured::Array(), Kind::Array, "array", 0, false},
+             Row{2.5, Kind::Float, "float", 0, true},
+             Row{5, Kind::Integer, "integer", 0, true},
+             Row{5u, Kind::UnsignedInteger, "unsigned integer", 0, false},
+             Row{"text", Kind::String, "string", 0, false},
+         }) {
+        SCOPED_TRACE(row.name);
+        EXPECT_EQ(row.data.type(), row.kind);
+        EXPECT_EQ(to_string(row.kind), row.name);
+        std::ostringstream stream;
+        stream << row.kind;
+        EXPECT_EQ(stream.str(), row.name);
+        EXPECT_EQ(row.data.size(), row.size);
+        EXPECT_EQ(row.data.empty(), row.size == 0);
+        EXPECT_EQ(row.data.isNull(), row.kind == Kind::Null);
+        EXPECT_EQ(row.data.isMap(), row.kind == Kind::Map);
+        EXPECT_EQ(row.data.isArray(), row.kind == Kind::Array);
+        EXPECT_EQ(row.data.isNumber(), row.isNumber);
+        EXPECT_EQ(row.data.isIdentifier(), row.kind == Kind::UnsignedInteger);
+        EXPECT_EQ(row.data.isString(), row.kind == Kind::String);
+    }
+    EXPECT_EQ(to_string(Kind(7)), "Unstructured::Type(7)");
 }
 
 TEST(Unstructured, SurvivesFailingAllocations) {

@@ -16,8 +16,11 @@
 #include <cfenv>
 #include <climits>
 #include <cmath>
+#include <functional>
 #include <iomanip>
+#include <set>
 #include <sstream>
+#include <unordered_set>
 
 using namespace tarn::engine;
 
@@ -536,6 +539,193 @@ TEST(Value, ReadsStringsWithTheDecimalPointOfTheCLibrary) {
     ASSERT_TRUE(comma.isSet());
     EXPECT_EQ(double(Value("1,5")), 1.5);
     EXPECT_EQ(double(Value("1.5")), 1.0);
+}
+
+// Says what it is shown.
+struct Kinds {
+    std::string operator()(long long const& i) const { return "integer " + std::to_string(i); }
+    std::string operator()(double const& d) const { return "double " + to_string(Value(d)); }
+    std::string operator()(FloatVec2 const& v) const { return "vec2 " + to_string(Value(v)); }
+    std::string operator()(FloatVec3 const& v) const { return "vec3 " + to_string(Value(v)); }
+    std::string operator()(FloatVec4 const& v) const { return "vec4 " + to_string(Value(v)); }
+    std::string operator()(FloatMat4 const& m) const {
+        return "matrix " + to_string(Value(m.elements[0])) + to_string(Value(m.elements[1]));
+    }
+    std::string operator()(bool const& b) const { return b ? "true" : "false"; }
+    std::string operator()(Value::ImageID const& r) const {
+        return "image " + std::to_string(r.id);
+    }
+    std::string operator()(Value::VideoID const& r) const {
+        return "video " + std::to_string(r.id);
+    }
+    std::string operator()(Value::SoundID const& r) const {
+        return "sound " + std::to_string(r.id);
+    }
+    std::string operator()(Value::ModelID const& r) const {
+        return "model " + std::to_string(r.id);
+    }
+    std::string operator()(Path const& p) const {
+        return "path " + std::to_string(p.elements.size());
+    }
+    std::string operator()(Unstructured const& u) const {
+        return "data " + std::to_string(int(u.type()));
+    }
+    std::string operator()(std::string const& s) const { return "string " + s; }
+    template <class T>
+    std::string operator()(T const&) const = delete;
+};
+
+TEST(Value, ShowsAVisitorWhatItHolds) {
+    struct Row {
+        char const* what;
+        Value value;
+        char const* shown;
+    };
+    auto const null = [](auto pointer) {
+        Value value = pointer;
+        return value;
+    };
+    Value movedString("a text that is too long to be held in place");
+    Value const taken = std::move(movedString);
+    Value movedMatrix = FloatMat4{{7, 7}};
+    Value const takenMatrix = std::move(movedMatrix);
+    for (Row const& row : {
+             Row{"integer", 5, "integer 5"},
+             Row{"double", 2.5, "double 2.5"},
+             Row{"vec2", FloatVec2{1, 2}, "vec2 1, 2"},
+             Row{"vec3", FloatVec3{1, 2, 3}, "vec3 1, 2, 3"},
+             Row{"vec4", FloatVec4{1, 2, 3, 4}, "vec4 1, 2, 3, 4"},
+             Row{"matrix", FloatMat4{{7, 8}}, "matrix 78"},
+             Row{"truth", true, "true"},
+             Row{"image", Value::Image(7), "image 7"},
+             Row{"video", Value::Video(8), "video 8"},
+             Row{"sound", Value::Sound(9), "sound 9"},
+             Row{"model", Value::Model(10), "model 10"},
+             Row{"path", PathBuilder().close().build(), "path 1"},
+             Row{"data", Unstructured(1.5), "data 3"},
+             Row{"string", "text", "string text"},
+             Row{"null path", null(std::shared_ptr<Path const>()), "path 0"},
+             Row{"null data", null(std::shared_ptr<Unstructured const>()), "data 0"},
+             Row{"string moved from", movedString, "string "},
+             Row{"matrix moved from", movedMatrix, "matrix 10"},
+         }) {
+        SCOPED_TRACE(row.what);
+        EXPECT_EQ(row.value.visit(Kinds()), row.shown);
+    }
+    Value const held("payload");
+    EXPECT_EQ(held.visit([](auto const& content) { return static_cast<void const*>(&content); }),
+              held.ifString());
+    int calls = 0;
+    Value(1).visit([&calls](auto const&) { ++calls; });
+    EXPECT_EQ(calls, 1);
+}
+
+TEST(Value, HasAHashThatAgreesWithEquality) {
+    std::hash<Value> const hash;
+    FloatMat4 plus{{0.0}};
+    FloatMat4 minus{{-0.0}};
+    Unstructured::Map const map{{"a", 1}, {"b", Unstructured::Array{2.0, "x", Unstructured()}}};
+    Path const path = PathBuilder().circle({1, 2}, 3).build();
+    std::vector<Value> const values{
+        0,
+        1,
+        0.0,
+        -0.0,
+        1.0,
+        double(INFINITY),
+        FloatVec2{0.0, 1},
+        FloatVec2{-0.0, 1},
+        FloatVec3{0, 1, 2},
+        FloatVec4{0, 1, 2, -0.0},
+        FloatVec4{0, 1, 2, 0.0},
+        plus,
+        minus,
+        FloatMat4(plus),
+        true,
+        false,
+        Value::Image(1),
+        Value::Video(1),
+        Value::Sound(1),
+        Value::Model(1),
+        path,
+        Path(path),
+        Path(),
+        std::shared_ptr<Path const>(),
+        Unstructured(map),
+        Unstructured(Unstructured::Map(map)),
+        Unstructured(),
+        Unstructured(0.0),
+        Unstructured(-0.0),
+        Unstructured(1u),
+        std::shared_ptr<Unstructured const>(),
+        "text",
+        std::string("text"),
+        "",
+    };
+    std::size_t equal = 0;
+    for (Value const& a : values) {
+        for (Value const& b : values) {
+            if (!(a == b)) continue;
+            EXPECT_EQ(hash(a), hash(b)) << a << " and " << b;
+            ++equal;
+        }
+    }
+    EXPECT_EQ(equal, values.size() + 2 * 8);
+    // Not the same for everything: the different ones among them have as many hashes, nearly.
+    std::set<std::size_t> hashes;
+    for (Value const& value : values) hashes.insert(hash(value));
+    EXPECT_GE(hashes.size(), values.size() - 8 - 3);
+    static_assert(noexcept(hash(Value())));
+
+    std::unordered_set<Value> set{1, 1.0, 1, "text", "text"};
+    EXPECT_EQ(set.size(), 3u);
+    EXPECT_EQ(set.count(Value("text")), 1u);
+
+    tests::Random random(40);
+    for (int i = 0; i < 2000; ++i) {
+        double const d = random.anyDouble();
+        EXPECT_EQ(hash(Value(d)), hash(Value(d)));
+        EXPECT_EQ(hash(Value(FloatVec3{d, 1, -d})), hash(Value(FloatVec3{d, 1, -d})));
+    }
+}
+
+TEST(Value, FailsNowhereThatItCannotFail) {
+    static_assert(std::is_nothrow_default_constructible_v<Value>);
+    static_assert(std::is_nothrow_copy_constructible_v<Value>);
+    static_assert(std::is_nothrow_copy_assignable_v<Value>);
+    static_assert(std::is_nothrow_move_assignable_v<Value>);
+    static_assert(std::is_nothrow_constructible_v<Value, double>);
+    static_assert(std::is_nothrow_constructible_v<Value, int>);
+    static_assert(std::is_nothrow_constructible_v<Value, FloatVec4>);
+    static_assert(!std::is_nothrow_constructible_v<Value, char const*>);
+    static_assert(noexcept(double(std::declval<Value const&>())));
+    static_assert(noexcept((long long)(std::declval<Value const&>())));
+    static_assert(noexcept(FloatVec4(std::declval<Value const&>())));
+    static_assert(noexcept(std::declval<Value const&>().type()));
+    static_assert(noexcept(std::declval<Value const&>().ifPath()));
+    // Assigning between any two alternatives allocates nothing, so nothing can fail.
+    std::vector<Value> const values{
+        1, 2.5, FloatVec4(), FloatMat4(), true, Value::Model(3), Path(), "text", Unstructured()};
+    tests::AllocationCounter counter;
+    for (Value const& from : values) {
+        for (Value const& to : values) {
+            Value changed = from;
+            changed = to;
+            Value moved = from;
+            moved = std::move(changed);
+        }
+    }
+    EXPECT_EQ(counter.count(), 0u);
+}
+
+TEST(Type, IsWrittenByItsName) {
+    std::ostringstream stream;
+    for (int i = 0; i < 14; ++i) stream << Type(i) << " ";
+    stream << Type(14) << " " << Type(255);
+    EXPECT_EQ(
+        stream.str(),
+        "float vec2 vec3 vec4 mat4 boolean int image video sound path string model unstructured "
+        "Type(14) Type(255)");
 }
 
 TEST(Value, ReadsAsEveryVector) {

@@ -1,6 +1,6 @@
 // Engine/Base/comparison.h: comparisons of doubles that no flag of a caller's compiler bends.
 //
-//     bool equal = detail::equalNumbers(a, b);  // False for a NaN, with -ffast-math too.
+//     bool equal = detail::equalNumbers(0.0, -0.0);  // True; false for a NaN.
 
 #ifndef TARN_ENGINE_BASE_COMPARISON_H
 #define TARN_ENGINE_BASE_COMPARISON_H

@@ -158,6 +158,13 @@ std::vector<std::string> easingFunctionNames() {
     return std::vector<std::string>(kNames.begin(), kNames.end());
 }
 
+Optional<EasingFunction> stringToEasingFunction(std::string const& name) {
+    for (std::size_t i = 0; i < kNames.size(); ++i) {
+        if (kNames[i] == name) return EasingFunction(i);
+    }
+    return std::nullopt;
+}
+
 template <>
 double ease(EasingFunction function, double from, double to, double t) {
     return easeAlong(function, from, to, t);

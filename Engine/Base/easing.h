@@ -6,6 +6,7 @@
 #define TARN_ENGINE_BASE_EASING_H
 
 #include <Engine/Base/export.h>
+#include <Engine/Base/optional.h>
 #include <Engine/Base/value.h>
 
 #include <cstdint>
@@ -35,6 +36,9 @@ enum class EasingFunction : std::int32_t {
 /// The names that an editor shows, "Linear" to "Sinusoidal In-Out", at their enumerator's
 /// position. A new list at every call.
 TARN_ENGINE_BASE_EXPORT std::vector<std::string> easingFunctionNames();
+
+/// The curve of that name, byte by byte; empty for any other text.
+TARN_ENGINE_BASE_EXPORT Optional<EasingFunction> stringToEasingFunction(std::string const& name);
 
 /// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
 /// `FloatVec3` and `FloatVec4`; other types do not compile.

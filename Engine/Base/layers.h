@@ -19,9 +19,9 @@ namespace tarn::engine {
 struct ModelLayer {
     /// The layer, and those beneath it.
     unsigned long long id = 0;
-    std::vector<ModelLayer> children;
+    std::vector<ModelLayer> children = {};
     /// Compared and copied, but not part of the debug text.
-    std::vector<ModelLayer> additionalLayers;
+    std::vector<ModelLayer> additionalLayers = {};
 
     /// The same identifiers in the same trees.
     TARN_ENGINE_BASE_EXPORT bool operator==(ModelLayer const& other) const;
@@ -43,9 +43,9 @@ struct RenderLayer {
 /// for 10,000 levels of everything here; the text of n levels has about n * n / 2 dashes.
 struct RenderLayerHierarchy {
     /// The layer, those drawn ahead of it, and those nested in it.
-    RenderLayer layer;
-    std::vector<RenderLayerHierarchy> leadingLayers;
-    std::vector<RenderLayerHierarchy> children;
+    RenderLayer layer = {};
+    std::vector<RenderLayerHierarchy> leadingLayers = {};
+    std::vector<RenderLayerHierarchy> children = {};
 
     /// The same layers in the same trees.
     TARN_ENGINE_BASE_EXPORT bool operator==(RenderLayerHierarchy const& other) const;

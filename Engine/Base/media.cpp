@@ -1,5 +1,7 @@
 #include <Engine/Base/media.h>
 
+#include <Engine/Base/detail/immortal.h>
+
 #include <array>
 #include <cctype>
 #include <cstddef>
@@ -54,11 +56,11 @@ std::string extensionForKind(std::array<Extension<Kind>, count> const& table, Ki
 }  // namespace
 
 std::vector<std::string> const& keyboardTypes() {
-    static std::vector<std::string> const names{
-        "Default",    "ASCII Only",    "Numbers and Punctuation", "URL",         "Number Pad",
-        "Phone Pad",  "Name or Phone", "Email Address",           "Decimal Pad", "Twitter",
-        "Web Search", "ASCII Numbers"};
-    return names;
+    static detail::Immortal<std::vector<std::string>> const names(
+        {"Default", "ASCII Only", "Numbers and Punctuation", "URL", "Number Pad", "Phone Pad",
+         "Name or Phone", "Email Address", "Decimal Pad", "Twitter", "Web Search",
+         "ASCII Numbers"});
+    return names.value;
 }
 
 std::vector<std::string> cameraTypeNames() { return {"Front-Facing", "Rear-Facing"}; }

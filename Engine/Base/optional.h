@@ -22,17 +22,23 @@ class Optional {
 public:
     /// Empty.
     Optional() = default;
-    Optional(std::nullopt_t) {}
+    Optional(std::nullopt_t) noexcept {}
 
     /// Made from a `T` and from nothing that merely converts to one: an optional bound is
     /// written `Value(0.0)`, so that the alternative it holds is seen where it is chosen.
     template <class U, std::enable_if_t<std::is_same_v<std::decay_t<U>, T>, int> = 0>
     Optional(U&& value) : storage(std::forward<U>(value)) {}
 
+    /// From the standard's optional of the same `T`, and back on request.
+    template <class U, std::enable_if_t<std::is_same_v<U, std::optional<T>>, int> = 0>
+    Optional(U other) : storage(std::move(other)) {}
+    explicit operator std::optional<T>() const& { return storage; }
+    explicit operator std::optional<T>() && { return std::move(storage); }
+
     /// Whether there is a value.
-    bool hasValue() const { return storage.has_value(); }
-    bool has_value() const { return hasValue(); }
-    explicit operator bool() const { return hasValue(); }
+    bool hasValue() const noexcept { return storage.has_value(); }
+    bool has_value() const noexcept { return hasValue(); }
+    explicit operator bool() const noexcept { return hasValue(); }
 
     /// The value. Of an empty one it is an assertion failure.
     T& value() & {
@@ -57,14 +63,45 @@ public:
     T* operator->() { return &value(); }
     T const* operator->() const { return &value(); }
 
+    /// The value, or `other` where there is none.
+    T value_or(T other) const& { return hasValue() ? *storage : std::move(other); }
+    T value_or(T other) && { return hasValue() ? *std::move(storage) : std::move(other); }
+
+    /// Afterwards the value is `T(arguments...)`, made in place. Empty where making it throws.
+    template <class... Arguments>
+    T& emplace(Arguments&&... arguments) {
+        return storage.emplace(std::forward<Arguments>(arguments)...);
+    }
     /// Afterwards the optional is empty.
-    void reset() { storage.reset(); }
+    void reset() noexcept { storage.reset(); }
+    /// Afterwards each has what the other had. Throws where moving a `T` does.
+    void swap(Optional& other) noexcept(std::is_nothrow_swappable_v<std::optional<T>>) {
+        storage.swap(other.storage);
+    }
+    friend void swap(Optional& a, Optional& b) noexcept(noexcept(a.swap(b))) { a.swap(b); }
 
     /// Equal when both are empty, or when both are set to equal values.
     friend bool operator==(Optional const& a, Optional const& b) {
         return a.hasValue() == b.hasValue() && (!a.hasValue() || *a.storage == *b.storage);
     }
     friend bool operator!=(Optional const& a, Optional const& b) { return !(a == b); }
+    /// With a `T`, and nothing that merely converts to one: equal when there is a value, and it is.
+    template <class U, std::enable_if_t<std::is_same_v<U, T>, int> = 0>
+    friend bool operator==(Optional const& a, U const& b) {
+        return a.hasValue() && *a.storage == b;
+    }
+    template <class U, std::enable_if_t<std::is_same_v<U, T>, int> = 0>
+    friend bool operator==(U const& a, Optional const& b) {
+        return b == a;
+    }
+    template <class U, std::enable_if_t<std::is_same_v<U, T>, int> = 0>
+    friend bool operator!=(Optional const& a, U const& b) {
+        return !(a == b);
+    }
+    template <class U, std::enable_if_t<std::is_same_v<U, T>, int> = 0>
+    friend bool operator!=(U const& a, Optional const& b) {
+        return !(b == a);
+    }
 
 private:
     void check() const {

@@ -1,5 +1,7 @@
 #include <Engine/Base/patch.h>
 
+#include <Engine/Base/assertion.h>
+#include <Engine/Base/detail/immortal.h>
 #include <Engine/Base/detail/prefetch.h>
 
 #include <cstdint>
@@ -9,9 +11,30 @@ namespace tarn::engine {
 
 namespace {
 
+using detail::elementsOf;
+
+constexpr char kInputs[] = "inputs != nullptr";
+constexpr char kOutputs[] = "outputs != nullptr";
+constexpr char kConnections[] = "connections != nullptr";
+constexpr char kChildren[] = "children != nullptr";
+
 template <class List>
-bool listsEqual(List const& a, List const& b) {
-    return a == b || *a == *b;
+bool listsEqual(List const& a, List const& b, char const* condition) {
+    return a == b || elementsOf(a, condition) == elementsOf(b, condition);
+}
+
+// `map`, with a condition that names the list.
+template <class Function, class T>
+auto mapped(Function function, Array<T> const& list, char const* condition) {
+    static_cast<void>(elementsOf(list, condition));
+    return map(function, list);
+}
+
+// One for each type of element, without an owner.
+template <class T>
+Array<T> emptyList() noexcept {
+    static detail::Immortal<std::vector<T>> const list;
+    return Array<T>(std::shared_ptr<void>(), &list.value);
 }
 
 // Walks wait for memory: the list of a child that is a few places ahead is asked for early.
@@ -20,13 +43,13 @@ constexpr std::size_t kAhead = 6;
 // Below a patch that is not the one itself.
 template <class AnyPatch>
 AnyPatch const* findBelow(AnyPatch const& root, unsigned long long id) {
-    auto const& children = *root.children;
+    auto const& children = elementsOf(root.children, kChildren);
     for (AnyPatch const& child : children) {
         if (child.id == id) return &child;
     }
     for (std::size_t i = 0; i < children.size(); ++i) {
         if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].children.get());
-        if (children[i].children->empty()) continue;
+        if (elementsOf(children[i].children, kChildren).empty()) continue;
         if (AnyPatch const* found = findBelow(children[i], id)) return found;
     }
     return nullptr;
@@ -50,10 +73,13 @@ Element const* findByField(std::vector<Element> const& list, unsigned long long 
 
 // The port among those that `ports` names, of the patch, then of its children.
 EvalPort const* findPort(EvalPatch const& patch, MutableArray<EvalPort> EvalPatch::*ports,
-                         unsigned long long portId) {
-    if (EvalPort const* port = findByField(*(patch.*ports), &EvalPort::id, portId)) return port;
-    for (EvalPatch const& child : *patch.children) {
-        if (EvalPort const* port = findByField(*(child.*ports), &EvalPort::id, portId)) return port;
+                         char const* condition, unsigned long long portId) {
+    auto const among = [&](EvalPatch const& owner) {
+        return findByField(elementsOf(owner.*ports, condition), &EvalPort::id, portId);
+    };
+    if (EvalPort const* port = among(patch)) return port;
+    for (EvalPatch const& child : elementsOf(patch.children, kChildren)) {
+        if (EvalPort const* port = among(child)) return port;
     }
     return nullptr;
 }
@@ -62,7 +88,7 @@ std::unordered_set<Connection> connectionsByField(Patch const& patch,
                                                   unsigned long long Connection::*field,
                                                   unsigned long long wanted) {
     std::unordered_set<Connection> found;
-    for (Connection const& connection : *patch.connections) {
+    for (Connection const& connection : elementsOf(patch.connections, kConnections)) {
         if (connection.*field == wanted) found.insert(connection);
     }
     return found;
@@ -70,20 +96,33 @@ std::unordered_set<Connection> connectionsByField(Patch const& patch,
 
 // The first patch of the subtree, depth first, with a child that has the port among its outputs.
 Patch const* parentOfOutput(Patch const& root, unsigned long long portId) {
-    std::vector<Patch> const& children = *root.children;
+    std::vector<Patch> const& children = elementsOf(root.children, kChildren);
     for (std::size_t i = 0; i < children.size(); ++i) {
         if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].outputs.get());
-        if (findByField(*children[i].outputs, &Port::id, portId) != nullptr) return &root;
+        if (findByField(elementsOf(children[i].outputs, kOutputs), &Port::id, portId) != nullptr)
+            return &root;
     }
     for (std::size_t i = 0; i < children.size(); ++i) {
         if (i + kAhead < children.size()) detail::prefetch(children[i + kAhead].children.get());
-        if (children[i].children->empty()) continue;
+        if (elementsOf(children[i].children, kChildren).empty()) continue;
         if (Patch const* parent = parentOfOutput(children[i], portId)) return parent;
     }
     return nullptr;
 }
 
 }  // namespace
+
+namespace detail {
+
+Array<Port> emptyPorts() noexcept { return emptyList<Port>(); }
+Array<Connection> emptyConnections() noexcept { return emptyList<Connection>(); }
+Array<Patch> emptyPatches() noexcept { return emptyList<Patch>(); }
+
+void listIsNull(char const* condition) noexcept {
+    assertionFailed(condition, "elementsOf", "Engine/Base/patch", __LINE__);
+}
+
+}  // namespace detail
 
 bool Port::operator==(Port const& other) const {
     return id == other.id && tag == other.tag && name == other.name && typeInfo == other.typeInfo &&
@@ -99,9 +138,10 @@ bool Connection::operator!=(Connection const& other) const { return !(*this == o
 
 bool Patch::operator==(Patch const& other) const {
     return id == other.id && descriptor == other.descriptor && builtin == other.builtin &&
-           name == other.name && listsEqual(inputs, other.inputs) &&
-           listsEqual(outputs, other.outputs) && listsEqual(children, other.children) &&
-           modelLayer == other.modelLayer && listsEqual(connections, other.connections) &&
+           name == other.name && listsEqual(inputs, other.inputs, kInputs) &&
+           listsEqual(outputs, other.outputs, kOutputs) &&
+           listsEqual(children, other.children, kChildren) && modelLayer == other.modelLayer &&
+           listsEqual(connections, other.connections, kConnections) &&
            attributes == other.attributes;
 }
 bool Patch::operator!=(Patch const& other) const { return !(*this == other); }
@@ -125,10 +165,10 @@ EvalPatch::EvalPatch() = default;
 EvalPatch::EvalPatch(Patch const& patch)
     : id(patch.id),
       builtin(patch.builtin),
-      inputs(map(toEvalPort, patch.inputs)),
-      outputs(map(toEvalPort, patch.outputs)),
+      inputs(mapped(toEvalPort, patch.inputs, kInputs)),
+      outputs(mapped(toEvalPort, patch.outputs, kOutputs)),
       name(patch.name),
-      children(map(toEvalPatch, patch.children)),
+      children(mapped(toEvalPatch, patch.children, kChildren)),
       modelLayer(patch.modelLayer),
       hasInputCount(patch.attributes.count("inputCount") != 0),
       hasOutputCount(patch.attributes.count("outputCount") != 0) {}
@@ -136,8 +176,9 @@ EvalPatch::EvalPatch(Patch const& patch)
 bool EvalPatch::operator==(EvalPatch const& other) const {
     return id == other.id && builtin == other.builtin && name == other.name &&
            hasInputCount == other.hasInputCount && hasOutputCount == other.hasOutputCount &&
-           listsEqual(inputs, other.inputs) && listsEqual(outputs, other.outputs) &&
-           listsEqual(children, other.children) && modelLayer == other.modelLayer;
+           listsEqual(inputs, other.inputs, kInputs) &&
+           listsEqual(outputs, other.outputs, kOutputs) &&
+           listsEqual(children, other.children, kChildren) && modelLayer == other.modelLayer;
 }
 bool EvalPatch::operator!=(EvalPatch const& other) const { return !(*this == other); }
 
@@ -152,14 +193,15 @@ EvalPatch const* findPatchRecursive(EvalPatch const& root, unsigned long long id
 }
 
 EvalPort const* findInputPort(EvalPatch const& patch, unsigned long long portId) {
-    return findPort(patch, &EvalPatch::inputs, portId);
+    return findPort(patch, &EvalPatch::inputs, kInputs, portId);
 }
 EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long long portId) {
-    return findPort(patch, &EvalPatch::outputs, portId);
+    return findPort(patch, &EvalPatch::outputs, kOutputs, portId);
 }
 
 Optional<Connection> findIncomingConnectionToPort(Patch const& patch, unsigned long long portId) {
-    Connection const* const found = findByField(*patch.connections, &Connection::toPortId, portId);
+    Connection const* const found =
+        findByField(elementsOf(patch.connections, kConnections), &Connection::toPortId, portId);
     if (found == nullptr) return std::nullopt;
     return *found;
 }
@@ -187,16 +229,16 @@ std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root
 }
 
 Port const* inPortForTag(Patch const& patch, unsigned long long tag) {
-    return findByField(*patch.inputs, &Port::tag, tag);
+    return findByField(elementsOf(patch.inputs, kInputs), &Port::tag, tag);
 }
 EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long tag) {
-    return findByField(*patch.inputs, &EvalPort::tag, tag);
+    return findByField(elementsOf(patch.inputs, kInputs), &EvalPort::tag, tag);
 }
 Port const* outPortForTag(Patch const& patch, unsigned long long tag) {
-    return findByField(*patch.outputs, &Port::tag, tag);
+    return findByField(elementsOf(patch.outputs, kOutputs), &Port::tag, tag);
 }
 EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag) {
-    return findByField(*patch.outputs, &EvalPort::tag, tag);
+    return findByField(elementsOf(patch.outputs, kOutputs), &EvalPort::tag, tag);
 }
 
 std::ostream& operator<<(std::ostream& stream, Port const& port) {
@@ -211,12 +253,13 @@ std::ostream& operator<<(std::ostream& stream, Connection const& connection) {
 
 std::ostream& operator<<(std::ostream& stream, Patch const& patch) {
     stream << "[patch:" << patch.id << " name: " << patch.name << " builtin: " << patch.builtin;
-    if (patch.inputs->empty() && patch.outputs->empty()) stream << "]";
-    for (Array<Port> const& ports : {patch.inputs, patch.outputs}) {
-        for (Port const& port : *ports) stream << "  " << port << std::endl;
-    }
-    for (Patch const& child : *patch.children) stream << child << std::endl;
-    for (Connection const& connection : *patch.connections) stream << connection << std::endl;
+    if (elementsOf(patch.inputs, kInputs).empty() && elementsOf(patch.outputs, kOutputs).empty())
+        stream << "]";
+    for (Port const& port : *patch.inputs) stream << "  " << port << std::endl;
+    for (Port const& port : *patch.outputs) stream << "  " << port << std::endl;
+    for (Patch const& child : elementsOf(patch.children, kChildren)) stream << child << std::endl;
+    for (Connection const& connection : elementsOf(patch.connections, kConnections))
+        stream << connection << std::endl;
     return stream;
 }
 

@@ -14,6 +14,7 @@
 
 #include <cstddef>
 #include <functional>
+#include <initializer_list>
 #include <iosfwd>
 #include <map>
 #include <memory>
@@ -26,7 +27,9 @@
 namespace tarn::engine {
 
 /// A list that records share: copying a record copies the pointer. Never null in a record, except
-/// in one that was moved from, which is only to be assigned to or destroyed.
+/// in one that was moved from, which is only to be assigned to or destroyed. Where a list is null
+/// all the same (`{}` in braces makes one), whoever reads it first ends the program with an
+/// assertion failure that names it, such as `children != nullptr`.
 template <class T>
 using Array = std::shared_ptr<std::vector<T> const>;
 
@@ -34,16 +37,49 @@ using Array = std::shared_ptr<std::vector<T> const>;
 template <class T>
 using MutableArray = std::shared_ptr<std::vector<T>>;
 
+/// A list of these elements. One allocation, and what the elements take.
+template <class T>
+Array<T> arrayOf(std::vector<T> elements) {
+    return std::make_shared<std::vector<T> const>(std::move(elements));
+}
+template <class T>
+Array<T> arrayOf(std::initializer_list<T> elements) {
+    return std::make_shared<std::vector<T> const>(elements);
+}
+
+struct Port;
+struct Connection;
+struct Patch;
+
+namespace detail {
+
+// The empty lists that all new records share. They are never counted and never destroyed, so that
+// threads do not contend for them: `use_count()` is 0.
+TARN_ENGINE_BASE_EXPORT Array<Port> emptyPorts() noexcept;
+TARN_ENGINE_BASE_EXPORT Array<Connection> emptyConnections() noexcept;
+TARN_ENGINE_BASE_EXPORT Array<Patch> emptyPatches() noexcept;
+
+[[noreturn]] TARN_ENGINE_BASE_EXPORT void listIsNull(char const* condition) noexcept;
+
+// What a list has. A null list is an assertion failure with the condition, which names it.
+template <class Pointer>
+typename Pointer::element_type& elementsOf(Pointer const& list, char const* condition) {
+    if (!list) listIsNull(condition);
+    return *list;
+}
+
+}  // namespace detail
+
 /// An input or output of a patch.
 struct Port {
     /// Unique among all ports of a document.
     unsigned long long id = 0;
     /// Finds the port among those of its own patch.
     unsigned long long tag = 0;
-    std::string name;
-    TypeInfo typeInfo;
-    Value defaultValue;
-    std::map<std::string, Unstructured> attributes;
+    std::string name = {};
+    TypeInfo typeInfo = {};
+    Value defaultValue = {};
+    std::map<std::string, Unstructured> attributes = {};
 
     /// Field by field.
     TARN_ENGINE_BASE_EXPORT bool operator==(Port const& other) const;
@@ -85,15 +121,15 @@ struct Patch {
     /// The number of the built-in kind; the evaluator owns the table.
     unsigned long long builtin = 0;
     /// A second text; compared, but neither printed nor evaluated.
-    std::string descriptor;
-    ModelLayer modelLayer;
-    std::string name;
-    Array<Port> inputs = std::make_shared<std::vector<Port> const>();
-    Array<Port> outputs = std::make_shared<std::vector<Port> const>();
+    std::string descriptor = {};
+    ModelLayer modelLayer = {};
+    std::string name = {};
+    Array<Port> inputs = detail::emptyPorts();
+    Array<Port> outputs = detail::emptyPorts();
     /// "inputCount" and "outputCount" are the configured numbers of ports.
-    std::map<std::string, Unstructured> attributes;
-    Array<Connection> connections = std::make_shared<std::vector<Connection> const>();
-    Array<Patch> children = std::make_shared<std::vector<Patch> const>();
+    std::map<std::string, Unstructured> attributes = {};
+    Array<Connection> connections = detail::emptyConnections();
+    Array<Patch> children = detail::emptyPatches();
 
     /// Deep and in order. Lists that are one object are equal without a look at them.
     TARN_ENGINE_BASE_EXPORT bool operator==(Patch const& other) const;
@@ -154,7 +190,8 @@ static_assert(std::is_nothrow_move_constructible_v<EvalPatch>, "lists of patches
 TARN_ENGINE_BASE_EXPORT EvalPort toEvalPort(Port const& port);
 TARN_ENGINE_BASE_EXPORT EvalPatch toEvalPatch(Patch const& patch);
 
-/// A new list of what `function` gives for each element, in order; allocated once. Never null.
+/// A new list of what `std::invoke(function, element)` gives for each element, in order; allocated
+/// once. Never null: `map(&Port::id, list)` is a list of identifiers.
 template <class Function, class T>
 MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
                                                                           Array<T> const& list);
@@ -226,8 +263,11 @@ MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Functi
                                                                           Array<T> const& list) {
     using Result = std::decay_t<std::invoke_result_t<Function&, T const&>>;
     std::vector<Result> results;
-    results.reserve(list->size());
-    for (T const& element : *list) results.push_back(function(element));
+    std::vector<T> const& elements = detail::elementsOf(list, "list != nullptr");
+    results.reserve(elements.size());
+    for (T const& element : elements) {
+        results.push_back(std::invoke(function, element));
+    }
     return std::make_shared<std::vector<Result>>(std::move(results));
 }
 

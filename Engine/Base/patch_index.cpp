@@ -108,6 +108,19 @@ struct Record {
     std::uint32_t outgoing = kNone;
 };
 
+// An assertion failure for a record with a null list.
+void requireLists(EvalPatch const& patch) {
+    static_cast<void>(detail::elementsOf(patch.inputs, "inputs != nullptr"));
+    static_cast<void>(detail::elementsOf(patch.outputs, "outputs != nullptr"));
+    static_cast<void>(detail::elementsOf(patch.children, "children != nullptr"));
+}
+void requireLists(Patch const& patch) {
+    static_cast<void>(detail::elementsOf(patch.inputs, "inputs != nullptr"));
+    static_cast<void>(detail::elementsOf(patch.outputs, "outputs != nullptr"));
+    static_cast<void>(detail::elementsOf(patch.connections, "connections != nullptr"));
+    static_cast<void>(detail::elementsOf(patch.children, "children != nullptr"));
+}
+
 // Every patch in the order in which a search looks at it, and where to find it and its ports.
 template <class AnyPatch, class AnyPort>
 struct Graph {
@@ -118,6 +131,7 @@ struct Graph {
           outputs(portSlots(&AnyPatch::outputs)) {}
 
     static std::vector<Record<AnyPatch>> inSearchOrder(AnyPatch const& root) {
+        requireLists(root);
         std::vector<Record<AnyPatch>> found{{&root, kNone}};
         std::vector<std::uint32_t> toEnter{0};
         while (!toEnter.empty()) {
@@ -125,6 +139,7 @@ struct Graph {
             toEnter.pop_back();
             auto const first = static_cast<std::uint32_t>(found.size());
             for (AnyPatch const& child : *found[parent].patch->children) {
+                requireLists(child);
                 found.push_back({&child, parent});
             }
             requireCountable(found.size());

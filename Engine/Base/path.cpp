@@ -1,6 +1,7 @@
 #include <Engine/Base/path.h>
 
 #include <Engine/Base/assertion.h>
+#include <Engine/Base/detail/immortal.h>
 
 #include <algorithm>
 #include <array>
@@ -39,11 +40,17 @@ std::string pathInstructionToString(PathInstruction instruction) {
     return std::string(kInstructionNames[std::size_t(instruction)]);
 }
 
-PathInstruction stringToPathInstruction(std::string const& name) {
+Optional<PathInstruction> parsePathInstruction(std::string const& name) {
     for (std::size_t i = 0; i < kInstructionNames.size(); ++i) {
         if (kInstructionNames[i] == name) return PathInstruction(i);
     }
-    assertionFailed("0", __func__, kModule, __LINE__);
+    return std::nullopt;
+}
+
+PathInstruction stringToPathInstruction(std::string const& name) {
+    Optional<PathInstruction> const instruction = parsePathInstruction(name);
+    if (!instruction) assertionFailed("0", __func__, kModule, __LINE__);
+    return *instruction;
 }
 
 bool PathElement::operator==(PathElement const& other) const {
@@ -63,8 +70,9 @@ bool Path::operator==(Path const& other) const { return elements == other.elemen
 bool Path::operator!=(Path const& other) const { return !(*this == other); }
 
 std::shared_ptr<Path const> Path::EmptyPath() {
-    static std::shared_ptr<Path const> const emptyPathSharedPtr = std::make_shared<Path const>();
-    return emptyPathSharedPtr;
+    static detail::Immortal<std::shared_ptr<Path const>> const emptyPathSharedPtr(
+        std::make_shared<Path const>());
+    return emptyPathSharedPtr.value;
 }
 
 // Growth stays geometric over many calls.

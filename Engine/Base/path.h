@@ -7,6 +7,7 @@
 #define TARN_ENGINE_BASE_PATH_H
 
 #include <Engine/Base/export.h>
+#include <Engine/Base/optional.h>
 #include <Engine/Base/points.h>
 #include <Engine/Base/value.h>
 
@@ -34,12 +35,15 @@ TARN_ENGINE_BASE_EXPORT std::string pathInstructionToString(PathInstruction inst
 /// The inverse, byte by byte. Any other text is an assertion failure, with the condition `0`.
 TARN_ENGINE_BASE_EXPORT PathInstruction stringToPathInstruction(std::string const& name);
 
+/// The same, empty for any other text.
+TARN_ENGINE_BASE_EXPORT Optional<PathInstruction> parsePathInstruction(std::string const& name);
+
 /// One instruction with its points. Their number is not checked against the instruction.
 struct PathElement {
     /// What is drawn.
     PathInstruction instruction = PathInstruction::moveTo;
     /// Up to three of them allocate nothing.
-    Points points;
+    Points points = {};
 
     /// Equal instructions, and as many points, equal as floating-point numbers are: with a NaN
     /// in it an element is unequal to itself.
@@ -78,8 +82,8 @@ class PathBuilder {
 public:
     /// The end of the last instruction that has one; at first (0, 0). `close` and `append` leave
     /// it where it was.
-    FloatVec2 currentPoint;
-    std::vector<PathElement> elements;
+    FloatVec2 currentPoint = {};
+    std::vector<PathElement> elements = {};
 
     /// Afterwards the current point is p.
     TARN_ENGINE_BASE_EXPORT PathBuilder& moveTo(FloatVec2 p);

@@ -7,6 +7,7 @@
 #ifndef TARN_ENGINE_BASE_POINTS_H
 #define TARN_ENGINE_BASE_POINTS_H
 
+#include <Engine/Base/assertion.h>
 #include <Engine/Base/export.h>
 #include <Engine/Base/value.h>
 
@@ -31,10 +32,16 @@ namespace detail {
 
 }  // namespace detail
 
-/// A `std::vector<FloatVec2>` in its interface, its guarantees and its costs, without an allocator.
-/// Up to three points are held in place, without an allocation, and so a move and a swap invalidate
-/// iterators. A range that is inserted or assigned is copied first, and so may be a part of the
-/// list. Made from a vector and convertible to one, at the cost of a copy.
+/// A growable list in the manner of `std::vector<FloatVec2>`, without an allocator: up to three
+/// points are held in place, without an allocation. What differs from a vector:
+///
+/// - a move and a swap invalidate iterators, pointers and references;
+/// - a range that is inserted or assigned is copied first, and so may be a part of the list; an
+/// insertion that fails
+///   leaves the list as it was, wherever it was to go;
+/// - it is made from a vector and converts to one, each being a copy: a `std::vector<FloatVec2>
+/// const&` that is made
+///   from it is a copy too, and `std::vector v{points}` is a vector of one `Points`.
 class Points {
 public:
     /// As those of a vector.
@@ -98,40 +105,61 @@ public:
 
     /// The points behind one another, and how many. Constant time. More than `max_size` throw
     /// `std::length_error`.
-    FloatVec2* data() { return isMany() ? held.many : held.few; }
-    FloatVec2 const* data() const { return isMany() ? held.many : held.few; }
-    size_type size() const { return length; }
-    size_type capacity() const { return room; }
-    size_type max_size() const {
+    FloatVec2* data() noexcept { return isMany() ? held.many : held.few; }
+    FloatVec2 const* data() const noexcept { return isMany() ? held.many : held.few; }
+    size_type size() const noexcept { return length; }
+    size_type capacity() const noexcept { return room; }
+    size_type max_size() const noexcept {
         constexpr auto kAddressable =
             static_cast<size_type>(std::numeric_limits<difference_type>::max() / sizeof(FloatVec2));
         return std::min<size_type>(std::numeric_limits<Count>::max(), kAddressable);
     }
-    bool empty() const { return length == 0; }
+    bool empty() const noexcept { return length == 0; }
 
     /// Valid until points are added or this is moved from.
-    iterator begin() { return data(); }
-    iterator end() { return data() + length; }
-    const_iterator begin() const { return data(); }
-    const_iterator end() const { return data() + length; }
-    const_iterator cbegin() const { return begin(); }
-    const_iterator cend() const { return end(); }
-    reverse_iterator rbegin() { return reverse_iterator(end()); }
-    reverse_iterator rend() { return reverse_iterator(begin()); }
-    const_reverse_iterator rbegin() const { return const_reverse_iterator(end()); }
-    const_reverse_iterator rend() const { return const_reverse_iterator(begin()); }
-    const_reverse_iterator crbegin() const { return rbegin(); }
-    const_reverse_iterator crend() const { return rend(); }
+    iterator begin() noexcept { return data(); }
+    iterator end() noexcept { return data() + length; }
+    const_iterator begin() const noexcept { return data(); }
+    const_iterator end() const noexcept { return data() + length; }
+    const_iterator cbegin() const noexcept { return begin(); }
+    const_iterator cend() const noexcept { return end(); }
+    reverse_iterator rbegin() noexcept { return reverse_iterator(end()); }
+    reverse_iterator rend() noexcept { return reverse_iterator(begin()); }
+    const_reverse_iterator rbegin() const noexcept { return const_reverse_iterator(end()); }
+    const_reverse_iterator rend() const noexcept { return const_reverse_iterator(begin()); }
+    const_reverse_iterator crbegin() const noexcept { return rbegin(); }
+    const_reverse_iterator crend() const noexcept { return rend(); }
 
-    /// One point. `at` throws `std::out_of_range` for one that is not there.
-    FloatVec2& operator[](size_type i) { return data()[i]; }
-    FloatVec2 const& operator[](size_type i) const { return data()[i]; }
+    /// One point. `at` throws `std::out_of_range` for one that is not there. The others have to be
+    /// there: where
+    /// `_GLIBCXX_ASSERTIONS` is defined, which checks vectors too, one that is not is an assertion
+    /// failure.
+    FloatVec2& operator[](size_type i) {
+        check(i < length, "i < size()", "operator[]");
+        return data()[i];
+    }
+    FloatVec2 const& operator[](size_type i) const {
+        check(i < length, "i < size()", "operator[]");
+        return data()[i];
+    }
     FloatVec2& at(size_type i) { return data()[checked(i)]; }
     FloatVec2 const& at(size_type i) const { return data()[checked(i)]; }
-    FloatVec2& front() { return *begin(); }
-    FloatVec2 const& front() const { return *begin(); }
-    FloatVec2& back() { return end()[-1]; }
-    FloatVec2 const& back() const { return end()[-1]; }
+    FloatVec2& front() {
+        check(!empty(), "!empty()", "front");
+        return *begin();
+    }
+    FloatVec2 const& front() const {
+        check(!empty(), "!empty()", "front");
+        return *begin();
+    }
+    FloatVec2& back() {
+        check(!empty(), "!empty()", "back");
+        return end()[-1];
+    }
+    FloatVec2 const& back() const {
+        check(!empty(), "!empty()", "back");
+        return end()[-1];
+    }
 
     /// As of a vector: adding at the end takes constant time over many calls, and a failing
     /// allocation leaves this as it was.
@@ -139,17 +167,20 @@ public:
     void shrink_to_fit() {
         if (isMany() && length < room) *this = Points(*this);
     }
-    void clear() { length = 0; }
+    void clear() noexcept { length = 0; }
     void push_back(FloatVec2 point) {
         if (length == room) moveTo(grownRoom(size_type(length) + 1));
         data()[length++] = point;
     }
     template <class... Coordinates>
     FloatVec2& emplace_back(Coordinates... coordinates) {
-        push_back(FloatVec2{coordinates...});
+        push_back(FloatVec2{static_cast<double>(coordinates)...});
         return back();
     }
-    void pop_back() { --length; }
+    void pop_back() {
+        check(!empty(), "!empty()", "pop_back");
+        --length;
+    }
     void resize(size_type count, FloatVec2 point = FloatVec2()) {
         FloatVec2* const first = withGrownRoomFor(count);
         if (count > length) std::fill(first + length, first + count, point);
@@ -178,10 +209,11 @@ public:
     }
     template <class... Coordinates>
     iterator emplace(const_iterator position, Coordinates... coordinates) {
-        return insert(position, FloatVec2{coordinates...});
+        return insert(position, FloatVec2{static_cast<double>(coordinates)...});
     }
     iterator erase(const_iterator position) { return erase(position, position + 1); }
     iterator erase(const_iterator first, const_iterator last) {
+        check(first <= last && last <= end(), "last <= end()", "erase");
         iterator const to = begin() + (first - begin());
         length = static_cast<Count>(std::copy(last, cend(), to) - begin());
         return to;
@@ -211,18 +243,38 @@ public:
     }
     friend bool operator!=(Points const& a, Points const& b) { return !(a == b); }
 
+    /// Takes out all that equal the point (that the predicate is true for); says how many they
+    /// were. Linear.
+    template <class Predicate>
+    friend size_type erase_if(Points& points, Predicate predicate) {
+        auto const kept = std::remove_if(points.begin(), points.end(), predicate);
+        auto const erased = static_cast<size_type>(points.end() - kept);
+        points.erase(kept, points.end());
+        return erased;
+    }
+    friend size_type erase(Points& points, FloatVec2 const& point) {
+        return erase_if(points, [copy = point](FloatVec2 const& each) { return each == copy; });
+    }
+
 private:
     using Count = std::uint32_t;
     static constexpr Count kInPlace = 3;
 
     // A block of their own, or in place: `room` tells. Copying it copies what is there.
     union Held {
-        Held() : few{} {}
+        Held() noexcept : few{} {}
         FloatVec2 few[kInPlace];
         FloatVec2* many;
     };
 
-    bool isMany() const { return room > kInPlace; }
+    static void check([[maybe_unused]] bool holds, [[maybe_unused]] char const* condition,
+                      [[maybe_unused]] char const* function) {
+#if defined(_GLIBCXX_ASSERTIONS)
+        if (!holds) assertionFailed(condition, function, "Engine/Base/points", __LINE__);
+#endif
+    }
+
+    bool isMany() const noexcept { return room > kInPlace; }
     void release() {
         if (isMany()) delete[] held.many;
     }

@@ -6,7 +6,10 @@
 
 #include <algorithm>
 #include <array>
+#include <cmath>
 #include <iterator>
+#include <ostream>
+#include <string_view>
 
 namespace tarn::engine {
 
@@ -19,6 +22,11 @@ Unstructured const& elementOf(Unstructured const& element) { return element; }
 Unstructured const& elementOf(Unstructured::Map::value_type const& entry) { return entry.second; }
 
 constexpr std::array<char const*, 4> kComponentKeys{"X", "Y", "Z", "W"};
+
+// At the enumerator's position.
+constexpr std::array<std::string_view, 7> kKindNames{
+    "null", "map", "array", "float", "integer", "unsigned integer", "string"};
+static_assert(kKindNames.size() == std::size_t(Unstructured::Type::String) + 1);
 
 // Component `i` of the vector that `tree` reads as.
 double component(Unstructured const& tree, std::size_t i) {
@@ -282,6 +290,76 @@ unsigned long long Unstructured::asId() const {
     return 0;
 }
 
+std::size_t Unstructured::size() const noexcept {
+    if (Map const* map = ifMap()) return map->size();
+    if (Array const* array = ifArray()) return array->size();
+    return 0;
+}
+
+Unstructured const* Unstructured::find(std::string const& key) const noexcept {
+    Map const* const map = ifMap();
+    if (map == nullptr) return nullptr;
+    auto const entry = map->find(key);
+    return entry == map->end() ? nullptr : &entry->second;
+}
+
+Unstructured const* Unstructured::find(std::size_t position) const noexcept {
+    Array const* const array = ifArray();
+    return array != nullptr && position < array->size() ? &(*array)[position] : nullptr;
+}
+
+Unstructured const* Unstructured::find(Steps path) const noexcept {
+    Unstructured const* found = this;
+    for (Step const& step : path) {
+        found = step.isKey ? found->find(step.key) : found->find(step.position);
+        if (found == nullptr) break;
+    }
+    return found;
+}
+
+// What is at the end of the path and of the kind, else null.
+Unstructured const* Unstructured::findOfKind(Steps path, bool (*isKind)(Unstructured const&),
+                                             Lookup* lookup) const noexcept {
+    Unstructured const* const found = find(path);
+    Lookup const outcome = found == nullptr ? Lookup::Missing
+                           : isKind(*found) ? Lookup::Found
+                                            : Lookup::WrongKind;
+    if (lookup != nullptr) *lookup = outcome;
+    return outcome == Lookup::Found ? found : nullptr;
+}
+
+double Unstructured::numberAt(Steps path, double otherwise, Lookup* lookup) const noexcept {
+    auto const isKind = [](Unstructured const& data) { return data.isNumber(); };
+    Unstructured const* const found = findOfKind(path, isKind, lookup);
+    return found ? found->asFloat() : otherwise;
+}
+
+long long Unstructured::integerAt(Steps path, long long otherwise, Lookup* lookup) const noexcept {
+    auto const isKind = [](Unstructured const& data) {
+        constexpr double kTwo63 = 9223372036854775808.0;
+        double const number = data.asFloat();
+        return data.type() == Type::Integer ||
+               (data.type() == Type::Float && number == std::trunc(number) && number >= -kTwo63 &&
+                number < kTwo63);
+    };
+    Unstructured const* const found = findOfKind(path, isKind, lookup);
+    return found ? found->asInteger() : otherwise;
+}
+
+bool Unstructured::boolAt(Steps path, bool otherwise, Lookup* lookup) const noexcept {
+    auto const isKind = [](Unstructured const& data) {
+        return data.type() == Type::Integer && (data.asInteger() == 0 || data.asInteger() == 1);
+    };
+    Unstructured const* const found = findOfKind(path, isKind, lookup);
+    return found ? found->asBool() : otherwise;
+}
+
+std::string Unstructured::stringAt(Steps path, std::string otherwise, Lookup* lookup) const {
+    auto const isKind = [](Unstructured const& data) { return data.isString(); };
+    Unstructured const* const found = findOfKind(path, isKind, lookup);
+    return found ? *found->ifString() : otherwise;
+}
+
 Unstructured::operator FloatVec2() const { return {component(*this, 0), component(*this, 1)}; }
 Unstructured::operator FloatVec3() const {
     return {component(*this, 0), component(*this, 1), component(*this, 2)};
@@ -315,6 +393,17 @@ Unstructured::Map Unstructured::removeEmptyValues(Map const& map) {
         if (!isEmptyContainer(entry.second)) kept.emplace_hint(kept.end(), entry);
     }
     return kept;
+}
+
+std::string to_string(Unstructured::Type kind) {
+    if (std::size_t(kind) >= kKindNames.size()) {
+        return "Unstructured::Type(" + std::to_string(int(kind)) + ")";
+    }
+    return std::string(kKindNames[std::size_t(kind)]);
+}
+
+std::ostream& operator<<(std::ostream& stream, Unstructured::Type kind) {
+    return stream << to_string(kind);
 }
 
 }  // namespace tarn::engine

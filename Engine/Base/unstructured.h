@@ -16,6 +16,8 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <initializer_list>
+#include <iosfwd>
 #include <map>
 #include <new>
 #include <string>
@@ -57,6 +59,38 @@ public:
         Integer = 4,
         UnsignedInteger = 5,
         String = 6,
+    };
+
+    /// One step from data to a part of it: the key of a map, or the position in an array. Made
+    /// implicitly, to be written in the braces of a path: `{"render", "size", 0}`.
+    class Step {
+    public:
+        /// To the element of a map with this key.
+        Step(char const* mapKey) : key(mapKey), isKey(true) {}
+        Step(std::string mapKey) : key(std::move(mapKey)), isKey(true) {}
+        /// To the element of an array at this position. A negative one is that of no element.
+        template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer> ||
+                                                      detail::isUnsignedInteger<Integer>,
+                                                  int> = 0>
+        Step(Integer arrayPosition) : position(static_cast<std::size_t>(arrayPosition)) {}
+
+    private:
+        friend class Unstructured;
+        std::string key;
+        std::size_t position = 0;
+        bool isKey = false;
+    };
+    /// A path of such steps, from the outside to the inside.
+    using Steps = std::initializer_list<Step>;
+
+    /// What a reading along a path came upon.
+    enum class Lookup : unsigned char {
+        /// Something of the kind that was asked for.
+        Found = 0,
+        /// Nothing.
+        Missing = 1,
+        /// Something of another kind, null included.
+        WrongKind = 2,
     };
 
     /// Null.
@@ -109,7 +143,7 @@ public:
     TARN_ENGINE_BASE_EXPORT_INLINE static Unstructured Undefined() { return Unstructured(); }
 
     /// The kind of this value. Constant time.
-    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return Type(storage.which()); }
+    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const noexcept { return Type(storage.which()); }
 
     /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy
     /// nothing.
@@ -142,6 +176,40 @@ public:
         std::string* const* text = boost::get<std::string*>(&storage);
         return text == nullptr ? nullptr : *text;
     }
+
+    /// Whether this is of that kind. A number is a floating-point or a signed one: what `asFloat`
+    /// reads, and not an identifier (an unsigned integer). Constant time.
+    bool isNull() const noexcept { return type() == Type::Null; }
+    bool isMap() const noexcept { return type() == Type::Map; }
+    bool isArray() const noexcept { return type() == Type::Array; }
+    bool isNumber() const noexcept { return type() == Type::Float || type() == Type::Integer; }
+    bool isIdentifier() const noexcept { return type() == Type::UnsignedInteger; }
+    bool isString() const noexcept { return type() == Type::String; }
+
+    /// The number of elements of a map or an array, and whether it is 0; every other kind has none.
+    /// Constant time.
+    TARN_ENGINE_BASE_EXPORT std::size_t size() const noexcept;
+    bool empty() const noexcept { return size() == 0; }
+
+    /// The element of a map with this key, the element of an array at this position, or what a path
+    /// of both leads to; null where there is none, and for data of another kind. An empty path
+    /// leads to this itself. Lives as the content in place does. Copies nothing.
+    TARN_ENGINE_BASE_EXPORT Unstructured const* find(std::string const& key) const noexcept;
+    TARN_ENGINE_BASE_EXPORT Unstructured const* find(std::size_t position) const noexcept;
+    TARN_ENGINE_BASE_EXPORT Unstructured const* find(Steps path) const noexcept;
+
+    /// What is at the end of the path, or `otherwise` where it leads nowhere or to data of another
+    /// kind; `lookup`, where it is given, says which. A number is as in `isNumber`; an integer is a
+    /// signed one, or a floating-point number without a fraction that fits; a truth is the integer
+    /// 1 or 0.
+    TARN_ENGINE_BASE_EXPORT double numberAt(Steps path, double otherwise,
+                                            Lookup* lookup = nullptr) const noexcept;
+    TARN_ENGINE_BASE_EXPORT long long integerAt(Steps path, long long otherwise,
+                                                Lookup* lookup = nullptr) const noexcept;
+    TARN_ENGINE_BASE_EXPORT bool boolAt(Steps path, bool otherwise,
+                                        Lookup* lookup = nullptr) const noexcept;
+    TARN_ENGINE_BASE_EXPORT std::string stringAt(Steps path, std::string otherwise,
+                                                 Lookup* lookup = nullptr) const;
 
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
     /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
@@ -198,6 +266,8 @@ private:
     }
     std::uint32_t height() const;
     bool isDeep() const;
+    Unstructured const* findOfKind(Steps path, bool (*isKind)(Unstructured const&),
+                                   Lookup* lookup) const noexcept;
     template <class T>
     static Storage made(T&& content);
     template <class T>
@@ -214,6 +284,13 @@ private:
 
     Storage storage;
 };
+
+/// The name of a kind, for people: "null", "map", "array", "float", "integer", "unsigned integer"
+/// or "string"; "Unstructured::Type(77)" for what is no enumerator.
+TARN_ENGINE_BASE_EXPORT std::string to_string(Unstructured::Type kind);
+
+/// Writes that name.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Unstructured::Type kind);
 
 }  // namespace tarn::engine
 

@@ -1,5 +1,7 @@
 #include <Engine/Base/value.h>
 
+#include <Engine/Base/detail/immortal.h>
+#include <Engine/Base/detail/radix_point.h>
 #include <Engine/Base/detail/truncate.h>
 #include <Engine/Base/path.h>
 #include <Engine/Base/unstructured.h>
@@ -21,10 +23,6 @@
 #include <string_view>
 #include <utility>
 
-#if __has_include(<langinfo.h>)
-#include <langinfo.h>
-#endif
-
 namespace tarn::engine {
 
 namespace {
@@ -41,8 +39,8 @@ constexpr FloatMat4 FloatMat4Identity{{1, 0, 0, 0,  //
 
 // What `indexLoopCasting` takes from an empty loop.
 Value const& nullValue() {
-    static Value const value;
-    return value;
+    static detail::Immortal<Value> const null;
+    return null.value;
 }
 
 // The types and their names, at the enumerator's position.
@@ -227,30 +225,13 @@ struct AsUnstructured : boost::static_visitor<Unstructured> {
 
 // The text that "%.f" gives for negative zero.
 std::string const& negativeZero() {
-    static std::string const text = [] {
+    static detail::Immortal<std::string> const text([] {
         char buffer[16];
         std::snprintf(buffer, sizeof buffer, "%.f", -0.0);
         return std::string(buffer);
-    }();
-    return text;
+    }());
+    return text.value;
 }
-
-// The C library's decimal point, which is a string of its own. Its other questions about it may not
-// be asked on two threads at once.
-#if __has_include(<langinfo.h>)
-struct RadixPoint {
-    char const* const text = nl_langinfo(RADIXCHAR);
-};
-#else
-struct RadixPoint {
-    RadixPoint() {
-        std::snprintf(half, sizeof half, "%.1f", 0.5);
-        half[std::strlen(half) - 1] = '\0';  // The 5.
-    }
-    char half[16];
-    char const* const text = half + 1;
-};
-#endif
 
 // Where numbers have no fraction and one decimal still fits into 64 bits.
 constexpr double kTwo52 = 4503599627370496.0;
@@ -324,7 +305,7 @@ std::string numberText(double d) {
     bool const isNegative = std::signbit(d);
     std::string text;
     if (std::abs(d) < kTwo52) {
-        RadixPoint const radix;
+        detail::RadixPoint const radix;
         bool const isUsual = point == '.' && radix.text[0] == '.' && radix.text[1] == '\0';
         int const decimals = std::abs(d) >= 1000.0 ? 1 : 2;
         std::uint64_t const multiple = roundedMultiple(d, decimals == 1 ? 10 : 100);
@@ -415,6 +396,83 @@ struct EqualsContent : boost::static_visitor<bool> {
     Storage const& right;
 };
 
+std::uint64_t combine(std::uint64_t seed, std::uint64_t word) {
+    seed ^= word + 0x9e3779b97f4a7c15 + (seed << 6) + (seed >> 2);
+    return seed;
+}
+
+// Equal for equal numbers, the two zeros included.
+std::uint64_t wordOf(double d) {
+    std::uint64_t word = 0;
+    if (d != 0.0) std::memcpy(&word, &d, sizeof word);
+    return word;
+}
+
+struct HashOf : boost::static_visitor<std::uint64_t> {
+    std::uint64_t operator()(long long i) const { return static_cast<std::uint64_t>(i); }
+    std::uint64_t operator()(double d) const { return wordOf(d); }
+    std::uint64_t operator()(FloatVec2 const& v) const { return combine(wordOf(v.x), wordOf(v.y)); }
+    std::uint64_t operator()(FloatVec3 const& v) const {
+        return combine((*this)(FloatVec2{v.x, v.y}), wordOf(v.z));
+    }
+    std::uint64_t operator()(FloatVec4 const& v) const {
+        return combine((*this)(FloatVec3{v.x, v.y, v.z}), wordOf(v.w));
+    }
+    std::uint64_t operator()(std::shared_ptr<FloatMat4 const> const& m) const {
+        std::uint64_t hash = 0;
+        for (std::size_t i = 0; m && i < std::size(m->elements); ++i) {
+            std::uint64_t word = 0;
+            std::memcpy(&word, &m->elements[i], sizeof word);
+            hash = combine(hash, word);
+        }
+        return hash;
+    }
+    std::uint64_t operator()(bool b) const { return b ? 1 : 0; }
+    template <Type resource>
+    std::uint64_t operator()(Value::ResourceID<resource> resourceId) const {
+        return resourceId.id;
+    }
+    std::uint64_t operator()(std::shared_ptr<Path const> const& p) const {
+        std::uint64_t hash = 0;
+        if (!p) return hash;
+        for (PathElement const& element : p->elements) {
+            hash = combine(hash, std::uint64_t(element.instruction));
+            for (FloatVec2 const& point : element.points) hash = combine(hash, (*this)(point));
+        }
+        return hash;
+    }
+    std::uint64_t operator()(std::shared_ptr<Unstructured const> const& u) const {
+        std::uint64_t hash = 0;
+        if (!u) return hash;
+        if (Unstructured::Map const* map = u->ifMap()) {
+            for (auto const& [key, element] : *map) {
+                hash = combine(combine(hash, ofText(key)), ofElement(element));
+            }
+        } else if (Unstructured::Array const* array = u->ifArray()) {
+            for (Unstructured const& element : *array) hash = combine(hash, ofElement(element));
+        }
+        return combine(hash, ofElement(*u));
+    }
+    std::uint64_t operator()(std::shared_ptr<std::string const> const& s) const {
+        return s ? ofText(*s) : 0;
+    }
+    template <class T>
+    std::uint64_t operator()(T const&) const = delete;
+
+private:
+    static std::uint64_t ofText(std::string const& text) { return std::hash<std::string>()(text); }
+
+    // By itself, without what a map or an array has: data may be of any depth.
+    static std::uint64_t ofElement(Unstructured const& element) {
+        std::uint64_t content = element.asId();
+        if (auto const* map = element.ifMap()) content = map->size();
+        if (auto const* array = element.ifArray()) content = array->size();
+        if (auto const* text = element.ifString()) content = ofText(*text);
+        if (element.type() == Unstructured::Type::Float) content = wordOf(element.asFloat());
+        return combine(std::uint64_t(element.type()), content);
+    }
+};
+
 // What an alternative points to, itself or shared; nothing where another one is held.
 template <class T>
 T const* inside(std::shared_ptr<T const> const* held) {
@@ -448,9 +506,9 @@ Value::Value(char const* text)
     : storage(std::make_shared<std::string const>(text == nullptr ? "" : text)) {}
 Value::Value(std::string text) : storage(std::make_shared<std::string const>(std::move(text))) {}
 Value::Value(Path path) : storage(std::make_shared<Path const>(std::move(path))) {}
-Value::Value(std::shared_ptr<Path const> path) : storage(std::move(path)) {}
+Value::Value(std::shared_ptr<Path const> path) noexcept : storage(std::move(path)) {}
 Value::Value(Unstructured tree) : storage(std::make_shared<Unstructured const>(std::move(tree))) {}
-Value::Value(std::shared_ptr<Unstructured const> tree) : storage(std::move(tree)) {}
+Value::Value(std::shared_ptr<Unstructured const> tree) noexcept : storage(std::move(tree)) {}
 
 Value::Value(unsigned long long id, Type type) {
     switch (type) {
@@ -492,29 +550,37 @@ Value Value::defaultValue(Type type, unsigned char qualifier) {
         case Type::Video:
         case Type::Sound:
         case Type::Model: return Value(0, type);
-        case Type::Path: return *Path::EmptyPath();
+        case Type::Path: return Path();
         case Type::String: return std::string();
         case Type::Unstructured: return Unstructured::Undefined();
     }
     assertionFailed("0", __func__, kModule, __LINE__);
 }
 
-Value::operator long long() const { return boost::apply_visitor(AsInteger(), storage); }
-double Value::readDouble() const { return boost::apply_visitor(AsDouble(), storage); }
-Value::operator bool() const { return boost::apply_visitor(IsTrue(), storage); }
-Value::operator unsigned long long() const { return boost::apply_visitor(AsId(), storage); }
-Value::operator FloatVec2() const { return boost::apply_visitor(AsVector<FloatVec2>(), storage); }
-Value::operator FloatVec3() const { return boost::apply_visitor(AsVector<FloatVec3>(), storage); }
-Value::operator FloatVec4() const { return boost::apply_visitor(AsVector<FloatVec4>(), storage); }
+Value::operator long long() const noexcept { return boost::apply_visitor(AsInteger(), storage); }
+double Value::readDouble() const noexcept { return boost::apply_visitor(AsDouble(), storage); }
+Value::operator bool() const noexcept { return boost::apply_visitor(IsTrue(), storage); }
+Value::operator unsigned long long() const noexcept {
+    return boost::apply_visitor(AsId(), storage);
+}
+Value::operator FloatVec2() const noexcept {
+    return boost::apply_visitor(AsVector<FloatVec2>(), storage);
+}
+Value::operator FloatVec3() const noexcept {
+    return boost::apply_visitor(AsVector<FloatVec3>(), storage);
+}
+Value::operator FloatVec4() const noexcept {
+    return boost::apply_visitor(AsVector<FloatVec4>(), storage);
+}
 
-Value::operator FloatMat4() const {
+Value::operator FloatMat4() const noexcept {
     FloatMat4 const* const matrix = asFloatMat4();
     return matrix ? *matrix : FloatMat4Identity;
 }
 
 Value::operator Path() const {
     Path const* const path = ifPath();
-    return path ? *path : *Path::EmptyPath();
+    return path ? *path : Path();
 }
 
 Value::operator std::string() const {
@@ -528,29 +594,29 @@ Unstructured Value::asUnstructured() const {
     return boost::apply_visitor(AsUnstructured(), storage);
 }
 
-FloatMat4 const* Value::asFloatMat4() const {
+FloatMat4 const* Value::asFloatMat4() const noexcept {
     return inside(boost::get<std::shared_ptr<FloatMat4 const>>(&storage));
 }
-Path const* Value::ifPath() const {
+Path const* Value::ifPath() const noexcept {
     return inside(boost::get<std::shared_ptr<Path const>>(&storage));
 }
-std::string const* Value::ifString() const {
+std::string const* Value::ifString() const noexcept {
     return inside(boost::get<std::shared_ptr<std::string const>>(&storage));
 }
-Unstructured const* Value::ifUnstructured() const {
+Unstructured const* Value::ifUnstructured() const noexcept {
     return inside(boost::get<std::shared_ptr<Unstructured const>>(&storage));
 }
 
-std::shared_ptr<FloatMat4 const> Value::sharedFloatMat4() const {
+std::shared_ptr<FloatMat4 const> Value::sharedFloatMat4() const noexcept {
     return shared(boost::get<std::shared_ptr<FloatMat4 const>>(&storage));
 }
-std::shared_ptr<Path const> Value::sharedPath() const {
+std::shared_ptr<Path const> Value::sharedPath() const noexcept {
     return shared(boost::get<std::shared_ptr<Path const>>(&storage));
 }
-std::shared_ptr<std::string const> Value::sharedString() const {
+std::shared_ptr<std::string const> Value::sharedString() const noexcept {
     return shared(boost::get<std::shared_ptr<std::string const>>(&storage));
 }
-std::shared_ptr<Unstructured const> Value::sharedUnstructured() const {
+std::shared_ptr<Unstructured const> Value::sharedUnstructured() const noexcept {
     return shared(boost::get<std::shared_ptr<Unstructured const>>(&storage));
 }
 
@@ -618,17 +684,36 @@ Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
     return castValueToType(named, typeInfo);
 }
 
-Value const& detail::castNullValue(TypeInfo const& typeInfo) {
+Value const& detail::castNullValue(TypeInfo const& typeInfo) noexcept {
     return castValueToType(nullValue(), typeInfo);
 }
 
+FloatMat4 const& detail::neutralMatrix() noexcept { return FloatMat4Identity; }
+Path const& detail::neutralPath() noexcept {
+    static Immortal<Path> const path;
+    return path.value;
+}
+Unstructured const& detail::neutralData() noexcept {
+    static Immortal<Unstructured> const null;
+    return null.value;
+}
+std::string const& detail::neutralString() noexcept {
+    static Immortal<std::string> const text;
+    return text.value;
+}
+
 Loop const& nullLoop() {
-    static Loop const loop;
-    return loop;
+    static detail::Immortal<Loop> const loop;
+    return loop.value;
 }
 
 std::ostream& operator<<(std::ostream& stream, Value const& value) {
     return stream << to_string(value);
+}
+
+std::ostream& operator<<(std::ostream& stream, Type type) {
+    if (std::size_t(type) >= kTypeNames.size()) return stream << "Type(" << int(type) << ")";
+    return stream << kTypeNames[std::size_t(type)];
 }
 
 std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo) {
@@ -636,3 +721,10 @@ std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo) {
 }
 
 }  // namespace tarn::engine
+
+std::size_t
+std::hash<tarn::engine::Value>::operator()(tarn::engine::Value const& value) const noexcept {
+    using namespace tarn::engine;
+    return static_cast<std::size_t>(combine(std::uint64_t(value.storage.which()),
+                                            boost::apply_visitor(HashOf(), value.storage)));
+}

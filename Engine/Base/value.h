@@ -20,10 +20,12 @@
 #include <boost/variant/variant.hpp>
 
 #include <cstddef>
+#include <functional>
 #include <iosfwd>
 #include <memory>
 #include <string>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 /// The vocabulary that the evaluator, the renderer and the editor share.
@@ -131,11 +133,21 @@ template <class T>
 constexpr bool isNarrowNumber = std::is_arithmetic_v<T> && !isWideInteger<T> &&
                                 !isOneOf<T, bool, double, long long, unsigned long long>;
 
+/// An object that becomes a pointer, as a lambda without captures becomes one to a function.
+template <class T, class = void>
+constexpr bool becomesPointer = false;
+template <class T>
+constexpr bool
+    becomesPointer<T, std::enable_if_t<std::is_class_v<T> &&
+                                       std::is_pointer_v<decltype(+std::declval<T const&>())>>> =
+        true;
+
 /// What a `Value` refuses to be made from, since its truth value would be stored.
 template <class T>
-constexpr bool isNoValueSource = isUnsignedInteger<T> || isCharacter<T> ||
-                                 std::is_same_v<T, long double> || std::is_member_pointer_v<T> ||
-                                 (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>);
+constexpr bool isNoValueSource =
+    isUnsignedInteger<T> || isCharacter<T> || std::is_same_v<T, long double> ||
+    std::is_member_pointer_v<T> ||
+    (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>) || becomesPointer<T>;
 
 }  // namespace detail
 
@@ -229,27 +241,27 @@ public:
     using ModelID = ResourceID<Type::Model>;
 
     /// The double 0.0.
-    TARN_ENGINE_BASE_EXPORT_INLINE Value() : storage(0.0) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(double number) : storage(number) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(long long integer) : storage(integer) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value() noexcept : storage(0.0) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(double number) noexcept : storage(number) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(long long integer) noexcept : storage(integer) {}
     /// Every other signed integer type; `char` is not one.
     template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
-    Value(Integer integer) : Value(static_cast<long long>(integer)) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(bool truth) : storage(truth) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec2 vector) : storage(vector) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec3 vector) : storage(vector) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec4 vector) : storage(vector) {}
+    Value(Integer integer) noexcept : Value(static_cast<long long>(integer)) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(bool truth) noexcept : storage(truth) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec2 vector) noexcept : storage(vector) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec3 vector) noexcept : storage(vector) {}
+    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec4 vector) noexcept : storage(vector) {}
     TARN_ENGINE_BASE_EXPORT Value(FloatMat4 const& matrix);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
     TARN_ENGINE_BASE_EXPORT Value(char const* text);
     TARN_ENGINE_BASE_EXPORT Value(std::string text);
     TARN_ENGINE_BASE_EXPORT Value(Path path);
     /// Shares the path; nothing is copied.
-    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Path const> path);
+    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Path const> path) noexcept;
     TARN_ENGINE_BASE_EXPORT Value(Unstructured tree);
     /// Shares the data; nothing is copied. An aliasing pointer makes an element of a large document
     /// a value: `std::shared_ptr<Unstructured const>(document, &element)`. The whole lives as long.
-    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Unstructured const> tree);
+    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Unstructured const> tree) noexcept;
     /// The resource `id`. A `type` that is no resource is an assertion failure.
     TARN_ENGINE_BASE_EXPORT Value(unsigned long long id, Type type);
 
@@ -257,6 +269,13 @@ public:
     template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
     Value(Source) = delete;
     Value(std::nullptr_t) = delete;
+
+    /// Shares the payload of `other`, or takes it over. Neither allocates.
+    Value(Value const& other) noexcept = default;
+    Value(Value&& other) noexcept = default;
+    Value& operator=(Value const& other) noexcept = default;
+    Value& operator=(Value&& other) noexcept = default;
+    ~Value() = default;
 
     /// As the constructor of the same type.
     TARN_ENGINE_BASE_EXPORT static Value Image(unsigned long long id);
@@ -271,7 +290,7 @@ public:
     TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
 
     /// The type of what the value holds. Constant time, a few instructions.
-    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const { return kTypes[storage.which()]; }
+    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
 
     /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
     /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
@@ -279,17 +298,17 @@ public:
     /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
     /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
     /// integer towards zero, kept in range, and 0 for a NaN.
-    TARN_ENGINE_BASE_EXPORT operator long long() const;
-    TARN_ENGINE_BASE_EXPORT_INLINE operator double() const {
+    TARN_ENGINE_BASE_EXPORT operator long long() const noexcept;
+    TARN_ENGINE_BASE_EXPORT_INLINE operator double() const noexcept {
         double const* number = boost::get<double>(&storage);
         return number != nullptr ? *number : readDouble();
     }
-    TARN_ENGINE_BASE_EXPORT operator bool() const;
+    TARN_ENGINE_BASE_EXPORT operator bool() const noexcept;
     /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
-    TARN_ENGINE_BASE_EXPORT operator unsigned long long() const;
+    TARN_ENGINE_BASE_EXPORT operator unsigned long long() const noexcept;
     /// As `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
     template <class Integer, std::enable_if_t<detail::isWideInteger<Integer>, int> = 0>
-    operator Integer() const {
+    operator Integer() const noexcept {
         using Reading =
             std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
         return static_cast<Integer>(operator Reading());
@@ -298,15 +317,19 @@ public:
     template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
     operator Narrow() const = delete;
 
+    /// Would be the element of the array at the value's integer.
+    template <class T>
+    void operator[](T const*) const = delete;
+
     /// Vector readings, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would fill the
     /// record's first number and nothing else. None allocates. A number or truth value fills every
     /// component, a shorter vector is filled up with zeros and a longer one cut; data reads as
     /// `Unstructured` says; everything else is zero.
-    TARN_ENGINE_BASE_EXPORT operator FloatVec2() const;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec3() const;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec4() const;
+    TARN_ENGINE_BASE_EXPORT operator FloatVec2() const noexcept;
+    TARN_ENGINE_BASE_EXPORT operator FloatVec3() const noexcept;
+    TARN_ENGINE_BASE_EXPORT operator FloatVec4() const noexcept;
     /// The matrix held, else the identity.
-    TARN_ENGINE_BASE_EXPORT operator FloatMat4() const;
+    TARN_ENGINE_BASE_EXPORT operator FloatMat4() const noexcept;
     /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing. Its callers
     /// include path.h, as those of `asUnstructured` include unstructured.h.
     TARN_ENGINE_BASE_EXPORT operator Path() const;
@@ -319,17 +342,24 @@ public:
 
     /// The payload inside the value, or null where the value holds another alternative or a null
     /// payload. Lives until the value is assigned to or destroyed. Copies nothing.
-    TARN_ENGINE_BASE_EXPORT FloatMat4 const* asFloatMat4() const;
-    TARN_ENGINE_BASE_EXPORT Path const* ifPath() const;
-    TARN_ENGINE_BASE_EXPORT std::string const* ifString() const;
-    TARN_ENGINE_BASE_EXPORT Unstructured const* ifUnstructured() const;
+    TARN_ENGINE_BASE_EXPORT FloatMat4 const* asFloatMat4() const noexcept;
+    TARN_ENGINE_BASE_EXPORT Path const* ifPath() const noexcept;
+    TARN_ENGINE_BASE_EXPORT std::string const* ifString() const noexcept;
+    TARN_ENGINE_BASE_EXPORT Unstructured const* ifUnstructured() const noexcept;
 
     /// The payload, shared: the pointer that every copy of the value holds, or null as above. Costs
     /// one reference count, and keeps the payload for as long as it is held.
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<FloatMat4 const> sharedFloatMat4() const;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Path const> sharedPath() const;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<std::string const> sharedString() const;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Unstructured const> sharedUnstructured() const;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<FloatMat4 const> sharedFloatMat4() const noexcept;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Path const> sharedPath() const noexcept;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<std::string const> sharedString() const noexcept;
+    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Unstructured const> sharedUnstructured() const noexcept;
+
+    /// What the visitor gives for what the value holds, as a reference to const: a `long long`, a
+    /// `double`, a vector, a `FloatMat4`, a `bool`, a `ResourceID`, a `Path`, an `Unstructured` or
+    /// a `std::string`. A null payload is the identity matrix, the empty path, null data or the
+    /// empty string. Every call has to have the same type of result.
+    template <class Visitor>
+    decltype(auto) visit(Visitor&& visitor) const;
 
     /// A value of exactly `type`, made from the matching reading with a payload of its own, even
     /// when this value has that type already. An enumerator out of range is an assertion failure.
@@ -349,6 +379,7 @@ public:
 
 private:
     friend std::string to_string(Value const& value);
+    friend struct std::hash<Value>;
 
     using Storage =
         boost::variant<long long, double, FloatVec2, FloatVec3, FloatVec4,
@@ -361,13 +392,24 @@ private:
                                       Type::Video,        Type::Sound, Type::Model,   Type::Path,
                                       Type::Unstructured, Type::String};
 
-    TARN_ENGINE_BASE_EXPORT double readDouble() const;
+    TARN_ENGINE_BASE_EXPORT double readDouble() const noexcept;
     // For values of the same alternative.
     TARN_ENGINE_BASE_EXPORT bool contentEquals(Value const& other) const;
 
     Storage storage;
 };
 static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they grow");
+
+}  // namespace tarn::engine
+
+/// Equal values have equal hashes; a NaN has one too. Linear in a path and a string; of data the
+/// first level counts. The number is another one in each process, version and platform.
+template <>
+struct std::hash<tarn::engine::Value> {
+    TARN_ENGINE_BASE_EXPORT std::size_t operator()(tarn::engine::Value const& value) const noexcept;
+};
+
+namespace tarn::engine {
 
 /// The text that an editor shows; not made to be read back. Numbers have two decimals, or one from
 /// 1000 on, without trailing zeros: 2.5, 1234.6, 3; or they are "nan" or "inf", behind "-" where
@@ -382,15 +424,16 @@ namespace detail {
 /// The kinds that convert to or from a `Value`.
 template <class T>
 constexpr bool isComparedByReading =
-    std::is_arithmetic_v<T> || std::is_convertible_v<T const&, std::string> ||
-    isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, std::shared_ptr<Path const>,
-            Unstructured, std::shared_ptr<Unstructured const>>;
-template <>
-inline constexpr bool isComparedByReading<Value> = false;
+    !std::is_convertible_v<T*, Value const*> &&
+    (std::is_arithmetic_v<T> || std::is_convertible_v<T const&, std::string> ||
+     isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, std::shared_ptr<Path const>,
+             Unstructured, std::shared_ptr<Unstructured const>>);
 
 // `V` is deduced, so that only a `Value` itself is meant and nothing that converts to one.
 template <class V, class Other>
 using EnableIfMixed = std::enable_if_t<std::is_same_v<V, Value> && isComparedByReading<Other>, int>;
+template <class V>
+using EnableIfValue = std::enable_if_t<std::is_convertible_v<V*, Value const*>, int>;
 
 }  // namespace detail
 
@@ -405,6 +448,22 @@ bool operator!=(V const&, Other const&) = delete;
 template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
 bool operator!=(Other const&, V const&) = delete;
 
+/// A value beside a pointer or a string literal would be pointer arithmetic: `"x" +
+/// std::string(value)` joins them. (`array[value]` cannot be refused: it is the element at the
+/// value's integer.)
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator+(T const*, V const&) = delete;
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator+(V const&, T const*) = delete;
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator-(T const*, V const&) = delete;
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator-(V const&, T const*) = delete;
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator+=(T*&, V const&) = delete;
+template <class T, class V, detail::EnableIfValue<V> = 0>
+void operator-=(T*&, V const&) = delete;
+
 /// A list of values; indices wrap around it (`indexLoopCasting`).
 using Loop = std::vector<Value>;
 
@@ -415,10 +474,10 @@ struct TypeInfo {
     /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
     unsigned char subtype = 0;
     /// Bounds, both inclusive, of a `Float` port; other ports are never clamped.
-    Optional<Value> min;
-    Optional<Value> max;
+    Optional<Value> min = {};
+    Optional<Value> max = {};
     /// Carried, copied and compared; this library reads nothing into it.
-    Optional<Value> extra;
+    Optional<Value> extra = {};
 
     /// Field by field.
     TARN_ENGINE_BASE_EXPORT bool operator==(TypeInfo const& other) const;
@@ -432,8 +491,8 @@ TARN_ENGINE_BASE_EXPORT std::string portNameForTypeInfo(TypeInfo typeInfo, bool 
 /// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
 /// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
 /// refers into one of the arguments and lives no longer than both.
-TARN_ENGINE_BASE_EXPORT_INLINE inline Value const& castValueToType(Value const& value,
-                                                                   TypeInfo const& typeInfo);
+TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
+castValueToType(Value const& value, TypeInfo const& typeInfo) noexcept;
 
 /// The same decision, as a copy of the value chosen.
 TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typeInfo);
@@ -442,13 +501,16 @@ TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typ
 /// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
 /// a value that lives to program exit.
 TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
-indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long index);
+indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long index) noexcept;
 
 /// The empty loop that everyone shares; lives to program exit.
 TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();
 
 /// Writes `to_string(value)`.
 TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Value const& value);
+
+/// Writes the name of the type, "float" to "unstructured"; "Type(77)" for what is no enumerator.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Type type);
 
 /// Writes the type alone: "[type: float]".
 TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
@@ -458,11 +520,42 @@ TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo 
 namespace detail {
 
 // What an empty loop counts as, cast to the port.
-TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo);
+TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo) noexcept;
+
+// What a visitor is shown in the place of a null payload.
+TARN_ENGINE_BASE_EXPORT FloatMat4 const& neutralMatrix() noexcept;
+TARN_ENGINE_BASE_EXPORT Path const& neutralPath() noexcept;
+TARN_ENGINE_BASE_EXPORT Unstructured const& neutralData() noexcept;
+TARN_ENGINE_BASE_EXPORT std::string const& neutralString() noexcept;
 
 }  // namespace detail
 
-inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) {
+template <class Visitor>
+decltype(auto) Value::visit(Visitor&& visitor) const {
+    auto const show = [&](auto const& held) -> decltype(auto) {
+        return std::forward<Visitor>(visitor)(held);
+    };
+    switch (type()) {
+        case Type::Int: return show(*boost::get<long long>(&storage));
+        case Type::Float: return show(*boost::get<double>(&storage));
+        case Type::Vec2: return show(*boost::get<FloatVec2>(&storage));
+        case Type::Vec3: return show(*boost::get<FloatVec3>(&storage));
+        case Type::Vec4: return show(*boost::get<FloatVec4>(&storage));
+        case Type::Mat4: return show(asFloatMat4() ? *asFloatMat4() : detail::neutralMatrix());
+        case Type::Boolean: return show(*boost::get<bool>(&storage));
+        case Type::Image: return show(*boost::get<ImageID>(&storage));
+        case Type::Video: return show(*boost::get<VideoID>(&storage));
+        case Type::Sound: return show(*boost::get<SoundID>(&storage));
+        case Type::Model: return show(*boost::get<ModelID>(&storage));
+        case Type::Path: return show(ifPath() ? *ifPath() : detail::neutralPath());
+        case Type::Unstructured:
+            return show(ifUnstructured() ? *ifUnstructured() : detail::neutralData());
+        case Type::String: break;
+    }
+    return show(ifString() ? *ifString() : detail::neutralString());
+}
+
+inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) noexcept {
     if (typeInfo.type != Type::Float || (!typeInfo.min && !typeInfo.max)) return value;
     double const number = value;
     if (typeInfo.min && detail::lessNumber(number, double(*typeInfo.min))) return *typeInfo.min;
@@ -471,7 +564,7 @@ inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo
 }
 
 inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
-                                     unsigned long long index) {
+                                     unsigned long long index) noexcept {
     if (loop.empty()) return detail::castNullValue(typeInfo);
     return castValueToType(loop[static_cast<std::size_t>(index % loop.size())], typeInfo);
 }

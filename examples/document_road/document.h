@@ -30,11 +30,6 @@ Document readOwnForm(Field const& file);
 // An object with "nodes" and "links".
 Document readNodeGraph(Field const& file);
 
-template <class T>
-tarn::engine::Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-
 // "attributes", or whatever else holds free-form settings, as the records keep them.
 std::map<std::string, tarn::engine::Unstructured> toAttributes(Json const& object);
 

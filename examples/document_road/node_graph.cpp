@@ -110,8 +110,8 @@ private:
                                            " left out: there is no " + missing);
             }
         });
-        patch.children = listOf(std::move(children));
-        patch.connections = listOf(std::move(connections));
+        patch.children = arrayOf(std::move(children));
+        patch.connections = arrayOf(std::move(connections));
     }
 
     Patch node(Field const& field, unsigned long long id, Patch const& parent) {
@@ -160,7 +160,7 @@ private:
             port.attributes = otherKeys(field.object(), {"name", "link", "links"});
             list.push_back(std::move(port));
         });
-        return listOf(std::move(list));
+        return arrayOf(std::move(list));
     }
 
     // Editors give the same time in one unit or two; our kind knows them by tag.
@@ -170,7 +170,7 @@ private:
             bool const milliseconds = lowerCase(port.name).find("ms") != std::string::npos;
             port.tag = milliseconds ? 3 : 1;
         }
-        outputs = listOf(std::move(changed));
+        outputs = arrayOf(std::move(changed));
     }
 
     // The ends of a group find the group's ports by name; here that is turned into tags.
@@ -182,7 +182,7 @@ private:
         for (Port const& port : ofGroup) {
             if (port.name == name && !changed.empty()) changed[0].tag = port.tag;
         }
-        ends = listOf(std::move(changed));
+        ends = arrayOf(std::move(changed));
     }
 
     static Link readLink(Field const& field) {

@@ -129,7 +129,7 @@ public:
         result.outputs = ports(field, "outputs");
         std::vector<Patch> children;
         field.forEach("children", [&](Field const& child) { children.push_back(patch(child)); });
-        result.children = listOf(std::move(children));
+        result.children = arrayOf(std::move(children));
         result.connections = connections(field, *result.children);
         return result;
     }
@@ -170,7 +170,7 @@ private:
             port.attributes = attributes(field);
             list.push_back(std::move(port));
         });
-        return listOf(std::move(list));
+        return arrayOf(std::move(list));
     }
 
     // {"from": [patch, port], "to": [patch, port]}, between children of the same patch.
@@ -182,7 +182,7 @@ private:
             auto const [toPatch, toPort] = end(field, "to", children, &Patch::inputs);
             list.push_back({fromPatch, fromPort, toPatch, toPort});
         });
-        return listOf(std::move(list));
+        return arrayOf(std::move(list));
     }
 
     static std::pair<unsigned long long, unsigned long long> end(Field const& connection,

@@ -12,11 +12,6 @@ using namespace tarn::engine;
 
 namespace {
 
-template <class T>
-Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-
 Port port(unsigned long long id, char const* name) {
     Port result;
     result.id = id;
@@ -67,14 +62,14 @@ int main() {
     input.typeInfo = bounded;
     input.defaultValue = 0.5;
     input.attributes.emplace("hint", "a half");
-    inner.inputs = listOf<Port>({input});
-    inner.outputs = listOf<Port>({port(22, "out")});
+    inner.inputs = arrayOf<Port>({input});
+    inner.outputs = arrayOf<Port>({port(22, "out")});
     Patch root;
     root.id = 1;
     root.name = "root";
     root.builtin = 9;
-    root.children = listOf<Patch>({inner});
-    root.connections = listOf<Connection>({{2, 22, 2, 21}});
+    root.children = arrayOf<Patch>({inner});
+    root.connections = arrayOf<Connection>({{2, 22, 2, 21}});
     EvalPatch evaluated(root);
     PatchIndex index(root);
     EvalPatchIndex evaluatedIndex(evaluated);

@@ -24,6 +24,7 @@ cat > "$work/prelude.h" <<'CPP'
 #include <Engine/Base/patch_index.h>
 #include <Engine/Base/path.h>
 #include <Engine/Base/unstructured.h>
+#include <Engine/Base/vector_math.h>
 #include <Engine/Base/value.h>
 #include <algorithm>
 #include <cstdint>
@@ -38,6 +39,12 @@ extern Path const path;
 extern Port const port;
 extern Patch const patch;
 extern FloatVec2 const vec2;
+struct Derived : Value {
+    using Value::Value;
+};
+extern Derived const derived;
+extern Array<Port> const ports;
+int function(int);
 template <class T>
 void use(T const&);
 CPP

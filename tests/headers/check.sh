@@ -1,6 +1,6 @@
 #!/bin/sh
 # Compiles every public header by itself, twice included, with all warnings as errors; and all of them
-# without exceptions and run-time type information. Boost's macro for smaller variants is refused.
+# without exceptions and run-time type information. So compile records in braces. Boost's macro for smaller variants is refused.
 #
 #     check.sh COMPILER STANDARD INCLUDE_DIR BOOST_DIR
 set -eu
@@ -22,6 +22,10 @@ for header in "$root"/Engine/Base/*.h; do
 done
 echo "$standard: $count headers compile alone"
 [ "$count" -gt 0 ]
+
+"$compiler" "-std=$standard" "-I$root" $boost -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror -fsyntax-only \
+    "$root/tests/headers/braces.cpp"
+echo "$standard: records in braces"
 
 everything() { for header in "$root"/Engine/Base/*.h; do echo "#include <Engine/Base/$(basename "$header")>"; done; }
 everything | "$compiler" "-std=$standard" "-I$root" $boost -fno-exceptions -fno-rtti -Wall -Wextra -Werror -fsyntax-only -x c++ -

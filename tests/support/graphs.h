@@ -13,14 +13,10 @@
 namespace tests {
 
 using tarn::engine::Array;
+using tarn::engine::arrayOf;
 using tarn::engine::Connection;
 using tarn::engine::Patch;
 using tarn::engine::Port;
-
-template <class T>
-Array<T> listOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
 
 inline Port port(unsigned long long id, unsigned long long tag = 0) {
     Port result;
@@ -35,14 +31,14 @@ inline Patch patch(unsigned long long id, std::vector<Patch> children = {},
     Patch result;
     result.id = id;
     result.name = "n" + std::to_string(id);
-    result.children = listOf(std::move(children));
-    result.connections = listOf(std::move(connections));
+    result.children = arrayOf(std::move(children));
+    result.connections = arrayOf(std::move(connections));
     return result;
 }
 
 inline Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> outputs) {
-    base.inputs = listOf(std::move(inputs));
-    base.outputs = listOf(std::move(outputs));
+    base.inputs = arrayOf(std::move(inputs));
+    base.outputs = arrayOf(std::move(outputs));
     return base;
 }
 
@@ -63,14 +59,14 @@ Patch randomPatch(Source& random, int depth) {
         connections.push_back(
             {random.below(4), random.below(12), random.below(4), random.below(12)});
     }
-    result.connections = listOf(std::move(connections));
+    result.connections = arrayOf(std::move(connections));
     std::vector<Patch> children;
     for (std::size_t n = depth > 0 ? random.below(4) : 0; n > 0; --n) {
         children.push_back(random.below(4) == 0 && !children.empty()
                                ? children.back()  // Shares all its lists.
                                : randomPatch(random, depth - 1));
     }
-    result.children = listOf(std::move(children));
+    result.children = arrayOf(std::move(children));
     return result;
 }
 
