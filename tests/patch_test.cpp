@@ -222,6 +222,8 @@ TEST(PatchDeathTest, ANullListIsNamed) {
     EXPECT_ENDS(static_cast<void>(noInputs == Patch{1, 2}), said("inputs != nullptr"));
     EXPECT_ENDS(static_cast<void>(Patch() == noChildren), said("children != nullptr"));
     EXPECT_ENDS(stream << noInputs, said("inputs != nullptr"));
+    Patch noOutputsButInputs{1, 2, "", {}, "", arrayOf({Port{1}}), {}};
+    EXPECT_ENDS(stream << noOutputsButInputs, said("outputs != nullptr"));
     EXPECT_ENDS(stream << noConnections, said("connections != nullptr"));
     EXPECT_ENDS(EvalPatch{noOutputs}, said("outputs != nullptr"));
     EXPECT_ENDS(EvalPatch{noChildren}, said("children != nullptr"));

@@ -114,7 +114,9 @@ TEST(Points, AreMadeInPlaceFromNumbersOfAnyKind) {
     points.emplace_back(7);
     points.emplace_back();
     points.emplace(points.begin(), 9, 8u);
-    EXPECT_EQ(points, (Points{{9, 8}, {1, 2}, {2.5, 3}, {7, 0}, {0, 0}}));
+    points.emplace_back(FloatVec2{5, 6});
+    points.emplace(points.begin(), FloatVec2{3, 4});
+    EXPECT_EQ(points, (Points{{3, 4}, {9, 8}, {1, 2}, {2.5, 3}, {7, 0}, {0, 0}, {5, 6}}));
 }
 
 TEST(Points, AreErasedByValueAndByPredicate) {

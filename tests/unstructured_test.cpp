@@ -444,6 +444,10 @@ TEST(Unstructured, FindsAlongAPath) {
     EXPECT_EQ(data.find({}), &data);
     EXPECT_EQ(data.find({"render", "size", 2}), nullptr);
     EXPECT_EQ(data.find({"render", "size", -1}), nullptr);
+    EXPECT_EQ(data.find({"render", "size", -4294967296LL}), nullptr);
+    EXPECT_EQ(data.find({"render", "size", 1LL << 32}), nullptr);
+    EXPECT_EQ(data.find({"render", "size", ULLONG_MAX}), nullptr);
+    EXPECT_EQ(data.find({static_cast<char const*>(nullptr)}), data.find(""));
     EXPECT_EQ(data.find({"render", 0}), nullptr);
     EXPECT_EQ(data.find({"render", "size", "0"}), nullptr);
     EXPECT_EQ(data.find({"nothing", "size", 0}), nullptr);

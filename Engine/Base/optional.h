@@ -16,7 +16,8 @@ namespace tarn::engine {
 
 /// A flag and, when it is set, a `T`. Stored in place: no allocation beyond the `T`'s own.
 /// Reading an empty one is an assertion failure (function `value`, condition `hasValue()`) in
-/// every build; nothing here throws but the copying of a `T`.
+/// every build; nothing here throws but what a `T` throws when it is made, copied, moved or
+/// compared.
 template <class T>
 class Optional {
 public:
@@ -29,7 +30,9 @@ public:
     template <class U, std::enable_if_t<std::is_same_v<std::decay_t<U>, T>, int> = 0>
     Optional(U&& value) : storage(std::forward<U>(value)) {}
 
-    /// From the standard's optional of the same `T`, and back on request.
+    /// From the standard's optional of the same `T`, and back on request. (Not for a `bool`: there
+    /// the standard's optional takes the answer of `hasValue()` for the value. Write `o ?
+    /// std::optional<bool>(*o) : std::nullopt`.)
     template <class U, std::enable_if_t<std::is_same_v<U, std::optional<T>>, int> = 0>
     Optional(U other) : storage(std::move(other)) {}
     explicit operator std::optional<T>() const& { return storage; }

@@ -23,11 +23,12 @@ bool listsEqual(List const& a, List const& b, char const* condition) {
     return a == b || elementsOf(a, condition) == elementsOf(b, condition);
 }
 
-// `map`, with a condition that names the list.
-template <class Function, class T>
-auto mapped(Function function, Array<T> const& list, char const* condition) {
+// The list, once it is known not to be null. (Conversions recurse: this one is done before they go
+// on.)
+template <class T>
+Array<T> const& checked(Array<T> const& list, char const* condition) {
     static_cast<void>(elementsOf(list, condition));
-    return map(function, list);
+    return list;
 }
 
 // One for each type of element, without an owner.
@@ -165,10 +166,10 @@ EvalPatch::EvalPatch() = default;
 EvalPatch::EvalPatch(Patch const& patch)
     : id(patch.id),
       builtin(patch.builtin),
-      inputs(mapped(toEvalPort, patch.inputs, kInputs)),
-      outputs(mapped(toEvalPort, patch.outputs, kOutputs)),
+      inputs(map(toEvalPort, checked(patch.inputs, kInputs))),
+      outputs(map(toEvalPort, checked(patch.outputs, kOutputs))),
       name(patch.name),
-      children(mapped(toEvalPatch, patch.children, kChildren)),
+      children(map(toEvalPatch, checked(patch.children, kChildren))),
       modelLayer(patch.modelLayer),
       hasInputCount(patch.attributes.count("inputCount") != 0),
       hasOutputCount(patch.attributes.count("outputCount") != 0) {}
@@ -255,8 +256,9 @@ std::ostream& operator<<(std::ostream& stream, Patch const& patch) {
     stream << "[patch:" << patch.id << " name: " << patch.name << " builtin: " << patch.builtin;
     if (elementsOf(patch.inputs, kInputs).empty() && elementsOf(patch.outputs, kOutputs).empty())
         stream << "]";
-    for (Port const& port : *patch.inputs) stream << "  " << port << std::endl;
-    for (Port const& port : *patch.outputs) stream << "  " << port << std::endl;
+    for (Port const& port : elementsOf(patch.inputs, kInputs)) stream << "  " << port << std::endl;
+    for (Port const& port : elementsOf(patch.outputs, kOutputs))
+        stream << "  " << port << std::endl;
     for (Patch const& child : elementsOf(patch.children, kChildren)) stream << child << std::endl;
     for (Connection const& connection : elementsOf(patch.connections, kConnections))
         stream << connection << std::endl;

@@ -266,7 +266,11 @@ MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Functi
     std::vector<T> const& elements = detail::elementsOf(list, "list != nullptr");
     results.reserve(elements.size());
     for (T const& element : elements) {
-        results.push_back(std::invoke(function, element));
+        if constexpr (std::is_member_pointer_v<Function>) {
+            results.push_back(std::invoke(function, element));
+        } else {
+            results.push_back(function(element));  // Without a detour: conversions recurse.
+        }
     }
     return std::make_shared<std::vector<Result>>(std::move(results));
 }

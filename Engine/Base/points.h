@@ -174,7 +174,7 @@ public:
     }
     template <class... Coordinates>
     FloatVec2& emplace_back(Coordinates... coordinates) {
-        push_back(FloatVec2{static_cast<double>(coordinates)...});
+        push_back(pointOf(coordinates...));
         return back();
     }
     void pop_back() {
@@ -209,7 +209,7 @@ public:
     }
     template <class... Coordinates>
     iterator emplace(const_iterator position, Coordinates... coordinates) {
-        return insert(position, FloatVec2{static_cast<double>(coordinates)...});
+        return insert(position, pointOf(coordinates...));
     }
     iterator erase(const_iterator position) { return erase(position, position + 1); }
     iterator erase(const_iterator first, const_iterator last) {
@@ -266,6 +266,12 @@ private:
         FloatVec2 few[kInPlace];
         FloatVec2* many;
     };
+
+    static FloatVec2 pointOf(FloatVec2 point) { return point; }
+    template <class... Coordinates>
+    static FloatVec2 pointOf(Coordinates... coordinates) {
+        return FloatVec2{static_cast<double>(coordinates)...};
+    }
 
     static void check([[maybe_unused]] bool holds, [[maybe_unused]] char const* condition,
                       [[maybe_unused]] char const* function) {

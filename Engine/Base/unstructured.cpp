@@ -357,7 +357,8 @@ bool Unstructured::boolAt(Steps path, bool otherwise, Lookup* lookup) const noex
 std::string Unstructured::stringAt(Steps path, std::string otherwise, Lookup* lookup) const {
     auto const isKind = [](Unstructured const& data) { return data.isString(); };
     Unstructured const* const found = findOfKind(path, isKind, lookup);
-    return found ? *found->ifString() : otherwise;
+    std::string const* const text = found ? found->ifString() : nullptr;
+    return text ? *text : otherwise;
 }
 
 Unstructured::operator FloatVec2() const { return {component(*this, 0), component(*this, 1)}; }

@@ -65,17 +65,25 @@ public:
     /// implicitly, to be written in the braces of a path: `{"render", "size", 0}`.
     class Step {
     public:
-        /// To the element of a map with this key.
-        Step(char const* mapKey) : key(mapKey), isKey(true) {}
+        /// To the element of a map with this key; a null pointer is the empty one.
+        Step(char const* mapKey) : key(mapKey == nullptr ? "" : mapKey), isKey(true) {}
         Step(std::string mapKey) : key(std::move(mapKey)), isKey(true) {}
         /// To the element of an array at this position. A negative one is that of no element.
         template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer> ||
                                                       detail::isUnsignedInteger<Integer>,
                                                   int> = 0>
-        Step(Integer arrayPosition) : position(static_cast<std::size_t>(arrayPosition)) {}
+        Step(Integer arrayPosition) : position(positionOf(arrayPosition)) {}
 
     private:
         friend class Unstructured;
+        // That of no element where it is negative, or more than can be addressed.
+        template <class Integer>
+        static std::size_t positionOf(Integer arrayPosition) {
+            auto const result = static_cast<std::size_t>(arrayPosition);
+            bool const fits =
+                !(arrayPosition < Integer()) && static_cast<Integer>(result) == arrayPosition;
+            return fits ? result : static_cast<std::size_t>(-1);
+        }
         std::string key;
         std::size_t position = 0;
         bool isKey = false;

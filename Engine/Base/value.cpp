@@ -294,7 +294,7 @@ public:
     }
 
 private:
-    char buffer[48];  // A sign, 16 digits, a point of a few bytes, two decimals.
+    char buffer[48] = {};  // A sign, 16 digits, a point of a few bytes, two decimals.
     char* begin = buffer + sizeof buffer;
 };
 
@@ -442,16 +442,17 @@ struct HashOf : boost::static_visitor<std::uint64_t> {
         return hash;
     }
     std::uint64_t operator()(std::shared_ptr<Unstructured const> const& u) const {
-        std::uint64_t hash = 0;
-        if (!u) return hash;
+        if (!u) return 0;
+        std::uint64_t hash = ofElement(*u);
         if (Unstructured::Map const* map = u->ifMap()) {
-            for (auto const& [key, element] : *map) {
-                hash = combine(combine(hash, ofText(key)), ofElement(element));
+            for (auto const& entry : *map) {
+                hash = combine(combine(hash, ofText(entry.first)), ofElement(entry.second));
             }
-        } else if (Unstructured::Array const* array = u->ifArray()) {
+        }
+        if (Unstructured::Array const* array = u->ifArray()) {
             for (Unstructured const& element : *array) hash = combine(hash, ofElement(element));
         }
-        return combine(hash, ofElement(*u));
+        return hash;
     }
     std::uint64_t operator()(std::shared_ptr<std::string const> const& s) const {
         return s ? ofText(*s) : 0;
@@ -725,6 +726,8 @@ std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo) {
 std::size_t
 std::hash<tarn::engine::Value>::operator()(tarn::engine::Value const& value) const noexcept {
     using namespace tarn::engine;
-    return static_cast<std::size_t>(combine(std::uint64_t(value.storage.which()),
-                                            boost::apply_visitor(HashOf(), value.storage)));
+    std::uint64_t const all = combine(std::uint64_t(value.storage.which()),
+                                      boost::apply_visitor(HashOf(), value.storage));
+    // The lower half of a double is often zero, and may be all that is kept.
+    return static_cast<std::size_t>(all ^ all >> 32);
 }

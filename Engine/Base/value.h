@@ -403,7 +403,7 @@ static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they
 }  // namespace tarn::engine
 
 /// Equal values have equal hashes; a NaN has one too. Linear in a path and a string; of data the
-/// first level counts. The number is another one in each process, version and platform.
+/// first level counts. The number may be another one in each process, version and platform.
 template <>
 struct std::hash<tarn::engine::Value> {
     TARN_ENGINE_BASE_EXPORT std::size_t operator()(tarn::engine::Value const& value) const noexcept;
@@ -413,7 +413,8 @@ namespace tarn::engine {
 
 /// The text that an editor shows; not made to be read back. Numbers have two decimals, or one from
 /// 1000 on, without trailing zeros: 2.5, 1234.6, 3; or they are "nan" or "inf", behind "-" where
-/// the sign is set. They are rounded as the rounding mode says. Components of a vector are joined
+/// the sign is set. They are rounded as the rounding mode says, and cut after
+/// 127 characters. Components of a vector are joined
 /// by ", ", and a matrix is four lines of four. Truth is "1" or "0", an identifier its number, a
 /// path "Path" or "Empty Path", data "unstructured" unless it is a string. The decimal point that
 /// is trimmed is that of `std::cout`'s locale at the call; nobody may change that locale meanwhile.

@@ -44,7 +44,8 @@ def main():
                 broken.append(f"{path.name}: {link}: no such place")
     for name in sys.argv[2:]:
         path = pathlib.Path(name)
-        for link in re.findall(r"\]\(([^)#\s]+)[^)]*\)", path.read_text(encoding="utf-8")):
+        text = re.sub(r"^```.*?^```", "", path.read_text(encoding="utf-8"), flags=re.M | re.S)
+        for link in re.findall(r"\]\(([^)#\s]+)[^)]*\)", text):
             if not urllib.parse.urlparse(link).scheme:
                 count += 1
                 if not (path.parent / link).exists():

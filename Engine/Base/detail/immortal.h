@@ -16,7 +16,8 @@ template <class T>
 union Immortal {
     Immortal() : value() {}
     explicit Immortal(T initial) : value(std::move(initial)) {}
-    ~Immortal() {}
+    // By default there would be none.
+    ~Immortal() {}  // NOLINT(modernize-use-equals-default)
 
     T value;
 };

@@ -15,8 +15,8 @@
 
 namespace tarn::engine::detail {
 
-/// A string of its own, as of when this is made; lives until the locale is changed. The C library's other
-/// questions about it may not be asked on two threads at once.
+/// A string of its own, as of when this is made; lives until the locale is changed. The C library's
+/// other questions about it may not be asked on two threads at once.
 #if __has_include(<langinfo.h>)
 struct RadixPoint {
     char const* const text = nl_langinfo(RADIXCHAR);
