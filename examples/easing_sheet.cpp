@@ -3,7 +3,9 @@
 //
 //     easing_sheet > easing_sheet.svg
 
-#include "svg.h"
+#include "curve.h"
+
+#include <Engine/Base/svg_path.h>
 
 #include <iostream>
 
@@ -31,8 +33,8 @@ int main() {
            "  }\n"
            "</style>\n"
         << "<rect class=\"sheet\" width=\"" << width << "\" height=\"" << height << "\"/>\n";
-    double const margin = -svg::kCurveStart * kSize;
-    double const side = (svg::kCurveEnd - svg::kCurveStart) * kSize;
+    double const margin = -kCurveStart * kSize;
+    double const side = (kCurveEnd - kCurveStart) * kSize;
     for (int i = 0; i < count; ++i) {
         // Each cell is a picture of its own, which cuts off what leaves it.
         std::cout << "<svg x=\"" << i % kColumns * kCell + 10.0 << "\" y=\""
@@ -43,11 +45,11 @@ int main() {
                   << "\" width=\"" << side << "\" height=\"" << side << "\"/>\n"
                   << "<rect class=\"way\" y=\"" << -kSize << "\" width=\"" << kSize
                   << "\" height=\"" << kSize << "\"/>\n"
-                  << "<path class=\"curve\" d=\"" << svg::curveData(EasingFunction(i), kSize)
+                  << "<path class=\"curve\" d=\"" << svgPathData(curve(EasingFunction(i), kSize))
                   << "\"/>\n</svg>\n"
                   << "<text x=\"" << i % kColumns * kCell + 10.0 + side / 2 << "\" y=\""
                   << i / kColumns * (kCell + 10.0) + side + 22.0 << "\">"
-                  << svg::escaped(names[static_cast<std::size_t>(i)]) << "</text>\n";
+                  << names[static_cast<std::size_t>(i)] << "</text>\n";
     }
     std::cout << "</svg>\n";
 }

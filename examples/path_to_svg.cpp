@@ -3,7 +3,7 @@
 //
 //     path_to_svg > path.svg
 
-#include "svg.h"
+#include <Engine/Base/svg_path.h>
 
 #include <iostream>
 
@@ -47,8 +47,8 @@ Handles handlesOf(Path const& path) {
 
 void writeDots(std::vector<FloatVec2> const& dots, char const* color) {
     for (FloatVec2 const p : dots) {
-        std::cout << "<circle cx=\"" << svg::number(p.x) << "\" cy=\"" << svg::number(p.y)
-                  << "\" r=\"1.2\" fill=\"" << color << "\"/>\n";
+        std::cout << "<circle cx=\"" << p.x << "\" cy=\"" << p.y << "\" r=\"1.2\" fill=\"" << color
+                  << "\"/>\n";
     }
 }
 
@@ -66,9 +66,9 @@ int main() {
         << "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 100 70\" role=\"img\" "
            "aria-label=\"A path with its points and handles\">\n"
         << "<rect width=\"100\" height=\"70\" fill=\"#1b2028\"/>\n"
-        << "<path d=\"" << svg::pathData(path)
+        << "<path d=\"" << svgPathData(path)
         << "\" fill=\"#2b4a63\" fill-rule=\"evenodd\" stroke=\"#8fd0ff\" stroke-width=\"0.8\"/>\n"
-        << "<path d=\"" << svg::pathData(handles.lines.build())
+        << "<path d=\"" << svgPathData(handles.lines.build())
         << "\" fill=\"none\" stroke=\"#ffb454\" stroke-width=\"0.4\"/>\n";
     writeDots(handles.controls, "#ffb454");
     writeDots(handles.points, "#ffffff");

@@ -10,6 +10,7 @@
 #include <array>
 #include <climits>
 #include <cmath>
+#include <sstream>
 
 using namespace tarn::engine;
 
@@ -152,6 +153,18 @@ TEST(EasingFunction, HasItsNumberAndItsName) {
     changed[0] = "changed";
     EXPECT_EQ(easingFunctionNames()[0], "Linear");
     static_assert(std::is_same_v<std::underlying_type_t<EF>, std::int32_t>);
+}
+
+TEST(EasingFunction, IsWrittenByItsName) {
+    std::vector<std::string> const names = easingFunctionNames();
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        std::ostringstream stream;
+        stream << EasingFunction(i);
+        EXPECT_EQ(stream.str(), names[i]);
+    }
+    std::ostringstream others;
+    others << EasingFunction(13) << " " << EasingFunction(-1);
+    EXPECT_EQ(others.str(), "EasingFunction(13) EasingFunction(-1)");
 }
 
 TEST(EasingFunction, IsFoundByItsName) {

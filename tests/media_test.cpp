@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <sstream>
+
 using namespace tarn::engine;
 
 TEST(KeyboardTypes, AreOneListOfTwelve) {
@@ -91,4 +93,16 @@ TEST(MediaContainer, HasOneExtension) {
     for (int number : {0, 7, 255}) {
         EXPECT_EQ(extensionForMediaContainer(MediaContainer(number)), "") << number;
     }
+}
+
+TEST(Media, KindsAreWrittenByTheirEnumerators) {
+    std::ostringstream formats;
+    for (int number = 0; number < 5; ++number) formats << ImageFormat(number) << " ";
+    formats << ImageFormat(255);
+    EXPECT_EQ(formats.str(), "Unknown ImageFormat(1) JPEG PNG ImageFormat(4) ImageFormat(255)");
+    std::ostringstream containers;
+    for (int number = 0; number < 8; ++number) containers << MediaContainer(number) << " ";
+    containers << MediaContainer(255);
+    EXPECT_EQ(containers.str(),
+              "Unknown MOV MP4 AIFF MP3 WAV M4A MediaContainer(7) MediaContainer(255)");
 }

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <sstream>
 
 using namespace tarn::engine;
 
@@ -58,6 +59,14 @@ TEST(PathInstruction, HasItsNumberAndItsName) {
         EXPECT_EQ(stringToPathInstruction(row.name), row.instruction);
     }
     static_assert(std::is_same_v<std::underlying_type_t<PathInstruction>, unsigned char>);
+}
+
+TEST(PathInstruction, IsWrittenByItsName) {
+    std::ostringstream stream;
+    for (unsigned char i = 0; i < 6; ++i) stream << PathInstruction(i) << " ";
+    stream << PathInstruction(255);
+    EXPECT_EQ(stream.str(),
+              "moveTo lineTo curveTo quadCurveTo close PathInstruction(5) PathInstruction(255)");
 }
 
 TEST(PathInstruction, IsParsedWhereTheNameMayBeAnything) {

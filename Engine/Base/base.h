@@ -1,4 +1,4 @@
-// Engine/Base/base.h: everything, for those who want one include.
+// Engine/Base/base.h: everything but json.h, for those who want one include.
 //
 //     #include <Engine/Base/base.h>
 //     using namespace tarn::engine;

@@ -4,6 +4,7 @@
 
 #include <array>
 #include <cmath>
+#include <ostream>
 
 namespace tarn::engine {
 
@@ -163,6 +164,12 @@ Optional<EasingFunction> stringToEasingFunction(std::string const& name) {
         if (kNames[i] == name) return EasingFunction(i);
     }
     return std::nullopt;
+}
+
+std::ostream& operator<<(std::ostream& stream, EasingFunction function) {
+    auto const i = static_cast<std::size_t>(function);
+    if (i >= kNames.size()) return stream << "EasingFunction(" << int(function) << ")";
+    return stream << kNames[i];
 }
 
 template <>

@@ -10,6 +10,7 @@
 #include <Engine/Base/value.h>
 
 #include <cstdint>
+#include <iosfwd>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -39,6 +40,9 @@ TARN_ENGINE_BASE_EXPORT std::vector<std::string> easingFunctionNames();
 
 /// The curve of that name, byte by byte; empty for any other text.
 TARN_ENGINE_BASE_EXPORT Optional<EasingFunction> stringToEasingFunction(std::string const& name);
+
+/// Writes the name that an editor shows; "EasingFunction(77)" for what is no enumerator.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, EasingFunction function);
 
 /// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
 /// `FloatVec3` and `FloatVec4`; other types do not compile.

@@ -5,6 +5,7 @@
 #include <array>
 #include <cctype>
 #include <cstddef>
+#include <ostream>
 #include <string_view>
 #include <utility>
 
@@ -54,6 +55,28 @@ std::string extensionForKind(std::array<Extension<Kind>, count> const& table, Ki
 }
 
 }  // namespace
+
+std::ostream& operator<<(std::ostream& stream, ImageFormat format) {
+    switch (format) {
+        case ImageFormat::Unknown: return stream << "Unknown";
+        case ImageFormat::JPEG: return stream << "JPEG";
+        case ImageFormat::PNG: return stream << "PNG";
+    }
+    return stream << "ImageFormat(" << int(format) << ")";
+}
+
+std::ostream& operator<<(std::ostream& stream, MediaContainer container) {
+    switch (container) {
+        case MediaContainer::Unknown: return stream << "Unknown";
+        case MediaContainer::MOV: return stream << "MOV";
+        case MediaContainer::MP4: return stream << "MP4";
+        case MediaContainer::AIFF: return stream << "AIFF";
+        case MediaContainer::MP3: return stream << "MP3";
+        case MediaContainer::WAV: return stream << "WAV";
+        case MediaContainer::M4A: return stream << "M4A";
+    }
+    return stream << "MediaContainer(" << int(container) << ")";
+}
 
 std::vector<std::string> const& keyboardTypes() {
     static detail::Immortal<std::vector<std::string>> const names(

@@ -8,6 +8,7 @@
 
 #include <Engine/Base/export.h>
 
+#include <iosfwd>
 #include <string>
 #include <vector>
 
@@ -30,6 +31,11 @@ enum class MediaContainer : unsigned char {
     WAV = 5,
     M4A = 6,
 };
+
+/// Writes the enumerator, such as "JPEG"; "ImageFormat(1)" or "MediaContainer(77)" for what is
+/// none.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, ImageFormat format);
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, MediaContainer container);
 
 /// The twelve kinds of on-screen keyboard, "Default" first. One list that lives to program exit.
 TARN_ENGINE_BASE_EXPORT std::vector<std::string> const& keyboardTypes();

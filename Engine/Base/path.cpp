@@ -7,6 +7,7 @@
 #include <array>
 #include <cstddef>
 #include <iterator>
+#include <ostream>
 #include <string_view>
 
 namespace tarn::engine {
@@ -51,6 +52,13 @@ PathInstruction stringToPathInstruction(std::string const& name) {
     Optional<PathInstruction> const instruction = parsePathInstruction(name);
     if (!instruction) assertionFailed("0", __func__, kModule, __LINE__);
     return *instruction;
+}
+
+std::ostream& operator<<(std::ostream& stream, PathInstruction instruction) {
+    if (std::size_t(instruction) >= kInstructionNames.size()) {
+        return stream << "PathInstruction(" << int(instruction) << ")";
+    }
+    return stream << kInstructionNames[std::size_t(instruction)];
 }
 
 bool PathElement::operator==(PathElement const& other) const {

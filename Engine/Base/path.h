@@ -12,6 +12,7 @@
 #include <Engine/Base/value.h>
 
 #include <cstddef>
+#include <iosfwd>
 #include <memory>
 #include <string>
 #include <type_traits>
@@ -37,6 +38,9 @@ TARN_ENGINE_BASE_EXPORT PathInstruction stringToPathInstruction(std::string cons
 
 /// The same, empty for any other text.
 TARN_ENGINE_BASE_EXPORT Optional<PathInstruction> parsePathInstruction(std::string const& name);
+
+/// Writes the name; "PathInstruction(77)" for what is no enumerator.
+TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, PathInstruction instruction);
 
 /// One instruction with its points. Their number is not checked against the instruction.
 struct PathElement {

@@ -1,6 +1,7 @@
 #include <Engine/Base/svg_path.h>
 
 #include <Engine/Base/detail/radix_point.h>
+#include <Engine/Base/detail/shortest_number.h>
 #include <Engine/Base/vector_math.h>
 
 #include <algorithm>
@@ -19,77 +20,14 @@ namespace tarn::engine {
 
 namespace {
 
-// The digits of the shortest decimal number that reads back to `number`, and the power of ten of
-// the first of them.
-struct Shortest {
-    std::string digits;
-    int exponent = 0;
-};
-
-// From "-d.ddde-xx", with any decimal point.
-Shortest taken(std::string_view scientific) {
-    Shortest result;
-    std::size_t const e = scientific.find('e');
-    for (char c : scientific.substr(0, e)) {
-        if (c >= '0' && c <= '9') result.digits += c;
-    }
-    result.exponent =
-        static_cast<int>(std::strtol(std::string(scientific.substr(e + 1)).c_str(), nullptr, 10));
-    return result;
-}
-
-// For a finite number.
-Shortest shortest(double number) {
-    char buffer[64];
-#if defined(__cpp_lib_to_chars)
-    auto const end = std::to_chars(buffer, std::end(buffer), number, std::chars_format::scientific);
-    return taken({buffer, static_cast<std::size_t>(end.ptr - buffer)});
-#else
-    for (int digits = 1;; ++digits) {
-        std::snprintf(buffer, sizeof buffer, "%.*e", digits - 1, number);
-        if (digits == 17 || std::strtod(buffer, nullptr) == number) return taken(buffer);
-    }
-#endif
-}
-
-// As people write numbers, and with an exponent where that would be long: from 1e21 on, and below
-// 1e-6.
-void append(std::string& text, double number) {
-    if (std::isnan(number)) number = 0.0;
-    constexpr double kLargest = std::numeric_limits<double>::max();
-    number = std::clamp(number, -kLargest, kLargest);
-    if (std::signbit(number)) text += '-';
-    auto [digits, exponent] = shortest(std::abs(number));
-    auto const count = static_cast<int>(digits.size());
-    if (exponent < -6 || exponent >= 21) {
-        if (count > 1) digits.insert(1, ".");
-        text += digits + "e" + std::to_string(exponent);
-    } else if (exponent < 0) {
-        text += "0." + std::string(static_cast<std::size_t>(-exponent) - 1, '0') + digits;
-    } else {
-        if (count <= exponent)
-            digits.append(static_cast<std::size_t>(exponent) + 1 - digits.size(), '0');
-        if (count > exponent + 1) digits.insert(static_cast<std::size_t>(exponent) + 1, ".");
-        text += digits;
-    }
-}
-
 constexpr double kPi = 3.141592653589793;
 
-// While it lives, numbers are rounded to the nearest, in the C library too.
-class NearestRounding {
-public:
-    NearestRounding() : before(std::fegetround()) { set(FE_TONEAREST); }
-    ~NearestRounding() { set(before); }
-    NearestRounding(NearestRounding const&) = delete;
-    NearestRounding& operator=(NearestRounding const&) = delete;
-
-private:
-    void set(int mode) const {
-        if (before != FE_TONEAREST) std::fesetround(mode);
-    }
-    int before;
-};
+// Of a number that may not be finite, which is nothing that SVG could write.
+void append(std::string& text, double number) {
+    constexpr double kLargest = std::numeric_limits<double>::max();
+    detail::appendShortest(text,
+                           std::isnan(number) ? 0.0 : std::clamp(number, -kLargest, kLargest));
+}
 
 // Reads path data into a builder, command by command.
 class Reader {
@@ -363,7 +301,7 @@ private:
 }  // namespace
 
 std::string svgPathData(Path const& path) {
-    NearestRounding const rounding;
+    detail::NearestRounding const rounding;
     std::string data;
     for (PathElement const& element : path.elements) {
         char letter = 0;
@@ -389,7 +327,7 @@ std::string svgPathData(Path const& path) {
 }
 
 Optional<Path> pathFromSvgPathData(std::string const& data, std::size_t* fault) {
-    NearestRounding const rounding;
+    detail::NearestRounding const rounding;
     Reader reader(data);
     if (reader.read()) return reader.takePath();
     if (fault != nullptr) *fault = reader.faultPosition();

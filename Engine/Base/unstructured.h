@@ -219,6 +219,17 @@ public:
     TARN_ENGINE_BASE_EXPORT std::string stringAt(Steps path, std::string otherwise,
                                                  Lookup* lookup = nullptr) const;
 
+    /// A text for people, on one line, in the manner of JSON: `{"id": 7u, "size": [80.0, 50.5]}`.
+    /// Kinds can be told apart: a floating-point number has a point, an exponent or is "nan" or
+    /// "inf", an unsigned one ends in "u", null is "null". Strings are in quotes, in UTF-8: control
+    /// characters and bytes that are none stand as "\\n", "\\t", "\\r" or "\\x1f".
+    ///
+    /// `maxDepth` levels of maps and arrays are shown; a deeper one is "{...}" or "[...]", unless
+    /// it is empty. The text has at most `maxBytes` bytes: what would be longer ends in "..."
+    /// there. The cost follows the text, not the tree; nothing recurses.
+    TARN_ENGINE_BASE_EXPORT std::string toText(std::size_t maxBytes = 4096,
+                                               std::size_t maxDepth = 16) const;
+
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
     /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
     /// fills every component. Everything else is zero. Nothing is allocated.

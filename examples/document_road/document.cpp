@@ -14,6 +14,6 @@ Document parseDocument(std::string const& text) {
 
 std::map<std::string, Unstructured> toAttributes(Json const& object) {
     std::map<std::string, Unstructured> result;
-    for (auto const& [key, member] : object.items()) result.emplace(key, toUnstructured(member));
+    for (auto const& [key, member] : object.items()) result.emplace(key, fromJson(member));
     return result;
 }

@@ -1,9 +1,9 @@
 #include "drawing.h"
 
 #include "evaluator.h"
+#include "markup.h"
 #include "page_files.h"
 #include "report.h"
-#include "svg.h"
 
 #include <algorithm>
 #include <cmath>
@@ -11,8 +11,6 @@
 #include <unordered_map>
 
 using namespace tarn::engine;
-using svg::escaped;
-using svg::number;
 
 namespace {
 
@@ -38,7 +36,7 @@ std::string wire(Connection const& connection, Anchor const& from, Anchor const&
                           .build();
     return "<path class=\"t-" + typeToString(from.type) + "\" data-from=\"" +
            std::to_string(connection.fromPortId) + "\" data-to=\"" +
-           std::to_string(connection.toPortId) + "\" d=\"" + svg::pathData(path) + "\"/>\n";
+           std::to_string(connection.toPortId) + "\" d=\"" + pathData(path) + "\"/>\n";
 }
 
 void addAttributes(std::vector<std::string>& parts,

@@ -6,13 +6,15 @@
 #ifndef DOCUMENT_ROAD_INPUT_H
 #define DOCUMENT_ROAD_INPUT_H
 
-#include "json.h"
+#include <Engine/Base/json.h>
 
 #include <cstddef>
 #include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
+
+using Json = nlohmann::json;
 
 // Deeper input is refused: everything that reads a document afterwards may recurse over it.
 constexpr std::size_t kDeepestNesting = 1000;

@@ -43,7 +43,7 @@ TypeInfo typeInfoOf(Json const& type) {
 
 // A setting as a port's value: converted where that keeps it, so that "5" is 5 for a number.
 Value asDefault(Json const& setting, Type type) {
-    Value const data = toUnstructured(setting);
+    Value const data = fromJson(setting);
     if (setting.is_string()) return Value(setting.get<std::string>()).asType(type);
     return data.asType(type);
 }

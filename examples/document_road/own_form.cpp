@@ -73,7 +73,7 @@ Value value(Field const& field, Type type) {
         case Type::Model: return Value(field.identifier(), type);
         case Type::Path: return path(field);
         case Type::String: return field.text();
-        case Type::Unstructured: return toUnstructured(field.raw());
+        case Type::Unstructured: return fromJson(field.raw());
     }
     field.refuse("this type has no values");
 }
@@ -92,7 +92,7 @@ TypeInfo typeInfo(Field const& port) {
     }
     if (port.has("min")) info.min = value(port.at("min"), info.type);
     if (port.has("max")) info.max = value(port.at("max"), info.type);
-    if (port.has("extra")) info.extra = Value(toUnstructured(port.at("extra").raw()));
+    if (port.has("extra")) info.extra = Value(fromJson(port.at("extra").raw()));
     return info;
 }
 

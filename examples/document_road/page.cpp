@@ -1,10 +1,11 @@
 #include "page.h"
 
+#include "curve.h"
 #include "drawing.h"
 #include "evaluator.h"
+#include "markup.h"
 #include "page_files.h"
 #include "report.h"
-#include "svg.h"
 
 #include <Engine/Base/easing.h>
 
@@ -16,8 +17,6 @@
 #include <unordered_map>
 
 using namespace tarn::engine;
-using svg::escaped;
-using svg::number;
 
 namespace {
 
@@ -350,8 +349,8 @@ std::string legendText(Document const& document) {
 
 std::string curvesText() {
     constexpr double kSize = 100.0;
-    double const side = (svg::kCurveEnd - svg::kCurveStart) * kSize;
-    double const margin = -svg::kCurveStart * kSize;
+    double const side = (kCurveEnd - kCurveStart) * kSize;
+    double const margin = -kCurveStart * kSize;
     std::ostringstream text;
     std::vector<std::string> const names = easingFunctionNames();
     for (std::size_t i = 0; i < names.size(); ++i) {
@@ -360,7 +359,7 @@ std::string curvesText() {
              << "\"><rect class=\"beyond\" x=\"" << -margin << "\" y=\"" << margin - side
              << "\" width=\"" << side << "\" height=\"" << side << "\"/><rect class=\"way\" y=\""
              << -kSize << "\" width=\"" << kSize << "\" height=\"" << kSize << "\"/><path d=\""
-             << svg::curveData(EasingFunction(i), kSize) << "\"/></svg><figcaption>"
+             << pathData(curve(EasingFunction(i), kSize)) << "\"/></svg><figcaption>"
              << escaped(names[i]) << "</figcaption></figure>\n";
     }
     return text.str();
@@ -394,13 +393,12 @@ std::string shapesText() {
              << "</figcaption><svg class=\"points\" role=\"img\" aria-label=\"" << shape.call
              << "\" viewBox=\"" << number(bounds.left) << " " << number(bounds.top) << " "
              << number(bounds.right - bounds.left) << " " << number(bounds.bottom - bounds.top)
-             << "\"><path class=\"outline\" d=\"" << svg::pathData(shape.path)
-             << "\"/></svg>\n<ol>";
+             << "\"><path class=\"outline\" d=\"" << pathData(shape.path) << "\"/></svg>\n<ol>";
         for (PathElement const& element : shape.path.elements) {
             text << "<li>" << pathInstructionToString(element.instruction);
             char const* before = " ";
             for (FloatVec2 const p : element.points) {
-                text << before << svg::point(p);
+                text << before << point(p);
                 before = ", ";
             }
             text << "</li>\n";

@@ -2,7 +2,7 @@
 
 #include "evaluator.h"
 #include "kinds.h"
-#include "svg.h"
+#include "markup.h"
 
 #include <algorithm>
 
@@ -25,7 +25,7 @@ std::vector<Drawn> Scene::now() const {
     auto const draw = [&](std::string const& name, Value const& value) -> Drawn* {
         Path const* const path = value.ifPath();
         if (path == nullptr || path->elements.empty()) return nullptr;
-        result.push_back({name, *path, svg::pathData(*path), false, {}, 0.0});
+        result.push_back({name, *path, pathData(*path), false, {}, 0.0});
         return &result.back();
     };
     for (ShownOutput const& output : paths) {

@@ -1,5 +1,5 @@
 #!/bin/sh
-# Runs an example and compares what it prints with a file, whole.
+# Runs an example and compares all that it prints with a file.
 #
 #     check.sh EXPECTED PROGRAM [ARGUMENT...]
 set -eu
@@ -8,6 +8,6 @@ expected=$1
 shift
 actual=$(mktemp)
 trap 'rm -f "$actual"' EXIT
-"$@" > "$actual"
+"$@" > "$actual" 2>&1
 [ -s "$expected" ]
 cmp "$expected" "$actual" || { diff "$expected" "$actual"; exit 1; }

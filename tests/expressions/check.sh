@@ -23,12 +23,15 @@ cat > "$work/prelude.h" <<'CPP'
 #include <Engine/Base/patch.h>
 #include <Engine/Base/patch_index.h>
 #include <Engine/Base/path.h>
+#include <Engine/Base/path_geometry.h>
+#include <Engine/Base/svg_path.h>
 #include <Engine/Base/unstructured.h>
 #include <Engine/Base/vector_math.h>
 #include <Engine/Base/value.h>
 #include <algorithm>
 #include <cstdint>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <string_view>
 #include <utility>

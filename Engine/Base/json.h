@@ -1,0 +1,148 @@
+// Engine/Base/json.h: JSON and `Unstructured`, either way. Needs nlohmann-json 3.
+//
+//     Unstructured data = fromJson(nlohmann::json::parse(R"({"tags": ["intro", true]})"));
+//     std::string text = toJson(data).dump();  // {"tags":["intro",1]}
+
+#ifndef TARN_ENGINE_BASE_JSON_H
+#define TARN_ENGINE_BASE_JSON_H
+
+#include <Engine/Base/unstructured.h>
+
+#include <nlohmann/json.hpp>
+
+#include <limits>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace tarn::engine {
+
+/// What the document says: an object is a map, an array an array, a string its bytes. A bool is the
+/// integer 1 or 0. An integer is signed where it fits into 64 bits so, else unsigned; a number with
+/// a fraction or an exponent is a floating-point one. Binary values, which no JSON text has, are
+/// null.
+///
+/// Linear. Documents of any depth: nothing here recurses. Throws where memory fails, and nothing
+/// else.
+inline Unstructured fromJson(nlohmann::json const& json);
+
+/// The same way back; an unsigned integer stays one. JSON has no NaN and no infinity: `dump` writes
+/// them as null. Strings of data are any bytes: `dump` throws at those that are not UTF-8, unless
+/// it is told otherwise (`nlohmann::json::error_handler_t::replace`).
+///
+/// Linear, and nothing here recurses; `dump` does, and a document is destroyed as nlohmann-json
+/// destroys it. Throws where memory fails, and nothing else.
+inline nlohmann::json toJson(Unstructured const& data);
+
+// Implementation
+
+namespace detail {
+
+// Whatever has no parts.
+inline Unstructured leafFromJson(nlohmann::json const& json) {
+    using Kind = nlohmann::json::value_t;
+    switch (json.type()) {
+        case Kind::string: return *json.get_ptr<std::string const*>();
+        case Kind::boolean: return json.get<bool>() ? 1 : 0;
+        case Kind::number_integer: return static_cast<long long>(json.get<std::int64_t>());
+        case Kind::number_unsigned: {
+            auto const number = static_cast<unsigned long long>(json.get<std::uint64_t>());
+            constexpr auto kLargest =
+                static_cast<unsigned long long>(std::numeric_limits<long long>::max());
+            if (number > kLargest) return number;
+            return static_cast<long long>(number);
+        }
+        case Kind::number_float: return json.get<double>();
+        case Kind::object:
+        case Kind::array:
+        case Kind::null:
+        case Kind::binary:
+        case Kind::discarded: break;
+    }
+    return Unstructured();
+}
+
+inline nlohmann::json leafToJson(Unstructured const& data) {
+    switch (data.type()) {
+        case Unstructured::Type::Float: return data.asFloat();
+        case Unstructured::Type::Integer: return data.asInteger();
+        case Unstructured::Type::UnsignedInteger: return data.asId();
+        case Unstructured::Type::String: return *data.ifString();
+        case Unstructured::Type::Null:
+        case Unstructured::Type::Map:
+        case Unstructured::Type::Array: break;
+    }
+    return nullptr;
+}
+
+}  // namespace detail
+
+inline Unstructured fromJson(nlohmann::json const& json) {
+    // An object or an array with those of its elements that are done.
+    struct Level {
+        nlohmann::json const* json;
+        nlohmann::json::const_iterator next;
+        Unstructured::Map map;
+        Unstructured::Array array;
+    };
+    if (!json.is_structured()) return detail::leafFromJson(json);
+    std::vector<Level> open;
+    auto const enter = [&open](nlohmann::json const& entered) {
+        open.push_back({&entered, entered.begin(), {}, {}});
+        if (entered.is_array()) open.back().array.reserve(entered.size());
+    };
+    enter(json);
+    for (;;) {
+        Level& level = open.back();
+        if (level.next != level.json->end() && level.next->is_structured()) {
+            enter(*level.next);
+            continue;
+        }
+        Unstructured done;
+        if (level.next != level.json->end()) {
+            done = detail::leafFromJson(*level.next);
+        } else {
+            done = level.json->is_object() ? Unstructured(std::move(level.map))
+                                           : Unstructured(std::move(level.array));
+            open.pop_back();
+            if (open.empty()) return done;
+        }
+        Level& around = open.back();
+        if (around.json->is_object()) {
+            around.map.emplace_hint(around.map.end(), around.next.key(), std::move(done));
+        } else {
+            around.array.push_back(std::move(done));
+        }
+        ++around.next;
+    }
+}
+
+inline nlohmann::json toJson(Unstructured const& data) {
+    nlohmann::json result;
+    // Maps and arrays, and where they go.
+    std::vector<std::pair<Unstructured const*, nlohmann::json*>> pending;
+    auto const place = [&pending](Unstructured const& from, nlohmann::json& to) {
+        if (from.isMap() || from.isArray()) {
+            pending.emplace_back(&from, &to);
+        } else {
+            to = detail::leafToJson(from);
+        }
+    };
+    place(data, result);
+    while (!pending.empty()) {
+        auto const [from, to] = pending.back();
+        pending.pop_back();
+        if (Unstructured::Map const* const map = from->ifMap()) {
+            *to = nlohmann::json::object();
+            for (auto const& [key, element] : *map) place(element, (*to)[key]);
+        } else {
+            *to = nlohmann::json::array_t(from->size());
+            for (std::size_t i = 0; i < from->size(); ++i) place(*from->find(i), (*to)[i]);
+        }
+    }
+    return result;
+}
+
+}  // namespace tarn::engine
+
+#endif
