@@ -39,6 +39,7 @@ function(tarn_find_part part)
     set(${option} OFF PARENT_SCOPE)
 endfunction()
 
+tarn_find_part(DOCUMENT PACKAGES "nlohmann_json 3.11")
 tarn_find_part(EXAMPLES PACKAGES "nlohmann_json 3.11" "CLI11 2.1")
 
 # Debian's GoogleTest is compiled for this machine and g++'s library; for others it has the sources.

@@ -1,6 +1,7 @@
 #include <Engine/Base/unstructured.h>
 
 #include <Engine/Base/detail/shortest_number.h>
+#include <Engine/Base/detail/utf8.h>
 
 #include <algorithm>
 #include <cmath>
@@ -9,28 +10,6 @@
 namespace tarn::engine {
 
 namespace {
-
-bool isContinuation(char c) { return (static_cast<unsigned char>(c) & 0xc0u) == 0x80u; }
-
-// The number of bytes of the character of UTF-8 that the text begins with; 0 where it begins with
-// none: overlong forms, halves of UTF-16 pairs and what is beyond U+10FFFF are none.
-std::size_t characterLength(std::string_view text) {
-    auto const byte = [&](std::size_t i) { return static_cast<unsigned char>(text[i]); };
-    unsigned const first = byte(0);
-    std::size_t const length = first < 0x80                     ? 1
-                               : first >= 0xc2 && first <= 0xdf ? 2
-                               : first >= 0xe0 && first <= 0xef ? 3
-                               : first >= 0xf0 && first <= 0xf4 ? 4
-                                                                : 0;
-    if (length == 0 || length > text.size()) return 0;
-    for (std::size_t i = 1; i < length; ++i) {
-        if (!isContinuation(text[i])) return 0;
-    }
-    bool const isRefused = (first == 0xe0 && byte(1) < 0xa0) ||
-                           (first == 0xed && byte(1) >= 0xa0) ||
-                           (first == 0xf0 && byte(1) < 0x90) || (first == 0xf4 && byte(1) >= 0x90);
-    return isRefused ? 0 : length;
-}
 
 // Writes a tree until the text is long enough.
 class Writer {
@@ -60,7 +39,7 @@ private:
     void cut() {
         constexpr std::string_view kDots = "...";
         std::size_t length = byteLimit - std::min(byteLimit, kDots.size());
-        while (length > 0 && isContinuation(text[length])) --length;
+        while (length > 0 && detail::isUtf8Continuation(text[length])) --length;
         text.resize(length);
         text += kDots.substr(0, byteLimit);
     }
@@ -130,7 +109,7 @@ private:
     void writeString(std::string_view string) {
         text += '"';
         while (!string.empty() && !isFull()) {
-            std::size_t const length = characterLength(string);
+            std::size_t const length = detail::utf8Length(string);
             auto const byte = static_cast<unsigned char>(string[0]);
             if (length == 0 || byte < 0x20 || byte == 0x7f) {
                 writeEscape(string[0]);

@@ -19,10 +19,14 @@ public:
     std::size_t count() const;
     /// How many blocks more there are than when this was made: those not given back.
     std::size_t held() const;
+    /// How many bytes more there were at some time than when this was made; of the counter that was
+    /// made last.
+    std::size_t peakBytes() const;
 
 private:
     std::size_t start;
     std::size_t startReleased;
+    std::size_t startBytes;
 };
 
 /// While it lives, the allocation after `succeeding` further ones throws `std::bad_alloc`; those

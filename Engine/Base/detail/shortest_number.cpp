@@ -6,41 +6,21 @@
 #include <cstdio>
 #include <cstdlib>
 #include <iterator>
-#include <string_view>
 
 namespace tarn::engine::detail {
 
 namespace {
 
-// The digits of the shortest decimal number that reads back to `number`, and the power of ten of
-// the first of them.
-struct Shortest {
-    std::string digits;
-    int exponent = 0;
-};
-
-// From "-d.ddde-xx", with any decimal point.
-Shortest taken(std::string_view scientific) {
-    Shortest result;
-    std::size_t const e = scientific.find('e');
-    for (char c : scientific.substr(0, e)) {
-        if (c >= '0' && c <= '9') result.digits += c;
-    }
-    result.exponent =
-        static_cast<int>(std::strtol(std::string(scientific.substr(e + 1)).c_str(), nullptr, 10));
-    return result;
-}
-
-// For a finite number.
-Shortest shortest(double number) {
-    char buffer[64];
+// "d.ddde-xx", with any decimal point: the shortest that reads back to `number`, which is not
+// negative. Returns its end.
+char* writeScientific(char* begin, char* end, double number) {
 #if defined(__cpp_lib_to_chars)
-    auto const end = std::to_chars(buffer, std::end(buffer), number, std::chars_format::scientific);
-    return taken({buffer, static_cast<std::size_t>(end.ptr - buffer)});
+    return std::to_chars(begin, end, number, std::chars_format::scientific).ptr;
 #else
+    auto const size = static_cast<std::size_t>(end - begin);
     for (int digits = 1;; ++digits) {
-        std::snprintf(buffer, sizeof buffer, "%.*e", digits - 1, number);
-        if (digits == 17 || std::strtod(buffer, nullptr) == number) return taken(buffer);
+        int const length = std::snprintf(begin, size, "%.*e", digits - 1, number);
+        if (digits == 17 || std::strtod(begin, nullptr) == number) return begin + length;
     }
 #endif
 }
@@ -49,18 +29,34 @@ Shortest shortest(double number) {
 
 void appendShortest(std::string& text, double number) {
     if (std::signbit(number)) text += '-';
-    auto [digits, exponent] = shortest(std::abs(number));
-    auto const count = static_cast<int>(digits.size());
+    char scientific[64];
+    char* const end = writeScientific(scientific, std::end(scientific), std::abs(number));
+    char digits[32];
+    std::size_t count = 0;
+    char const* c = scientific;
+    for (; *c != 'e'; ++c) {
+        if (*c >= '0' && *c <= '9') digits[count++] = *c;
+    }
+    bool const isBelowOne = *++c == '-';
+    int exponent = 0;  // The power of ten of the first digit.
+    for (++c; c != end; ++c) exponent = exponent * 10 + (*c - '0');
+    if (isBelowOne) exponent = -exponent;
+
     if (exponent < -6 || exponent >= 21) {
-        if (count > 1) digits.insert(1, ".");
-        text += digits + "e" + std::to_string(exponent);
+        text += digits[0];
+        if (count > 1) (text += '.').append(digits + 1, count - 1);
+        (text += 'e') += std::to_string(exponent);
     } else if (exponent < 0) {
-        text += "0." + std::string(static_cast<std::size_t>(-exponent) - 1, '0') + digits;
+        text.append("0.")
+            .append(static_cast<std::size_t>(-exponent) - 1, '0')
+            .append(digits, count);
     } else {
-        if (count <= exponent)
-            digits.append(static_cast<std::size_t>(exponent) + 1 - digits.size(), '0');
-        if (count > exponent + 1) digits.insert(static_cast<std::size_t>(exponent) + 1, ".");
-        text += digits;
+        std::size_t const whole = static_cast<std::size_t>(exponent) + 1;
+        if (count <= whole) {
+            text.append(digits, count).append(whole - count, '0');
+        } else {
+            text.append(digits, whole).append(1, '.').append(digits + whole, count - whole);
+        }
     }
 }
 

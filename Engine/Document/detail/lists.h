@@ -1,0 +1,36 @@
+// Engine/Document/detail/lists.h: lists of records that are read one after the other. Not
+// installed.
+
+#ifndef TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H
+#define TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H
+
+#include <Engine/Base/patch.h>
+
+#include <deque>
+#include <utility>
+#include <vector>
+
+namespace tarn::engine::detail {
+
+/// The elements in a list that has just their size. Both take up little more memory than one: what
+/// has been moved is let go of on the way.
+template <class T>
+std::vector<T> takeAll(std::deque<T>& elements) {
+    std::vector<T> result;
+    result.reserve(elements.size());
+    while (!elements.empty()) {
+        result.push_back(std::move(elements.front()));
+        elements.pop_front();
+    }
+    return result;
+}
+
+/// The same for a field of a record that has an empty list so far: it shares that one.
+template <class T>
+void takeInto(Array<T>& field, std::deque<T>& elements) {
+    if (!elements.empty()) field = arrayOf(takeAll(elements));
+}
+
+}  // namespace tarn::engine::detail
+
+#endif

@@ -1,0 +1,77 @@
+// Engine/Document/detail/node_graph.h: a graph as browser-based node editors export it, and the
+// patches that it becomes. Not installed.
+
+#ifndef TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
+#define TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
+
+#include <Engine/Base/patch.h>
+#include <Engine/Document/document.h>
+
+#include <cstddef>
+#include <deque>
+#include <map>
+#include <memory>
+#include <string>
+
+namespace tarn::engine::detail {
+
+struct NodeGraph;
+
+/// How links name a node: by a number or by a text.
+struct NodeName {
+    long long number = 0;
+    std::shared_ptr<std::string const> text = nullptr;
+
+    bool operator<(NodeName const& other) const;
+};
+
+struct GraphNode {
+    NodeName name;
+    std::string type;
+    /// All other members, the title among them.
+    std::map<std::string, Unstructured> attributes;
+    struct Ports {
+        std::deque<Port> inputs;
+        std::deque<Port> outputs;
+    };
+    /// Null where there are none.
+    std::unique_ptr<Ports> ports;
+    /// Null for a node without an inline subgraph.
+    std::unique_ptr<NodeGraph> inside;
+};
+
+struct GraphLink {
+    std::size_t position = 0;  // In its list.
+    long long id = 0;
+    NodeName from;
+    long long fromSlot = 0;
+    NodeName to;
+    long long toSlot = 0;
+};
+
+struct NodeGraph {
+    /// The JSON pointer to it.
+    std::string pointer;
+    std::deque<GraphNode> nodes;
+    std::deque<GraphLink> links;
+    /// All other members.
+    std::map<std::string, Unstructured> attributes;
+
+    /// Of a shared definition: what its uses have as `type`, what people call it, its ports, and
+    /// what is said of the nodes that stand for them inside.
+    std::string id;
+    std::string title;
+    std::deque<Port> inputs;
+    std::deque<Port> outputs;
+    Unstructured inputNode;
+    Unstructured outputNode;
+};
+
+/// Makes patches of a graph and of the shared definitions that its nodes use. False where that is
+/// impossible; then `error` says why. The graph is used up.
+bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root,
+               DocumentInfo& info, DocumentError& error);
+
+}  // namespace tarn::engine::detail
+
+#endif
