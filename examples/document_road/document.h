@@ -1,36 +1,39 @@
-// A document, as records of the library: our own form of it, and the form of browser node editors.
+// A document as this program goes through it: the graph and what the library says of its file.
 //
-//     Document document = readDocument("examples/documents/animation.json");
+//     Document document = openDocument("examples/documents/animation.json");
 //     Patch const* patch = findPatchRecursive(document.root, 7);
 
 #ifndef DOCUMENT_ROAD_DOCUMENT_H
 #define DOCUMENT_ROAD_DOCUMENT_H
 
-#include "input.h"
+#include <Engine/Document/document.h>
 
-#include <Engine/Base/patch.h>
+#include <nlohmann/json.hpp>
 
+#include <stdexcept>
 #include <string>
-#include <vector>
 
-struct Document {
-    std::string form;
-    tarn::engine::Patch root;
-    double framesPerSecond = 60.0;
-    // What was left out, one line each. Only graphs of other programs are read in part.
-    std::vector<std::string> skipped;
+using Json = nlohmann::json;
+
+// Input that cannot be used. `what()` is one line: the place in the file, and what is wrong there.
+struct InputError : std::runtime_error {
+    using std::runtime_error::runtime_error;
 };
 
-// Tells the two forms apart by their content. Throws an InputError for what cannot be used.
-Document readDocument(std::string const& fileName);
+struct Document {
+    tarn::engine::Patch root;
+    tarn::engine::DocumentInfo info;
+};
+
+// Throws an InputError for what cannot be used: also for graphs of more than a thousand levels,
+// over which the program recurses, and of ports without a type.
+Document openDocument(std::string const& fileName);
 Document parseDocument(std::string const& text);
 
-// Our own form: see examples/documents/README.md.
-Document readOwnForm(Field const& file);
-// An object with "nodes" and "links".
-Document readNodeGraph(Field const& file);
+// In one line. Bytes that are no UTF-8 become U+FFFD.
+std::string jsonText(Json const& json);
 
-// "attributes", or whatever else holds free-form settings, as the records keep them.
-std::map<std::string, tarn::engine::Unstructured> toAttributes(Json const& object);
+// The text with what a terminal would act on, line ends included, written as escapes.
+std::string printable(std::string const& text);
 
 #endif

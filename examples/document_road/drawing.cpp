@@ -42,8 +42,7 @@ std::string wire(Connection const& connection, Anchor const& from, Anchor const&
 void addAttributes(std::vector<std::string>& parts,
                    std::map<std::string, Unstructured> const& attributes) {
     for (auto const& [key, value] : attributes) {
-        parts.push_back(printable(key) + ": " +
-                        shortened(jsonText(toJson(value)), kLongestAttribute));
+        parts.push_back(printable(key) + ": " + value.toText(kLongestAttribute));
     }
 }
 

@@ -144,7 +144,7 @@ void Evaluator::compute(EvalPatch& patch, long long frame) const {
             TypeInfo const& typeInfo = inputs[i].typeInfo;
             values[i] = indexLoopCasting(inputs[i].values, typeInfo, index).asType(typeInfo.type);
         }
-        kind->evaluate({{frame, document.framesPerSecond}, in, values, outType, out});
+        kind->evaluate({{frame, document.info.framesPerSecond}, in, values, outType, out});
     }
     for (std::size_t i = 0; i < outputs.size(); ++i) {
         if (!results[i].empty()) outputs[i].values = std::move(results[i]);

@@ -143,47 +143,35 @@ void text(Call const& call) {
     call.out(1, joined);
 }
 
+// At the number's position.
+Kind const kKinds[] = {
+    {kUnknownKind, nullptr, "hands its inputs' defaults on, position by position"},
+    {kGroupKind, nullptr, "any ports; its children compute"},
+    {kGroupInputKind, nullptr, "out: those of the group's inputs with the same tags"},
+    {kGroupOutputKind, nullptr, "in: what the group's outputs of these tags give"},
+    {4, time, "out: 1 seconds, 2 frame, 3 milliseconds"},
+    {5, constant, "in: 1, 2, ...; out: 1, 2, ..."},
+    {6, easeBetween, "in: 1 from, 2 to, 3 progress, 4 curve; out: 1"},
+    {7, oscillator, "in: 1 amplitude, 2 hertz, 3 turns, 4 seconds; out: 1"},
+    {8, add, "in: any; out: 1"},
+    {9, multiply, "in: any; out: 1"},
+    {10, compose, "in: 1 x, 2 y, 3 z, 4 w; out: 1"},
+    {11, split, "in: 1; out: 1 x, 2 y, 3 z, 4 w"},
+    {12, loopOfIndices, "in: 1 count; out: 1 index, 2 index / count"},
+    {13, pulse, "in: 1 period in seconds; out: 1"},
+    {14, choose, "in: 1 condition, 2 if true, 3 if false; out: 1"},
+    {15, circle, "in: 1 center, 2 radius; out: 1"},
+    {16, ellipse, "in: 1 center, 2 radii; out: 1"},
+    {17, roundRect, "in: 1 origin, 2 size, 3 radius; out: 1"},
+    {18, hexaRect, "in: 1 origin, 2 size, 3 cut; out: 1"},
+    {19, arc, "in: 1 from, 2 to, 3 vertical first; out: 1"},
+    {20, joinPaths, "in: any; out: 1"},
+    {21, layer, "in: 1 path, 2 color, 3 stroke width, 4 opacity, 5 image; out: 1"},
+    {22, text, "in: any; out: 1"},
+};
+
 }  // namespace
 
-std::vector<Kind> const& kinds() {
-    static std::vector<Kind> const table{
-        {kUnknownKind, "unknown", nullptr, "hands its inputs' defaults on, position by position"},
-        {kGroupKind, "group", nullptr, "any ports; its children compute"},
-        {kGroupInputKind, "input", nullptr, "out: those of the group's inputs with the same tags"},
-        {kGroupOutputKind, "output", nullptr, "in: what the group's outputs of these tags give"},
-        {4, "time", time, "out: 1 seconds, 2 frame, 3 milliseconds"},
-        {5, "constant", constant, "in: 1, 2, ...; out: 1, 2, ..."},
-        {6, "ease", easeBetween, "in: 1 from, 2 to, 3 progress, 4 curve; out: 1"},
-        {7, "oscillator", oscillator, "in: 1 amplitude, 2 hertz, 3 turns, 4 seconds; out: 1"},
-        {8, "add", add, "in: any; out: 1"},
-        {9, "multiply", multiply, "in: any; out: 1"},
-        {10, "compose", compose, "in: 1 x, 2 y, 3 z, 4 w; out: 1"},
-        {11, "split", split, "in: 1; out: 1 x, 2 y, 3 z, 4 w"},
-        {12, "loop", loopOfIndices, "in: 1 count; out: 1 index, 2 index / count"},
-        {13, "pulse", pulse, "in: 1 period in seconds; out: 1"},
-        {14, "choose", choose, "in: 1 condition, 2 if true, 3 if false; out: 1"},
-        {15, "circle", circle, "in: 1 center, 2 radius; out: 1"},
-        {16, "ellipse", ellipse, "in: 1 center, 2 radii; out: 1"},
-        {17, "roundRect", roundRect, "in: 1 origin, 2 size, 3 radius; out: 1"},
-        {18, "hexaRect", hexaRect, "in: 1 origin, 2 size, 3 cut; out: 1"},
-        {19, "arc", arc, "in: 1 from, 2 to, 3 vertical first; out: 1"},
-        {20, "joinPaths", joinPaths, "in: any; out: 1"},
-        {21, "layer", layer, "in: 1 path, 2 color, 3 stroke width, 4 opacity, 5 image; out: 1"},
-        {22, "text", text, "in: any; out: 1"},
-    };
-    return table;
-}
-
-Kind const* kindByName(std::string const& name) {
-    for (Kind const& kind : kinds()) {
-        if (kind.name == name) return &kind;
-    }
-    return nullptr;
-}
-
 Kind const* kindByNumber(unsigned long long number) {
-    for (Kind const& kind : kinds()) {
-        if (kind.number == number) return &kind;
-    }
-    return nullptr;
+    return number < std::size(kKinds) ? &kKinds[number] : nullptr;
 }

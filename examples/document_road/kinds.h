@@ -1,7 +1,6 @@
 // The built-in kinds of patches: what each computes from its inputs, found by their tags.
 //
-//     Kind const* kind = kindByName("oscillator");
-//     patch.builtin = kind->number;
+//     Kind const* kind = kindByNumber(*stringToKind("oscillator"));
 
 #ifndef DOCUMENT_ROAD_KINDS_H
 #define DOCUMENT_ROAD_KINDS_H
@@ -39,7 +38,6 @@ constexpr std::size_t kLongestLoop = 1000;
 
 struct Kind {
     unsigned long long number;
-    char const* name;
     // Null for kinds that the evaluator handles itself: groups and their ends, and unknown ones.
     void (*evaluate)(Call const&);
     // The tags of its ports and what they mean, for people.
@@ -51,10 +49,9 @@ constexpr unsigned long long kUnknownKind = 0;
 constexpr unsigned long long kGroupKind = 1;
 constexpr unsigned long long kGroupInputKind = 2;
 constexpr unsigned long long kGroupOutputKind = 3;
+constexpr unsigned long long kLayerKind = 21;
 
-std::vector<Kind> const& kinds();
-// Null for a name (a number) of no kind.
-Kind const* kindByName(std::string const& name);
+// Null for a number of no kind.
 Kind const* kindByNumber(unsigned long long number);
 
 #endif

@@ -20,6 +20,8 @@
 
 #include <unistd.h>
 
+using namespace tarn::engine;
+
 namespace {
 
 constexpr int kBadInput = 2;
@@ -49,25 +51,20 @@ private:
     std::chrono::steady_clock::time_point last = std::chrono::steady_clock::now();
 };
 
-// A file whole or not at all, so that a reader never finds half of it; anything else, such as a
-// pipe, is written to as it is.
+// A file whole or not at all; anything else, such as a pipe, is written to as it is.
 void writeFile(std::string const& name, std::string const& contents) {
-    namespace fs = std::filesystem;
     std::error_code error;
-    bool const isFile = !fs::exists(name, error) || fs::is_regular_file(name, error);
-    fs::path const file = isFile ? fs::weakly_canonical(name, error) : fs::path(name);
-    fs::path const written = isFile ? file.string() + ".unfinished" : file.string();
-    bool done = false;
-    {
-        std::ofstream stream(written, std::ios::binary);
+    DocumentError problem;
+    bool const exists = std::filesystem::exists(name, error);
+    if (!exists || std::filesystem::is_regular_file(name, error)) {
+        if (replaceFile(name, contents, &problem)) return;
+    } else {
+        std::ofstream stream(name, std::ios::binary);
         stream << contents << std::flush;
-        done = bool(stream);
+        if (stream) return;
+        problem.message = "it is not taken";
     }
-    error.clear();
-    if (done && isFile) fs::rename(written, file, error);
-    if (done && !error) return;
-    if (isFile) fs::remove(written, error);
-    throw std::runtime_error(printable(name) + " cannot be written");
+    throw std::runtime_error(printable(name) + " cannot be written: " + problem.message);
 }
 
 void refuseToReplace(std::string const& document, std::string const& written) {
@@ -97,6 +94,7 @@ int main(int argc, char** argv) {
     bool paths = false;
     std::string report;
     std::string picture;
+    std::string copy;
     std::optional<unsigned long long> patchId;
     std::optional<unsigned long long> portId;
     app.add_option("FILE", file, "The document")->required();
@@ -125,6 +123,9 @@ int main(int argc, char** argv) {
     app.add_option("--picture", picture,
                    "Write a picture of the graph and of the last of the frames (needs Graphviz)")
         ->type_name("SVG");
+    app.add_option("--write", copy,
+                   "Save what was read, in the form of documents; may be FILE itself")
+        ->type_name("JSON");
     try {
         app.parse(argc, argv);
     } catch (CLI::ParseError const& error) {
@@ -132,19 +133,23 @@ int main(int argc, char** argv) {
     }
 
     try {
-        Document const document = readDocument(file);
+        Document const document = openDocument(file);
+        std::string const changes = document.info.summary();
+        if (!changes.empty()) {
+            std::cerr << "document_road: " << printable(file) << ": " << changes << "\n";
+        }
         // All of the output is made before any of it is written.
         std::ostringstream output;
         output << countsText(document);
         if (debug) output << "\n" << document.root << "\n";
         if (patchId) {
             std::string const text = patchText(document, *patchId);
-            if (text.empty()) throw InputError("", "no patch " + std::to_string(*patchId));
+            if (text.empty()) throw InputError("no patch " + std::to_string(*patchId));
             output << "\n" << text;
         }
         if (portId) {
             std::string const text = portText(document, *portId);
-            if (text.empty()) throw InputError("", "no port " + std::to_string(*portId));
+            if (text.empty()) throw InputError("no port " + std::to_string(*portId));
             output << "\n" << text;
         }
         if (frames > 0) {
@@ -158,6 +163,8 @@ int main(int argc, char** argv) {
         if (!picture.empty()) {
             writeFile(picture, pictureText(document, std::max(frames - 1, 0LL)));
         }
+        if (!copy.empty())
+            writeFile(copy, writeDocument(document.root, document.info.framesPerSecond));
         if (!report.empty()) {
             std::filesystem::path const fileName = std::filesystem::path(file).filename();
             writeFile(report, pageText(document, fileName.string(), reportFrames));

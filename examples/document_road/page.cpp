@@ -413,7 +413,7 @@ void writeTree(std::ostream& stream, std::string const& name, Unstructured const
     Unstructured::Array const* const array = data.ifArray();
     if (map == nullptr && array == nullptr) {
         stream << "<li><span class=\"name\">" << escaped(printable(name)) << "</span> "
-               << escaped(jsonText(toJson(data))) << "</li>\n";
+               << escaped(data.toText(kLongestText)) << "</li>\n";
         return;
     }
     std::size_t const size = map != nullptr ? map->size() : array->size();
@@ -479,7 +479,7 @@ std::string stageText(Film const& film) {
 std::string dataText(Film const& film, Document const& document) {
     Json plots = Json::array();
     for (Plot const& plot : film.plots) plots.push_back(plot.texts);
-    Json const data = {{"framesPerSecond", document.framesPerSecond},
+    Json const data = {{"framesPerSecond", document.info.framesPerSecond},
                        {"texts", film.texts.json()},
                        {"frames", film.frames},
                        {"plots", plots}};

@@ -118,8 +118,8 @@ std::string shownValues(Loop const& values, std::size_t longest) {
 }
 
 std::string kindName(Patch const& patch) {
-    Kind const* const kind = kindByNumber(patch.builtin);
-    return kind != nullptr ? kind->name : "unknown";
+    std::string const name = kindToString(patch.builtin);
+    return name.empty() ? kindToString(kUnknownKind) : name;
 }
 
 std::string portTypeText(Port const& port) {
@@ -155,8 +155,10 @@ std::string countsText(Document const& document) {
         }
     });
     std::ostringstream text;
-    text << "read " << document.form << ": " << counted(patches, "patch", "patches") << " in "
-         << counted(levels, "level", "levels") << ", " << counted(ports, "port", "ports") << ", "
+    bool const isOwn = document.info.form == DocumentInfo::Form::Own;
+    text << "read " << (isOwn ? "a document: " : "a node graph: ")
+         << counted(patches, "patch", "patches") << " in " << counted(levels, "level", "levels")
+         << ", " << counted(ports, "port", "ports") << ", "
          << counted(connections, "connection", "connections") << "\n";
     if (!types.empty()) {
         text << "ports:";
@@ -171,7 +173,7 @@ std::string countsText(Document const& document) {
         for (std::string const& name : unknown) text << " " << name;
         text << "\n";
     }
-    for (std::string const& line : document.skipped) text << printable(line) << "\n";
+    for (std::string const& line : document.info.notes) text << printable(line) << "\n";
     return text.str();
 }
 

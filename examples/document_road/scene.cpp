@@ -16,7 +16,7 @@ Scene::Scene(Document const& document, EvalPatch const& root) {
 }
 
 void Scene::findLayers(EvalPatch const& patch) {
-    if (patch.builtin == kindByName("layer")->number) layers.push_back(&patch);
+    if (patch.builtin == kLayerKind) layers.push_back(&patch);
     for (EvalPatch const& child : *patch.children) findLayers(child);
 }
 

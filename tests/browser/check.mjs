@@ -257,7 +257,7 @@ async function checkGraph(page) {
     const info = page.locator("#level-1 > .info");
     await page.locator('#level-1 [aria-label^="input speed;"]').first().hover();
     const lines = ["input speed", "Number [type: float] from 0.1 to 4, default 1", "port 201, tag 1",
-        'ui: {"slider":1,"steps":[0.1,1,4]}', 'unit: "times"'];
+        'ui: {"slider": 1, "steps": [0.1, 1, 4]}', 'unit: "times"'];
     checkEqual(await info.locator("p").allTextContents(), lines, "pointing at a port");
 
     // The arrow keys go through every patch and port of the level, and back.
