@@ -7,22 +7,43 @@ include(GNUInstallDirs)
 set(cmake_dir "${CMAKE_INSTALL_LIBDIR}/cmake/${PROJECT_NAME}")
 set(pkgconfig_dir "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
 
-install(TARGETS tarn_engine_base
-    EXPORT TarnEngineBaseTargets
-    LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT runtime NAMELINK_COMPONENT development
-    RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT runtime
-    ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development
-    INCLUDES DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+# The library, its headers and its pkg-config file. Headers beneath detail/ are its own.
+function(tarn_install_library library folder component)
+    install(TARGETS ${library}
+        EXPORT TarnEngineBaseTargets
+        LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT ${component}
+            NAMELINK_COMPONENT development
+        RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT ${component}
+        ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development
+        INCLUDES DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+    install(DIRECTORY Engine/${folder}
+        DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/Engine" COMPONENT development
+        FILES_MATCHING PATTERN "*.h"
+        PATTERN "detail" EXCLUDE)
+    configure_file(cmake/${library}.pc.in "${CMAKE_CURRENT_BINARY_DIR}/${library}.pc" @ONLY)
+    install(FILES "${CMAKE_CURRENT_BINARY_DIR}/${library}.pc"
+        DESTINATION "${pkgconfig_dir}" COMPONENT development)
+endfunction()
+
+# Relative to its own place, so that a tree that was moved still works.
+file(RELATIVE_PATH TARN_ENGINE_BASE_PREFIX_FROM_PC "/${pkgconfig_dir}" "/")
+string(REGEX REPLACE "/$" "" TARN_ENGINE_BASE_PREFIX_FROM_PC "${TARN_ENGINE_BASE_PREFIX_FROM_PC}")
+set(TARN_ENGINE_BASE_PC_DEFINITIONS "")
+set(TARN_ENGINE_DOCUMENT_PC_DEFINITIONS "")
+if(library_type STREQUAL STATIC)
+    set(TARN_ENGINE_BASE_PC_DEFINITIONS " -DTARN_ENGINE_BASE_STATIC")
+    set(TARN_ENGINE_DOCUMENT_PC_DEFINITIONS " -DTARN_ENGINE_DOCUMENT_STATIC")
+endif()
+tarn_install_library(tarn_engine_base Base runtime)
+if(TARN_ENGINE_BASE_BUILD_DOCUMENT)
+    tarn_install_library(tarn_engine_document Document document)
+endif()
 install(EXPORT TarnEngineBaseTargets
     NAMESPACE tarn:: DESTINATION "${cmake_dir}" COMPONENT development)
 # For projects that export their own build tree, with the library in it.
 export(EXPORT TarnEngineBaseTargets
     NAMESPACE tarn:: FILE "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseTargets.cmake")
 
-install(DIRECTORY Engine/Base
-    DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/Engine" COMPONENT development
-    FILES_MATCHING PATTERN "*.h"
-    PATTERN "detail" EXCLUDE)
 if(NOT TARN_ENGINE_BASE_DEBIAN_PACKAGES)
     install(FILES LICENSE DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/tarn-engine-base" COMPONENT development)
 endif()
@@ -36,18 +57,6 @@ install(FILES
     "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfig.cmake"
     "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfigVersion.cmake"
     DESTINATION "${cmake_dir}" COMPONENT development)
-
-# Relative to its own place, so that a tree that was moved still works.
-file(RELATIVE_PATH TARN_ENGINE_BASE_PREFIX_FROM_PC "/${pkgconfig_dir}" "/")
-string(REGEX REPLACE "/$" "" TARN_ENGINE_BASE_PREFIX_FROM_PC "${TARN_ENGINE_BASE_PREFIX_FROM_PC}")
-set(TARN_ENGINE_BASE_PC_DEFINITIONS "")
-if(library_type STREQUAL STATIC)
-    set(TARN_ENGINE_BASE_PC_DEFINITIONS " -DTARN_ENGINE_BASE_STATIC")
-endif()
-configure_file(cmake/tarn_engine_base.pc.in
-    "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc" @ONLY)
-install(FILES "${CMAKE_CURRENT_BINARY_DIR}/tarn_engine_base.pc"
-    DESTINATION "${pkgconfig_dir}" COMPONENT development)
 
 # gdb loads a script by the full name of the library, beneath its auto-load folder.
 if(UNIX AND library_type STREQUAL SHARED)

@@ -5,7 +5,11 @@ set(CPACK_PACKAGE_NAME tarn-engine-base)
 set(CPACK_PACKAGE_VENDOR "Tarn")
 set(CPACK_PACKAGE_CONTACT "Tarn Engine developers <engine@tarn.invalid>")
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
-set(CPACK_COMPONENTS_ALL runtime development)
+set(components runtime development)
+if(TARN_ENGINE_BASE_BUILD_DOCUMENT)
+    list(APPEND components document)
+endif()
+set(CPACK_COMPONENTS_ALL ${components})
 set(CPACK_COMPONENTS_GROUPING ONE_PER_GROUP)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
@@ -13,6 +17,7 @@ set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "values and graphs of a node-based animation engine")
 
 set(runtime_package "libtarn-engine-base${PROJECT_VERSION_MAJOR}")
+set(document_package "libtarn-engine-document${PROJECT_VERSION_MAJOR}")
 set(development_package libtarn-engine-base-dev)
 set(about "The tagged value and its conversions, free-form data, the records of the patch
 graph and the queries over them, vector paths, easing curves, layers and
@@ -22,20 +27,36 @@ set(CPACK_DEBIAN_RUNTIME_PACKAGE_SECTION libs)
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_RUNTIME_DEBUGINFO_PACKAGE ON)
 set(CPACK_COMPONENT_RUNTIME_DESCRIPTION "${about}")
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_NAME "${document_package}")
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_SECTION libs)
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS "${CMAKE_CURRENT_BINARY_DIR}")
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_DEPENDS "${runtime_package} (= ${PROJECT_VERSION}-1)")
+set(CPACK_DEBIAN_DOCUMENT_DEBUGINFO_PACKAGE ON)
+set(CPACK_COMPONENT_DOCUMENT_DESCRIPTION "Reads graphs of patches from JSON documents, its own and
+those that browser-based node editors export, and writes them.")
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_NAME "${development_package}")
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
+set(needs_document "")
+if(TARN_ENGINE_BASE_BUILD_DOCUMENT)
+    set(needs_document "${document_package} (= ${PROJECT_VERSION}-1), ")
+endif()
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
-    "${runtime_package} (= ${PROJECT_VERSION}-1), libboost-dev (>= ${TARN_ENGINE_BASE_BOOST})")
+    "${runtime_package} (= ${PROJECT_VERSION}-1), ${needs_document}libboost-dev (>= ${TARN_ENGINE_BASE_BOOST})")
 set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION
     "${about}\nThis package has the headers, CMake and pkg-config files, and debuggers' views.")
 
 # Which package a program needs that was linked with the library, and that its cache has to know it.
 set(control "${CMAKE_CURRENT_BINARY_DIR}/debian-control")
-file(WRITE "${control}/shlibs"
+file(WRITE "${control}/base/shlibs"
     "libtarn_engine_base ${PROJECT_VERSION_MAJOR} ${runtime_package} (>= ${PROJECT_VERSION})\n")
+file(WRITE "${control}/document/shlibs"
+    "libtarn_engine_document ${PROJECT_VERSION_MAJOR} ${document_package} (>= ${PROJECT_VERSION})\n")
 file(WRITE "${control}/triggers" "activate-noawait ldconfig\n")
-set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_EXTRA "${control}/shlibs;${control}/triggers")
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_EXTRA "${control}/base/shlibs;${control}/triggers")
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_CONTROL_EXTRA "${control}/document/shlibs;${control}/triggers")
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_STRICT_PERMISSION ON)
+set(CPACK_DEBIAN_DOCUMENT_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 
 # Each package has its licence and its changelog, as Debian wants them.
 string(TIMESTAMP date "%a, %d %b %Y %H:%M:%S +0000" UTC)
@@ -43,7 +64,7 @@ string(TIMESTAMP year "%Y" UTC)
 find_program(GZIP gzip)
 file(READ LICENSE license)
 file(WRITE "${control}/copyright" "Copyright ${year} the Tarn Engine developers\n\n${license}")
-foreach(component runtime development)
+foreach(component ${components})
     set(package "${${component}_package}")
     install(FILES "${control}/copyright" DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/${package}"
         COMPONENT ${component})

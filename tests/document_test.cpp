@@ -11,6 +11,7 @@
 
 #include <climits>
 #include <cmath>
+#include <cstdlib>
 #include <cstring>
 #include <functional>
 #include <sstream>
@@ -312,10 +313,16 @@ private:
 }  // namespace
 
 TEST(WriteDocument, IsReadBackToTheLastBit) {
+    // Some of them for whoever wants to look at them: tests/schema does.
+    char const* const folder = std::getenv("TARN_WRITTEN_DOCUMENTS");
     AnyRecords any(40);
     for (int i = 0; i < 3000; ++i) {
         Patch const root = any.patch(3);
         std::string const text = writeDocument(root);
+        if (folder != nullptr && i < 200) {
+            std::string const file = folder + ("/" + std::to_string(i) + ".json");
+            ASSERT_TRUE(saveDocument(file, root));
+        }
         DocumentError error;
         Optional<Patch> const back = readDocument(text, &error);
         ASSERT_TRUE(back.hasValue()) << error << "\n" << text;

@@ -2,11 +2,12 @@
 # The library exports the public interface and nothing else: each symbol is one of its names, and one of the
 # list that scripts/abi keeps, and none of that list is missing.
 #
-#     check_exports.sh LIBRARY NM       LIBRARY may be the import library of a DLL
+#     check_exports.sh LIBRARY NM SYMBOLS       LIBRARY may be the import library of a DLL
 set -eu
 
 library=$1
 nm=$2
+symbols=$(dirname "$0")/$3
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 
@@ -17,7 +18,7 @@ case $library in
     *.dll.a) "$nm" --defined-only "$library" | awk '$2 == "T" { print $3 }' ;;
     *) "$nm" -D --defined-only "$library" | awk '{ print $NF }' ;;
 esac | names > "$work/exported"
-names < "$(dirname "$0")/symbols.txt" > "$work/kept"
+names < "$symbols" > "$work/kept"
 
 if grep -v '^\(tarn::engine::\|\(double\|long long\) tarn::engine::ease\|std::hash<tarn::engine::\(Connection\|Value\)>::operator()\)' \
     "$work/exported"; then
@@ -25,7 +26,7 @@ if grep -v '^\(tarn::engine::\|\(double\|long long\) tarn::engine::ease\|std::ha
     exit 1
 fi
 diff "$work/kept" "$work/exported" || {
-    echo "not what tests/abi/symbols.txt lists (scripts/abi renew)"
+    echo "not what tests/abi/$3 lists (scripts/abi renew)"
     exit 1
 }
 echo "$(wc -l < "$work/exported") exported names, all of the interface"

@@ -2,12 +2,12 @@
 # Compiles every program of the guide and the short use at the head of every header, and compares what the
 # programs print with what the guide says.
 #
-#     check_guide.sh SOURCE_DIR COMPILER LIBRARY INCLUDE_DIR
+#     check_guide.sh SOURCE_DIR COMPILER LIBRARY_DIR INCLUDE_DIR
 set -eu
 
 root=$1
 compiler=$2
-library=$3
+libraries=$3
 boost=${4:-/usr/include}
 [ "$boost" = /usr/include ] && boost="" || boost="-isystem $boost"
 work=$(mktemp -d)
@@ -24,8 +24,8 @@ for page in "$root"/docs/*.md; do
 done
 for program in "$work"/*.cpp; do
     base=${program%.cpp}
-    "$compiler" -std=c++17 -I"$root" $boost "$program" -o "$base" "$library" \
-        -Wl,-rpath,"$(dirname "$library")"
+    "$compiler" -std=c++17 -I"$root" $boost "$program" -o "$base" -L"$libraries" -ltarn_engine_document \
+        -ltarn_engine_base -Wl,-rpath,"$libraries"
     "$base" > "$base.out"
     diff "$base.txt" "$base.out" || { echo "$(basename "$base") prints something else"; exit 1; }
     programs=$((programs + 1))
@@ -33,13 +33,13 @@ done
 [ "$programs" -ge 9 ]
 
 headers=0
-for header in "$root"/Engine/Base/*.h; do
-    name=$(basename "$header")
+for header in "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h; do
+    name=${header#"$root/"}
     {
-        printf '#include <Engine/Base/%s>\n#include <Engine/Base/assertion.h>\n' "$name"
+        printf '#include <%s>\n#include <Engine/Base/assertion.h>\n' "$name"
         printf '#include <Engine/Base/patch.h>\n#include <Engine/Base/path.h>\n#include <iostream>\n'
         printf 'using namespace tarn::engine;\nvoid follow(Connection const&);\nvoid use(Type);\nbool hasValue();\n'
-        printf 'extern Patch root;\nextern unsigned long long portId;\n'
+        printf 'extern Patch root;\nextern unsigned long long portId;\nextern std::string text;\n'
         use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
         [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
         case $use in

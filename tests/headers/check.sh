@@ -12,14 +12,14 @@ root=$3
 boost="-isystem $4"
 [ "$4" != /usr/include ] || boost=""
 
-headers=$(ls "$root"/Engine/Base/*.h)
+headers=$(ls "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h)
 # One of them bridges to a library that its callers have.
 echo '#include <nlohmann/json.hpp>' | "$compiler" "-std=$standard" -fsyntax-only -x c++ - 2> /dev/null ||
     headers=$(echo "$headers" | grep -v '/json\.h$')
 
 count=0
 for header in $headers; do
-    name=Engine/Base/$(basename "$header")
+    name=${header#"$root/"}
     printf '#include <%s>\n#include <%s>\n' "$name" "$name" \
         | "$compiler" "-std=$standard" "-I$root" $boost -Wall -Wextra -Wpedantic -Wconversion -Wshadow \
             -Werror -fsyntax-only -x c++ -
@@ -32,7 +32,7 @@ echo "$standard: $count headers compile alone"
     "$root/tests/headers/braces.cpp"
 echo "$standard: records in braces"
 
-everything() { for header in $headers; do echo "#include <Engine/Base/$(basename "$header")>"; done; }
+everything() { for header in $headers; do echo "#include <${header#"$root/"}>"; done; }
 everything | "$compiler" "-std=$standard" "-I$root" $boost -fno-exceptions -fno-rtti -Wall -Wextra -Werror -fsyntax-only -x c++ -
 echo "$standard: without exceptions and run-time type information"
 

@@ -1,0 +1,17 @@
+// A stranger's program that takes a document in and out.
+
+#include <Engine/Document/document.h>
+
+#include <iostream>
+
+using namespace tarn::engine;
+
+int main() {
+    DocumentError error;
+    Optional<Patch> const root = readDocument(R"({"root": {"id": 3, "name": "shown"}})", &error);
+    if (!root) {
+        std::cerr << error << "\n";
+        return 1;
+    }
+    std::cout << writeDocument(*root);
+}
