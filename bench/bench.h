@@ -75,6 +75,7 @@ void data();
 void paths();
 void easing();
 void graphs();
+void documentFiles();
 
 }  // namespace bench
 

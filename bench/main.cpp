@@ -144,6 +144,7 @@ int main(int argc, char** argv) {
     bench::paths();
     bench::easing();
     bench::graphs();
+    bench::documentFiles();
 
     benchmark::Initialize(&count, arguments.data());
     bench::Collector collector;

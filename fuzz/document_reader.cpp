@@ -1,5 +1,5 @@
-// Any bytes are a document, or one line says why not; a document is taken through everything that
-// the example does with one.
+// Any bytes are a document, or one line says why not; a document that is written is read back, and
+// what the example program shows is taken through everything that it does with one.
 
 #include "fuzz.h"
 
@@ -8,8 +8,29 @@
 
 #include <sstream>
 
+using namespace tarn::engine;
+
+namespace {
+
+void checkLine(std::string const& line) {
+    fuzz::check(!line.empty() && line.find('\n') == std::string::npos, "one line");
+}
+
+}  // namespace
+
 extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
     std::string const bytes(reinterpret_cast<char const*>(data), size);
+    DocumentError error;
+    Optional<Patch> const root = readDocument(bytes, &error);
+    if (!root) {
+        std::ostringstream line;
+        line << error;
+        checkLine(line.str());
+        return 0;
+    }
+    std::string const written = writeDocument(*root);
+    Optional<Patch> const back = readDocument(written);
+    fuzz::check(back.hasValue() && writeDocument(*back) == written, "what is written is read back");
     try {
         Document const document = parseDocument(bytes);
         std::ostringstream text;
@@ -18,9 +39,8 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
         text << portText(document, 1);
         text << framesText(document, 3, 1, [](long long) {});
         fuzz::check(!text.str().empty(), "a document has a text");
-    } catch (InputError const& error) {
-        std::string const line = error.what();
-        fuzz::check(!line.empty() && line.find('\n') == std::string::npos, "one line");
+    } catch (InputError const& refused) {
+        checkLine(refused.what());
     }
     return 0;
 }

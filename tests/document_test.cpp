@@ -995,6 +995,36 @@ TEST(ReadDocument, RefusesHugeTextsInLittleMemory) {
     }
 }
 
+TEST(ReadDocument, NeedsLittleMoreMemoryThanTheGraph) {
+    for (std::size_t groupSize : {100u, 20000u}) {
+        Patch root{1, 1};
+        unsigned long long id = 1;
+        std::vector<Patch> groups;
+        while (id < 20000) {
+            std::vector<Patch> children;
+            for (std::size_t i = 0; i < groupSize; ++i) {
+                Patch patch{++id, 8};
+                patch.name = "patch " + std::to_string(id);
+                patch.inputs = arrayOf<Port>({Port{id * 2, 1, "in", {Type::Float}, 0.5}});
+                patch.outputs = arrayOf<Port>({Port{id * 2 + 1, 1, "out", {Type::Float}, 0.0}});
+                patch.attributes["position"] = List{1, 2};
+                children.push_back(std::move(patch));
+            }
+            Patch group{++id, 1};
+            group.children = arrayOf(std::move(children));
+            groups.push_back(std::move(group));
+        }
+        root.children = arrayOf(std::move(groups));
+        std::string const text = writeDocument(root);
+        tests::AllocationCounter counter;
+        Optional<Patch> const read = readDocument(text);
+        ASSERT_TRUE(read.hasValue());
+        EXPECT_LT(static_cast<double>(counter.peakBytes()),
+                  1.3 * static_cast<double>(counter.heldBytes()))
+            << groupSize;
+    }
+}
+
 TEST(ReadDocument, SurvivesFailingAllocations) {
     AnyRecords any(44);
     Patch const root = any.patch(2);

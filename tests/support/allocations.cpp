@@ -72,6 +72,7 @@ std::size_t AllocationCounter::held() const {
     return allocationCount.load() - start - (releaseCount.load() - startReleased);
 }
 
+std::size_t AllocationCounter::heldBytes() const { return bytes.load() - startBytes; }
 std::size_t AllocationCounter::peakBytes() const { return mostBytes.load() - startBytes; }
 
 FailingAllocation::FailingAllocation(std::size_t succeeding) {

@@ -22,6 +22,8 @@ public:
     /// How many bytes more there were at some time than when this was made; of the counter that was
     /// made last.
     std::size_t peakBytes() const;
+    /// How many bytes more there are than when this was made.
+    std::size_t heldBytes() const;
 
 private:
     std::size_t start;
