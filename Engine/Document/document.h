@@ -46,6 +46,7 @@ struct DocumentInfo {
         /// An export of a browser-based node editor.
         NodeGraph = 1,
     };
+    /// That of the document.
     Form form = Form::Own;
     /// Above 0.
     double framesPerSecond = 60.0;
