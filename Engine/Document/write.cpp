@@ -10,7 +10,6 @@
 #include <algorithm>
 #include <charconv>
 #include <cmath>
-#include <cstring>
 #include <string_view>
 #include <type_traits>
 
@@ -283,10 +282,10 @@ bool isDefault(Value const& value, Type type) {
         case Type::Float:
         case Type::Vec2:
         case Type::Vec3:
-        case Type::Vec4: {  // The sign of a zero counts.
-            FloatVec4 const a = value;
-            FloatVec4 const b = usual;
-            return std::memcmp(&a, &b, sizeof a) == 0;
+        case Type::Vec4: {  // The sign of a zero counts; all usual ones are positive.
+            FloatVec4 const v = value;
+            return value == usual && !std::signbit(v.x) && !std::signbit(v.y) &&
+                   !std::signbit(v.z) && !std::signbit(v.w);
         }
         default: return value == usual;
     }
@@ -301,7 +300,7 @@ public:
             json.number(framesPerSecond);
             json.text += ',';
         }
-        if (detail::findWrongIdentifier(root)) json.text += "\"identifiers\":\"any\",";
+        if (detail::findWrongIdentifier(root)) json.text += R"("identifiers":"any",)";
         json.text += "\"root\":";
         patch(root);
         json.text += "}\n";

@@ -12,15 +12,14 @@ namespace tarn::engine::detail {
 namespace {
 
 // "d.ddde-xx", with any decimal point: the shortest that reads back to `number`, which is not
-// negative. Returns its end.
-char* writeScientific(char* begin, char* end, double number) {
+// negative, into the buffer. Returns its end.
+char* writeScientific(char (&buffer)[64], double number) {
 #if defined(__cpp_lib_to_chars)
-    return std::to_chars(begin, end, number, std::chars_format::scientific).ptr;
+    return std::to_chars(buffer, std::end(buffer), number, std::chars_format::scientific).ptr;
 #else
-    auto const size = static_cast<std::size_t>(end - begin);
     for (int digits = 1;; ++digits) {
-        int const length = std::snprintf(begin, size, "%.*e", digits - 1, number);
-        if (digits == 17 || std::strtod(begin, nullptr) == number) return begin + length;
+        int const length = std::snprintf(buffer, sizeof buffer, "%.*e", digits - 1, number);
+        if (digits == 17 || std::strtod(buffer, nullptr) == number) return buffer + length;
     }
 #endif
 }
@@ -30,7 +29,7 @@ char* writeScientific(char* begin, char* end, double number) {
 void appendShortest(std::string& text, double number) {
     if (std::signbit(number)) text += '-';
     char scientific[64];
-    char* const end = writeScientific(scientific, std::end(scientific), std::abs(number));
+    char* const end = writeScientific(scientific, std::abs(number));
     char digits[32];
     std::size_t count = 0;
     char const* c = scientific;

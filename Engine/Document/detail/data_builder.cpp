@@ -65,15 +65,15 @@ bool DataBuilder::closeMap(std::size_t firstValue, std::size_t firstKey) {
 // Takes the mark off the keys that begin with "$".
 bool DataBuilder::decodeKeys(std::size_t firstKey) {
     for (std::size_t i = firstKey; i < keys.size(); ++i) {
-        std::string& key = keys[i];
-        if (key.empty() || key[0] != '$') continue;
-        if (key.size() < 2 || key[1] != '$') {
-            problem = "the key \"" + printable(key) +
+        std::string& name = keys[i];
+        if (name.empty() || name[0] != '$') continue;
+        if (name.size() < 2 || name[1] != '$') {
+            problem = "the key \"" + printable(name) +
                       "\" has no meaning; one that begins with $ is "
                       "written with $$";
             return false;
         }
-        key.erase(0, 1);
+        name.erase(0, 1);
     }
     return true;
 }

@@ -28,7 +28,7 @@ public:
     template <class Visit>
     void over(Patch const& root, Visit visit) {
         if (!visit(root)) return;
-        levels.push_back({&childrenOf(root), 0});
+        levels.emplace_back(&childrenOf(root), 0);
         while (!levels.empty()) {
             auto& [children, next] = levels.back();
             if (next == children->size()) {
@@ -37,7 +37,7 @@ public:
             }
             Patch const& child = (*children)[next++];
             if (!visit(child)) return;
-            levels.push_back({&childrenOf(child), 0});
+            levels.emplace_back(&childrenOf(child), 0);
         }
     }
 

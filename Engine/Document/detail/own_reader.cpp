@@ -358,7 +358,7 @@ void OwnReader::setDocumentField(Scalar const& scalar) {
             isOfType = data.isString();
             mayHaveAnyIdentifiers = data == "any";
             if (isOfType && data != "any" && data != "unique") {
-                defer("expected \"unique\" or \"any\", found " + describe(data));
+                defer(R"(expected "unique" or "any", found )" + describe(data));
             }
             break;
         case Key::Schema: isOfType = data.isString(); break;

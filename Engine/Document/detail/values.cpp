@@ -152,7 +152,7 @@ bool toUnusualElement(Unstructured const& data, PathElement& element, ValueFault
     Unstructured const* const name = data.find("instruction");
     Unstructured const* const points = data.find("points");
     if (name == nullptr || points == nullptr || data.size() != 2) {
-        fault.problem = "a path element has an \"instruction\" and \"points\"";
+        fault.problem = R"(a path element has an "instruction" and "points")";
         return false;
     }
     if (!toInstruction(*name, element.instruction, fault)) {
@@ -265,7 +265,7 @@ bool toValue(Scalar const& content, Type type, Value& value, ValueFault& fault) 
 Value nullValue(Type type) {
     Value value = Value::defaultValue(type);
     Value const taken = std::move(value);
-    return value;  // NOLINT(bugprone-use-after-move)
+    return value;  // NOLINT(bugprone-use-after-move,clang-analyzer-cplusplus.Move)
 }
 
 }  // namespace tarn::engine::detail
