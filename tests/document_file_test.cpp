@@ -169,7 +169,6 @@ TEST_F(ReplaceFile, LeavesTheOldFileOrTheNewOne) {
     tests::Random random(50);
     constexpr std::size_t kSize = 2000000;
     ASSERT_TRUE(replaceFile(file.string(), std::string(kSize, 'a')));
-    std::size_t changes = 0;
     for (int i = 0; i < 60; ++i) {
         pid_t const child = ::fork();
         ASSERT_GE(child, 0);
@@ -178,15 +177,15 @@ TEST_F(ReplaceFile, LeavesTheOldFileOrTheNewOne) {
                 replaceFile(file.string(), std::string(kSize, c));
             }
         }
+        // The first is let go on until it has replaced the file.
+        while (i == 0 && contentsOf(file)[0] == 'a') std::this_thread::yield();
         std::this_thread::sleep_for(std::chrono::microseconds(random.below(20000)));
         ::kill(child, SIGKILL);
         ASSERT_EQ(::waitpid(child, nullptr, 0), child);
         std::string const content = contentsOf(file);
         ASSERT_EQ(content.size(), kSize);
         ASSERT_EQ(content, std::string(kSize, content[0]));
-        changes += content[0] != 'a';
     }
-    EXPECT_GT(changes, 0u);
 }
 
 #endif

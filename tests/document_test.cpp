@@ -962,7 +962,7 @@ TEST(ReadDocument, ReadsDataOfAnyDepth) {
 }
 
 TEST(ReadDocument, RefusesHugeTextsInLittleMemory) {
-    constexpr std::size_t kSize = 10 << 20;
+    constexpr std::size_t kSize = 2 << 20;
     auto const repeated = [](std::string const& begin, std::string const& part) {
         std::string text = begin;
         while (text.size() < kSize) text += part;
