@@ -109,6 +109,11 @@ TEST_F(ReplaceFile, KeepsPermissionsAndLinks) {
     EXPECT_TRUE(fs::is_symlink(link));
     EXPECT_EQ(contentsOf(file), "through the link");
 
+    fs::path const nowhere = folder / "nowhere.json";
+    fs::create_symlink(folder / "none.json", nowhere);
+    EXPECT_FALSE(replaceFile(nowhere.string(), "x"));
+    EXPECT_TRUE(fs::is_symlink(nowhere));
+
     mode_t const mask = ::umask(027);
     ASSERT_TRUE(replaceFile((folder / "new.json").string(), "x"));
     ::umask(mask);

@@ -437,7 +437,7 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "has "
                 "no \"nodes\")"},
             Row{"huge integer", "{\"root\":\n  18446744073709551616}",
-                "line 2, column 3: /root: an integer beyond 64 bits"},
+                "line 2, column 3: /root: expected an object, found number 18446744073709552000.0"},
             Row{"huge integer in data",
                 R"({"root":{"id":1,"attributes":{"a":[0,-9223372036854775809]}}})",
                 "line 1, column 38: /root/attributes/a/1: an integer beyond 64 bits"},
@@ -672,6 +672,13 @@ TEST(ReadDocument, TellsFormAndFrameRate) {
     EXPECT_EQ(info.form, DocumentInfo::Form::Own);
     EXPECT_EQ(info.framesPerSecond, 12.0);
     EXPECT_EQ(info.summary(), "");
+    for (char const* before :
+         {R"("version":0.4,"root":5)", R"("a":[99999999999999999999,{"$b":1}])",
+          R"("version":1,"version":99999999999999999999)", R"("title":"\u001a")",
+          R"("framesPerSecond":[])"}) {
+        std::string const text = "{" + std::string(before) + R"(,"nodes":[{"id":2,"type":"x"}]})";
+        EXPECT_EQ(errorOf(text), "it is read");
+    }
     ASSERT_TRUE(readDocument(R"({"version":0.4,"root":5,"nodes":[]})", nullptr, &info));
     EXPECT_EQ(info.form, DocumentInfo::Form::NodeGraph);
     EXPECT_EQ(info.framesPerSecond, 60.0);
@@ -790,6 +797,33 @@ std::string withDefinitions(std::string const& nodes, std::string const& definit
 }
 
 }  // namespace
+
+TEST(ReadDocument, LetsNodesKeepTheirIdentifiersBeforeOthersGetAFreeOne) {
+    DocumentInfo info;
+    Optional<Patch> const root = readDocument(
+        graph(R"([{"id":"a","type":"x"},{"id":1,"type":"y","subgraph":{"nodes":[{"id":0,"type":"z"},
+                  {"id":3,"type":"z"}]}},{"id":2,"type":"y"}])"),
+        nullptr, &info);
+    ASSERT_TRUE(root.hasValue());
+    std::vector<Patch> const& children = *root->children;
+    EXPECT_EQ(children[0].id, 4u);
+    EXPECT_EQ(children[1].id, 1u);
+    EXPECT_EQ((*children[1].children)[0].id, 5u);
+    EXPECT_EQ((*children[1].children)[1].id, 3u);
+    EXPECT_EQ(children[2].id, 2u);
+    EXPECT_EQ(info.renumberedNodes, 2u);
+    // A definition without a name is used by nobody.
+    EXPECT_TRUE(readDocument(
+                    withDefinitions(R"([{"id":1,"type":""}])", R"({"nodes":[{"id":1,"type":""}]})"))
+                    .hasValue());
+    // Whatever a node says twice, its nodes are there.
+    EXPECT_EQ(
+        (*readDocument(graph(R"([{"id":1,"type":"g","subgraph":{"nodes":[{"id":2,"type":"x"}]},
+                  "subgraph":{"nodes":[{"id":3,"type":"x"}]}}])"))
+              ->children)[0]
+            .children->size(),
+        2u);
+}
 
 TEST(ReadDocument, PutsSharedDefinitionsIntoTheirUses) {
     DocumentInfo info;

@@ -73,14 +73,15 @@ struct DocumentInfo {
 /// as the attribute "id"; what has no place in the records becomes attributes; each use of a
 /// shared definition becomes a group with a copy of its inside.
 ///
-/// Linear. Patches nest 10,000 levels at most, data as deep as memory allows, and nothing recurses.
-/// Beside the graph it takes at most 12 bytes for each byte of text. Throws where memory fails, and
-/// nothing else.
+/// Patches and model layers nest 10,000 levels at most, groups of a node graph 1,000, data as deep
+/// as memory allows. Linear in a document of our own form, in a node graph and its copies of shared
+/// definitions. Throws where memory fails, and nothing else.
 TARN_ENGINE_DOCUMENT_EXPORT Optional<Patch>
 readDocument(std::string_view text, DocumentError* error = nullptr, DocumentInfo* info = nullptr);
 
-/// The document of our own form with this graph: UTF-8, the same bytes for equal graphs, a line for
-/// each record. Every graph can be written, whatever it holds; a frame rate that is not above 0 and
+/// The document of our own form with this graph: UTF-8, the same bytes for graphs that are equal to
+/// the last bit, a line for each record. Every graph of up to 10,000 levels can be written and read
+/// back, whatever it holds; a frame rate that is not above 0 and
 /// finite is left out. Linear; 8 MiB of stack are enough for 10,000 levels.
 TARN_ENGINE_DOCUMENT_EXPORT std::string writeDocument(Patch const& root,
                                                       double framesPerSecond = 60.0);

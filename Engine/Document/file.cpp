@@ -118,6 +118,9 @@ bool replaceFile(std::string const& fileName, std::string_view content, Document
     std::error_code failed;
     fs::path target = fs::weakly_canonical(fileName, failed);
     if (failed) target = fileName;
+    if (fs::is_symlink(target, failed)) {
+        return refuse(error, "it is a symbolic link that leads nowhere");
+    }
     if (fs::exists(target, failed) && !fs::is_regular_file(target, failed)) {
         return refuse(error, "it is not a file that can be replaced");
     }

@@ -131,7 +131,7 @@ bool GraphReader::openInNode(bool isObject) {
         return push(Place::Ports);
     }
     if (key == "subgraph" && isObject) {
-        node.inside = std::make_unique<NodeGraph>();
+        if (!node.inside) node.inside = std::make_unique<NodeGraph>();
         return openGraph(*node.inside, false);
     }
     if (key == "subgraph" || key == "id" || key == "type" || key == "title" ||
@@ -239,6 +239,7 @@ bool GraphReader::setPortMember(Unstructured& data) {
 }
 
 bool GraphReader::setName(NodeName& name, Unstructured const& data, std::string const& step) {
+    name = NodeName();
     if (Optional<long long> const number = integerOf(data)) {
         name.number = *number;
         return true;

@@ -176,28 +176,46 @@ public:
 
     // The root's own identifier comes last, so that nodes keep theirs.
     void make(NodeGraph& graph, Patch& root) {
+        claim(graph);
         fill(root, graph, true);
         root.id = freeIdentifier(1);
         for (std::size_t count : uses) info.unusedDefinitions += count == 0 ? 1 : 0;
     }
 
 private:
+    // Nodes keep their identifiers before any other gets a free one, and the outer ones before the
+    // inner ones.
+    void claim(NodeGraph& graph) {
+        for (GraphNode& node : graph.nodes) node.id = claimed(node.name);
+        for (GraphNode& node : graph.nodes) {
+            if (node.inside) claim(*node.inside);
+        }
+    }
+
+    // The identifier of that number where it is still free, else 0.
+    unsigned long long claimed(NodeName const& name) {
+        if (name.text || name.number <= 0) return 0;
+        auto const id = static_cast<unsigned long long>(name.number);
+        return patchIds.insert(id).second ? id : 0;
+    }
+
     // Where the nodes of a name are among the patches of a level.
     using Places = std::vector<std::pair<NodeName, std::size_t>>;
 
     // The patches and connections of `graph` become those of `patch`. What is used for the last
     // time is moved and not copied.
     void fill(Patch& patch, NodeGraph& graph, bool isLastUse) {
-        // All nodes of this level keep their identifiers before any inner one takes a free one.
         Places places;
         places.reserve(graph.nodes.size() + 2);
         std::vector<unsigned long long> ids;
         ids.reserve(graph.nodes.size());
         for (GraphNode const& node : graph.nodes) {
             places.emplace_back(node.name, places.size());
-            bool const isUsable = !node.name.text && node.name.number > 0;
-            ids.push_back(
-                freeIdentifier(isUsable ? static_cast<unsigned long long>(node.name.number) : 0));
+            // Those of a copy have not been claimed before.
+            ids.push_back(isLastUse ? node.id : claimed(node.name));
+        }
+        for (unsigned long long& id : ids) {
+            if (id == 0) id = freeIdentifier(0);
         }
         std::vector<Patch> children;
         children.reserve(graph.nodes.size() + 2);
@@ -452,7 +470,9 @@ bool NodeName::operator<(NodeName const& other) const {
 bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root,
                DocumentInfo& info, DocumentError& error) {
     std::unordered_map<std::string, std::size_t> positions;
-    for (std::size_t i = 0; i < definitions.size(); ++i) positions.emplace(definitions[i].id, i);
+    for (std::size_t i = 0; i < definitions.size(); ++i) {
+        if (!definitions[i].id.empty()) positions.emplace(definitions[i].id, i);
+    }
     Sizes sizes(definitions, positions);
     if (!sizes.compute(error)) return false;
     Sizes::Size const size = sizes.sizeOf(graph);

@@ -27,6 +27,8 @@ struct NodeName {
 
 struct GraphNode {
     NodeName name;
+    /// The identifier that it keeps, or 0.
+    unsigned long long id = 0;
     std::string type;
     /// All other members, the title among them.
     std::map<std::string, Unstructured> attributes;

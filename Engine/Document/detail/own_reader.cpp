@@ -7,6 +7,7 @@
 
 #include <array>
 #include <cmath>
+#include <iterator>
 #include <limits>
 #include <string_view>
 #include <utility>
@@ -211,7 +212,11 @@ bool OwnReader::onKey(std::string& key) {
     for (std::size_t i = 1; i < kKeyNames.size(); ++i) {
         if ((known >> i & 1u) == 0 || kKeyNames[i] != key) continue;
         level.key = Key(i);
-        if (has(level.key)) return refuse("the key \"" + key + "\" is there twice");
+        if (has(level.key)) {
+            std::string problem = "the key \"" + key + "\" is there twice";
+            if (level.place != Place::Document || key == "root") return refuse(std::move(problem));
+            defer(std::move(problem));
+        }
         level.seen |= setOf(level.key);
         return true;
     }
@@ -262,10 +267,7 @@ bool OwnReader::onOpen(bool isObject) {
             if (key == Key::Id || isObject) return refuseType(found);
             return push(Place::ModelLayers);
         case Place::Patches: return isObject ? openPatch() : refuseType(found);
-        case Place::Ports:
-            port = Port();
-            portFields = PortFields();
-            return isObject ? push(Place::Port) : refuseType(found);
+        case Place::Ports: return isObject ? push(Place::Port) : refuseType(found);
         case Place::Connections:
             connection = Connection();
             return isObject ? push(Place::Connection) : refuseType(found);
@@ -289,7 +291,9 @@ bool OwnReader::openLayer() {
 }
 
 bool OwnReader::onString(std::string& text) {
-    if (!decode(text)) return false;
+    // Around the root it may be a text of a node graph, which has no such escapes.
+    bool const isAround = !levels.empty() && isAt(Place::Document);
+    if (!isAround && !decode(text)) return false;
     if (!levels.empty()) {
         Key const key = levels.back().key;
         if (isAt(Place::Patch) && key == Key::Name) {
@@ -310,7 +314,9 @@ bool OwnReader::onString(std::string& text) {
 }
 
 bool OwnReader::onScalar(Scalar& scalar) {
-    if (scalar.isBeyond64Bits) return refuse("an integer beyond 64 bits");
+    if (scalar.isBeyond64Bits && (levels.empty() || !isAt(Place::Document))) {
+        return refuse("an integer beyond 64 bits");
+    }
     if (levels.empty()) return refuseType(scalar.data);
     // A field that is null is not there, but for what has to be.
     Key const key = levels.back().key;
@@ -397,6 +403,7 @@ bool OwnReader::setPortField(Scalar& scalar) {
             constexpr long long kLargest = std::numeric_limits<unsigned char>::max();
             if (!isNumberOf(data, number)) return refuseType(data);
             if (number < 0 || number > kLargest) return refuse("expected an integer from 0 to 255");
+            areFieldsSet = true;
             portFields.subtype = static_cast<unsigned char>(number);
             return true;
         }
@@ -476,6 +483,7 @@ bool OwnReader::setType(Unstructured const& data) {
 bool OwnReader::setValueType(Pending& pending, Unstructured const& data) {
     std::string const* const text = data.ifString();
     if (text == nullptr) return refuseType(data);
+    areFieldsSet = true;
     constexpr std::string_view kNull = "null ";
     pending.isNullPayload = text->compare(0, kNull.size(), kNull) == 0;
     std::string const name = pending.isNullPayload ? text->substr(kNull.size()) : *text;
@@ -498,6 +506,7 @@ Pending* OwnReader::pendingOf(Key key) {
 }
 
 bool OwnReader::setPending(Pending& pending, Scalar& scalar) {
+    areFieldsSet = true;
     pending.isGiven = true;
     pending.content = std::move(scalar);
     return true;
@@ -537,7 +546,12 @@ bool OwnReader::closeList() {
             break;
         case Place::Ports: {
             Patch& patch = openPatches.back();
-            takeInto(key == Key::Inputs ? patch.inputs : patch.outputs, ports);
+            // What they were read into is used again: lists of ports are many and short.
+            if (!ports.empty()) {
+                (key == Key::Inputs ? patch.inputs : patch.outputs) = arrayOf(std::vector<Port>(
+                    std::make_move_iterator(ports.begin()), std::make_move_iterator(ports.end())));
+                ports.clear();
+            }
             break;
         }
         case Place::Connections: takeInto(openPatches.back().connections, connections); break;
@@ -561,7 +575,10 @@ bool OwnReader::requireField(Key key) {
 
 bool OwnReader::closeRecord() {
     switch (levels.back().place) {
-        case Place::Document: hasRoot = has(Key::Root); break;
+        case Place::Document:
+            hasRoot = has(Key::Root);
+            levels.pop_back();
+            break;
         case Place::Patch:
             if (!requireField(Key::Id)) return false;
             levels.pop_back();
@@ -613,14 +630,18 @@ bool OwnReader::closePort() {
     } else if (info.type <= Type::Unstructured) {
         port.defaultValue = Value::defaultValue(info.type);
     }
-    ports.push_back(std::move(port));
+    ports.push_back(std::exchange(port, Port()));
+    if (areFieldsSet) portFields = PortFields();
+    areFieldsSet = false;
     levels.pop_back();
     ++levels.back().position;
     return true;
 }
 
 bool OwnReader::setValue(Optional<Value>& value, Pending const& pending, Type usualType, Key key) {
-    std::string const place = pointerStep(kKeyNames[static_cast<std::size_t>(key)]);
+    auto const place = [&] {
+        return pointer() + pointerStep(kKeyNames[static_cast<std::size_t>(key)]);
+    };
     bool const isNull = !pending.isGiven || pending.content.data.isNull();
     if (pending.isNullPayload && isNull) {
         value = nullValue(*pending.type);
@@ -628,13 +649,13 @@ bool OwnReader::setValue(Optional<Value>& value, Pending const& pending, Type us
     }
     bool const isNullData = isNull && pending.isGiven && pending.type == Type::Unstructured;
     if (pending.isNullPayload || (isNull && !isNullData && pending.type)) {
-        return refuseAt(pointer() + place + "Type", "it does not go with the value");
+        return refuseAt(place() + "Type", "it does not go with the value");
     }
     if (isNull && !isNullData) return true;
     ValueFault wrong;
     Value read;
     if (!toValue(pending.content, pending.type.value_or(usualType), read, wrong)) {
-        return refuseAt(pointer() + place + wrong.step, std::move(wrong.problem));
+        return refuseAt(place() + wrong.step, std::move(wrong.problem));
     }
     value = std::move(read);
     return true;

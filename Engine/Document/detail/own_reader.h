@@ -96,8 +96,9 @@ private:
     std::deque<ModelLayer> openLayers;
     std::deque<std::deque<ModelLayer>> layers;
     Port port;
-    PortFields portFields;
-    std::deque<Port> ports;
+    PortFields portFields;  // As new between ports.
+    bool areFieldsSet = false;
+    std::vector<Port> ports;
     Connection connection;
     std::deque<Connection> connections;
     // What is wrong around the root: it counts unless the document turns out to be a node graph.
