@@ -187,7 +187,7 @@ private:
     // inner ones.
     void claim(NodeGraph& graph) {
         for (GraphNode& node : graph.nodes) node.id = claimed(node.name);
-        for (GraphNode& node : graph.nodes) {
+        for (GraphNode const& node : graph.nodes) {
             if (node.inside) claim(*node.inside);
         }
     }
