@@ -10,7 +10,6 @@ namespace tarn::engine::detail {
 
 namespace {
 
-constexpr std::size_t kDeepestGroups = 1000;
 constexpr char kLinkForm[] = "expected [id, from node, from slot, to node, to slot, type]";
 
 Unstructured emptyContainer(bool isObject) {

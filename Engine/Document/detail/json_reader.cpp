@@ -11,6 +11,7 @@ namespace tarn::engine::detail {
 namespace {
 
 constexpr std::string_view kSpace = " \t\r\n";
+constexpr char kWrongEscape[] = "U+001A stands before two hexadecimal digits";
 
 void setPlace(std::string_view text, std::size_t offset, DocumentError& error) {
     std::string_view const before = text.substr(0, offset);
@@ -137,9 +138,7 @@ bool JsonReader::refuseAt(std::string place, std::string problem) {
     return false;
 }
 
-bool JsonReader::decode(std::string& text) {
-    return decodeText(text) || refuse("U+001A stands before two hexadecimal digits");
-}
+bool JsonReader::decode(std::string& text) { return decodeText(text) || refuse(kWrongEscape); }
 
 bool JsonReader::scalar(Scalar scalar) {
     if (ignoredLevels > 0) return true;
@@ -171,8 +170,7 @@ bool JsonReader::string(std::string& value) {
     if (ignoredLevels > 0) return true;
     if (!builder.isOpen()) return onString(value);
     if (strictness == DataBuilder::Strictness::Own && !decodeText(value)) {
-        return refuseAt(pointer() + builder.pointerToNext(),
-                        "U+001A stands before two hexadecimal digits");
+        return refuseAt(pointer() + builder.pointerToNext(), kWrongEscape);
     }
     builder.add(std::move(value));
     return true;
@@ -184,8 +182,7 @@ bool JsonReader::key(std::string& value) {
     if (ignoredLevels > 0) return true;
     if (!builder.isOpen()) return onKey(value);
     if (strictness == DataBuilder::Strictness::Own && !decodeText(value)) {
-        return refuseAt(pointer() + builder.pointerToOpen(),
-                        "U+001A stands before two hexadecimal digits");
+        return refuseAt(pointer() + builder.pointerToOpen(), kWrongEscape);
     }
     builder.key(value);
     return true;

@@ -14,7 +14,6 @@ namespace tarn::engine::detail {
 
 namespace {
 
-constexpr std::size_t kDeepestGroups = 1000;
 constexpr std::size_t kMostPatches = 1000000;
 constexpr std::size_t kMostNotes = 100;
 // How links of a definition name its own inputs and outputs.
@@ -70,7 +69,6 @@ public:
     struct Size {
         std::size_t patches = 0;
         std::size_t depth = 0;
-        std::size_t uses = 0;
     };
 
     // False where a definition contains itself.
@@ -103,7 +101,7 @@ public:
     }
 
     Size sizeOf(NodeGraph const& graph) const {
-        Size size{2, 1, 0};  // Of a definition, the ends.
+        Size size{2, 1};  // Of a definition, the ends.
         for (GraphNode const& node : graph.nodes) {
             Size inner;
             auto const use = positions.find(node.type);
@@ -476,8 +474,7 @@ bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root
     Sizes sizes(definitions, positions);
     if (!sizes.compute(error)) return false;
     Sizes::Size const size = sizes.sizeOf(graph);
-    bool const hasUses = size.patches > kMostPatches && !definitions.empty();
-    if (hasUses) {
+    if (size.patches > kMostPatches && !definitions.empty()) {
         error.message = "with its shared definitions the graph has more than " +
                         std::to_string(kMostPatches) + " nodes";
         return false;

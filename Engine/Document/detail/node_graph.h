@@ -17,6 +17,9 @@ namespace tarn::engine::detail {
 
 struct NodeGraph;
 
+/// How deep groups may nest.
+constexpr std::size_t kDeepestGroups = 1000;
+
 /// How links name a node: by a number or by a text.
 struct NodeName {
     long long number = 0;
