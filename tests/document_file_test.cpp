@@ -69,6 +69,9 @@ TEST_F(ReplaceFile, MakesAFileAndReplacesIt) {
         EXPECT_EQ(contentsOf(file), content);
         EXPECT_EQ(files(), 1u);
     }
+    fs::path const longest = folder / std::string(255, 'n');
+    EXPECT_TRUE(replaceFile(longest.string(), "x"));
+    EXPECT_EQ(contentsOf(longest), "x");
 }
 
 TEST_F(ReplaceFile, SavesAndLoadsDocuments) {

@@ -705,7 +705,7 @@ TEST(ReadDocument, RefusesNodeGraphsOfAnotherShape) {
              Row{"no identifier", graph(R"([{"type":"x"}])"),
                  "line 1, column 11: /nodes/0: \"id\" is missing"},
              Row{"identifier", graph(R"([{"id":[],"type":"x"}])"),
-                 "line 1, column 17: /nodes/0/id: expected an integer or a text, found array"},
+                 "line 1, column 17: /nodes/0/id: expected a number or a text, found array"},
              Row{"properties", graph(R"([{"id":1,"type":"x","properties":[]}])"),
                  "line 1, column 43: /nodes/0/properties: expected an object, found array"},
              Row{"inputs", graph(R"([{"id":1,"type":"x","inputs":5}])"),
@@ -869,6 +869,84 @@ TEST(ReadDocument, PutsSharedDefinitionsIntoTheirUses) {
     EXPECT_EQ(info.summary(), "2 nodes renumbered, 1 definition not used");
 }
 
+TEST(ReadDocument, KeepsWhatHasTwoPlacesOrNone) {
+    struct Row {
+        char const* what;
+        std::string text;
+        char const* patch;  // As it is written, all of the first child.
+    };
+    for (
+        Row const& row : {
+            Row{"a property of two ports' name",
+                graph(R"([{"id":1,"type":"x","inputs":[{"name":"a","type":"number"},
+                        {"name":"a","type":"number"}],"properties":{"a":5}}])"),
+                R"({"id":1,"kind":"unknown","name":"x","descriptor":"x","attributes":{"properties":{"a":5}},"inputs":[
+  {"id":1,"name":"a","type":"float","default":5.0,"attributes":{"type":"number"}},
+  {"id":2,"name":"a","type":"float","attributes":{"type":"number"}}]})"},
+            Row{"members of a subgraph and of its node",
+                graph(R"([{"id":1,"type":"x","pos":1,"subgraph":{"id":9,"pos":2,"size":3}}])"),
+                R"({"id":1,"name":"x","descriptor":"x","attributes":{"pos":1,"size":3,"subgraph":{"id":9,"pos":2}}})"},
+            Row{"a node's own definition",
+                withDefinitions(R"([{"id":1,"type":"D","definition":5}])", R"({"id":"D"})"),
+                R"({"id":1,"name":"D","descriptor":"D","attributes":{"definition":5,"definition_":{"id":"D","name":""}}})"},
+            Row{"ends without ports",
+                withDefinitions(R"([{"id":1,"type":"D"}])",
+                                R"({"id":"D","inputNode":{"id":-10,"pos":1},"outputNode":5})"),
+                R"({"id":1,"name":"D","descriptor":"D","attributes":{"definition":{"id":"D","inputNode":{"id":-10,"pos":1},"name":"","outputNode":5}}})"},
+            Row{"an end of another number",
+                withDefinitions(
+                    R"([{"id":1,"type":"D"}])",
+                    R"({"id":"D","inputNode":{"id":-5},"inputs":[{"name":"i","type":"number"}],
+                         "outputs":[{"name":"o","type":"number"}],
+                         "links":[{"id":1,"origin_id":-5,"origin_slot":0,"target_id":-20,"target_slot":0}]})"),
+                R"({"id":1,"name":"D","descriptor":"D","attributes":{"definition":{"id":"D","name":""}},"children":[
+  {"id":2,"kind":"input","name":"input","outputs":[
+   {"id":1,"name":"i","type":"float","attributes":{"type":"number"}}]},
+  {"id":3,"kind":"output","name":"output","inputs":[
+   {"id":2,"name":"o","type":"float","attributes":{"type":"number"}}]}],"connections":[
+  {"from":[2,1],"to":[3,2]}]})"},
+            Row{"members of links",
+                graph(
+                    R"([{"id":1,"type":"x","subgraph":{"links":[{"id":7,"origin_id":null,"origin_slot":0,
+                        "target_id":1,"target_slot":0,"type":"x","parentId":3}]}}])"),
+                R"({"id":1,"name":"x","descriptor":"x","attributes":{"linkMembers":[{"id":7,"parentId":3}]}})"},
+            Row{"a number that no identifier can be",
+                graph(R"([{"id":18446744073709552000,"type":"x"}])"),
+                R"({"id":1,"kind":"unknown","name":"x","descriptor":"x","attributes":{"id":18446744073709552000.0}})"},
+            Row{"the largest identifier", graph(R"([{"id":18446744073709551615,"type":"x"}])"),
+                R"({"id":1,"kind":"unknown","name":"x","descriptor":"x","attributes":{"id":{"$unsigned":"18446744073709551615"}}})"},
+            Row{"a fraction", graph(R"([{"id":1.5,"type":"x"}])"),
+                R"({"id":1,"kind":"unknown","name":"x","descriptor":"x","attributes":{"id":1.5}})"},
+        }) {
+        DocumentError error;
+        Optional<Patch> const root = readDocument(row.text, &error);
+        ASSERT_TRUE(root.hasValue()) << row.what << ": " << error.message;
+        Patch alone{100, 1};
+        alone.children = arrayOf<Patch>({(*root->children)[0]});
+        EXPECT_EQ(writeDocument(alone), "{\"version\":1,\"root\":\n{\"id\":100,\"children\":[\n " +
+                                            std::string(row.patch) + "]}}\n")
+            << row.what;
+    }
+    DocumentInfo info;
+    ASSERT_TRUE(readDocument(graph(R"([{"id":1,"type":"x","inputs":[{"name":"i"}]}])",
+                                   R"([[4,null,0,1,0,"x"]])"),
+                             nullptr, &info)
+                    .hasValue());
+    EXPECT_EQ(info.notes, std::vector<std::string>{
+                              "/links/0: link 4 left out: there is no node at one of its ends"});
+}
+
+TEST(ReadDocument, FindsNodesOfAnyName) {
+    Optional<Patch> const root =
+        readDocument(graph(R"([{"id":18446744073709552000,"type":"x","outputs":[{"name":"o"}]},
+                  {"id":18446744073709551615,"type":"x","inputs":[{"name":"i"}]},
+                  {"id":1.5,"type":"x","inputs":[{"name":"i"}]}])",
+                           R"([[1,18446744073709552000,0,18446744073709551615,0,"x"],
+                  [2,18446744073709552000,0,1.5,0,"x"]])"));
+    ASSERT_TRUE(root.hasValue());
+    EXPECT_EQ(*root->connections, (std::vector<Connection>{{1, 1, 2, 2}, {1, 1, 3, 3}}));
+}
+
 TEST(ReadDocument, TakesDefinitionsInsideOthers) {
     std::string const outer = R"({"id":"OUTER","name":"Outer","nodes":[{"id":1,"type":"PAIR"},
         {"id":2,"type":"PAIR"},{"id":3,"type":"inline","subgraph":{"nodes":[{"id":4,"type":"PAIR"}]}}]})";
@@ -909,6 +987,16 @@ TEST(ReadDocument, RefusesDefinitionsWithoutEnd) {
     EXPECT_EQ(
         errorOf(withDefinitions("[" + use("D40") + "]", many)),
         "line 1, column 1: with its shared definitions the graph has more than 1000000 nodes");
+    // A thousand copies of 300 KB.
+    std::string uses = use("D");
+    for (int i = 1; i < 1000; ++i) uses += "," + use("D");
+    for (std::string const& large :
+         {std::string(R"("a":")"), std::string(R"("nodes":[{"id":1,"type":")")}) {
+        std::string text = R"({"id":"D",)" + large + std::string(300000, 'x') + '"';
+        if (large.back() == '"' && large.find('[') != std::string::npos) text += "}]";
+        EXPECT_EQ(errorOf(withDefinitions("[" + uses + "]", text + "}")),
+                  "line 1, column 1: the copies of its shared definitions take more than 256 MiB");
+    }
     std::string deep = definition("D0", use("x"));
     for (int i = 1; i <= 1000; ++i) {
         deep += "," + definition("D" + std::to_string(i), use("D" + std::to_string(i - 1)));

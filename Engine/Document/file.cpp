@@ -1,11 +1,15 @@
 #include <Engine/Document/document.h>
 
+#include <atomic>
 #include <cerrno>
+#include <chrono>
 #include <cstdio>
 #include <cstring>
 #include <filesystem>
 #include <memory>
+#include <string>
 #include <system_error>
+#include <utility>
 
 #if !defined(_WIN32)
 #include <fcntl.h>
@@ -74,30 +78,42 @@ bool writeAll(int file, std::string_view content) {
 }
 
 // With the permissions and, as far as this user may give it away, the owner of the file that it is
-// to replace; else those of a new file.
-bool copyPermissions(int file, fs::path const& target) {
-    struct stat old = {};
-    if (::stat(target.c_str(), &old) != 0) {
-        mode_t const mask = ::umask(0);
-        ::umask(mask);
-        return ::fchmod(file, 0666 & ~mask) == 0;
-    }
+// to replace.
+bool copyPermissions(int file, struct stat const& old) {
     if (::fchown(file, old.st_uid, old.st_gid) != 0 && ::fchown(file, uid_t(-1), old.st_gid) != 0) {
         errno = 0;  // The permissions are what counts.
     }
     return ::fchmod(file, old.st_mode & 07777) == 0;
 }
 
+// A name in the target's folder that no other writer takes, however long the target's own is.
+fs::path nameBeside(fs::path const& target) {
+    static std::atomic<unsigned> count{0};
+    constexpr std::size_t kLongest = 200;
+    std::string name = target.filename().string();
+    if (name.size() > kLongest) name = "document";
+    auto const now = std::chrono::steady_clock::now().time_since_epoch().count();
+    name += "." + std::to_string(::getpid()) + "-" + std::to_string(now) + "-" +
+            std::to_string(count++) + ".unfinished";
+    return target.parent_path() / name;
+}
+
 bool writeBeside(fs::path const& target, fs::path& beside, std::string_view content,
                  std::string& problem) {
-    std::string name = target.string() + ".XXXXXX";
-    Descriptor file(::mkstemp(name.data()));
+    struct stat old = {};
+    bool const replaces = ::stat(target.c_str(), &old) == 0;
+    // Nobody else reads what may be a secret before it has its permissions; a new file has those
+    // that the process gives to new files.
+    mode_t const mode = replaces ? 0600 : 0666;
+    fs::path name = nameBeside(target);
+    Descriptor file(::open(name.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, mode));
     if (!file.isOpen()) {
         problem = reason("no file can be made beside it", errno);
         return false;
     }
-    beside = name;
-    bool const isWritten = writeAll(file.get(), content) && copyPermissions(file.get(), target) &&
+    beside = std::move(name);
+    bool const isWritten = writeAll(file.get(), content) &&
+                           (!replaces || copyPermissions(file.get(), old)) &&
                            ::fsync(file.get()) == 0 && file.close();
     if (!isWritten) problem = reason("it cannot be written", errno);
     return isWritten;

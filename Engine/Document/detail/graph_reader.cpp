@@ -2,6 +2,7 @@
 
 #include <Engine/Document/detail/texts.h>
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <utility>
@@ -64,7 +65,13 @@ bool GraphReader::openGraph(NodeGraph& opened, bool isDefinition) {
     if (openGraphs.size() == kDeepestGroups) {
         return refuse("groups nest deeper than " + std::to_string(kDeepestGroups) + " levels");
     }
-    opened.pointer = pointer();
+    opened.isDefinition = isDefinition;
+    if (isDefinition) {
+        opened.position = definitions.size() - 1;
+    } else if (!openGraphs.empty()) {
+        opened.around = openGraphs.back();
+        opened.position = levels[levels.size() - 2].position;
+    }
     openGraphs.push_back(&opened);
     push(Place::Graph);
     levels.back().isDefinition = isDefinition;
@@ -93,11 +100,15 @@ bool GraphReader::onOpen(bool isObject) {
             return push(Place::Node);
         case Place::Ports:
             if (!isObject) break;
-            openPorts->emplace_back();
+            if (openPorts != nullptr) {
+                openPorts->emplace_back();
+            } else {
+                openDefinitionPorts->emplace_back();
+            }
             return push(Place::Port);
         case Place::DefinitionList:
             if (!isObject) break;
-            return openGraph(definitions.emplace_back(), true);
+            return openGraph(definitions.emplace_back().graph, true);
     }
     return refuseType("an object", emptyContainer(isObject));
 }
@@ -105,14 +116,15 @@ bool GraphReader::onOpen(bool isObject) {
 bool GraphReader::openInGraph(bool isObject) {
     Level const& level = levels.back();
     std::string const& key = level.key;
-    NodeGraph& opened = *openGraphs.back();
     if (key == "nodes" || key == "links") {
         if (isObject) return refuseType("an array", emptyContainer(isObject));
         return push(key == "nodes" ? Place::Nodes : Place::Links);
     }
     if (level.isDefinition && (key == "inputs" || key == "outputs")) {
         if (isObject) return refuseType("an array", emptyContainer(isObject));
-        openPorts = key == "inputs" ? &opened.inputs : &opened.outputs;
+        Definition& definition = definitions.back();
+        openPorts = nullptr;
+        openDefinitionPorts = key == "inputs" ? &definition.inputs : &definition.outputs;
         return push(Place::Ports);
     }
     if (level.isDefinition && key == "name") return refuseType("a text", emptyContainer(isObject));
@@ -176,20 +188,21 @@ bool GraphReader::setGraphMember(Unstructured& data) {
     std::string const& key = level.key;
     if (key == "nodes" || key == "links") return data.isNull() || refuseType("an array", data);
     if (level.isDefinition) {
+        Definition& definition = definitions.back();
         if (key == "id") {
-            opened.id = data.isString() ? *data.ifString() : data.toText();
+            definition.id = data.isString() ? *data.ifString() : data.toText();
             return true;
         }
         if (key == "name") {
             if (!data.isString()) return data.isNull() || refuseType("a text", data);
-            opened.title = *data.ifString();
+            definition.title = *data.ifString();
             return true;
         }
         if (key == "inputs" || key == "outputs") {
             return data.isNull() || refuseType("an array", data);
         }
         if (key == "inputNode" || key == "outputNode") {
-            (key == "inputNode" ? opened.inputNode : opened.outputNode) = std::move(data);
+            (key == "inputNode" ? definition.inputNode : definition.outputNode) = std::move(data);
             return true;
         }
     }
@@ -203,7 +216,10 @@ bool GraphReader::setNodeMember(Unstructured& data) {
     std::string const& key = level.key;
     if (key == "id") {
         level.hasId = true;
-        return setName(node.name, data, "");
+        if (!setName(node.name, data, "")) return false;
+        // Said again where the node gets another: a text, or a number that no identifier can be.
+        if (node.name.text) node.attributes[key] = std::move(data);
+        return true;
     }
     if (key == "type") {
         if (!data.isString()) return refuseType("a text", data);
@@ -224,7 +240,7 @@ bool GraphReader::setNodeMember(Unstructured& data) {
 }
 
 bool GraphReader::setPortMember(Unstructured& data) {
-    Port& port = openPorts->back();
+    Port& port = openPorts != nullptr ? openPorts->back() : openDefinitionPorts->back();
     std::string const& key = levels.back().key;
     if (key == "name") {
         if (!data.isString()) return data.isNull() || refuseType("a text", data);
@@ -243,11 +259,11 @@ bool GraphReader::setName(NodeName& name, Unstructured const& data, std::string 
         name.number = *number;
         return true;
     }
-    if (data.isIdentifier()) {
-        name.text = std::make_shared<std::string const>(std::to_string(data.asId()));
+    if (data.isIdentifier() || data.isNumber()) {
+        name.text = std::make_shared<std::string const>(data.toText());
         return true;
     }
-    if (!data.isString()) return refuseType("an integer or a text", data, step);
+    if (!data.isString()) return refuseType("a number or a text", data, step);
     // Editors write one node's number either way.
     if (Optional<long long> const number = integerOfText(*data.ifString())) {
         name.number = *number;
@@ -279,15 +295,27 @@ bool GraphReader::addLink(Unstructured const& data) {
     }
     GraphLink link;
     link.id = integerOf(*parts[0]).value_or(0);
-    if (!setName(link.from, *parts[1], steps[1]) ||
-        !setInteger(link.fromSlot, *parts[2], steps[2]) || !setName(link.to, *parts[3], steps[3]) ||
-        !setInteger(link.toSlot, *parts[4], steps[4])) {
+    link.hasEnds = std::none_of(parts.begin() + 1, parts.end(),
+                                [](Unstructured const* part) { return part->isNull(); });
+    if (link.hasEnds &&
+        (!setName(link.from, *parts[1], steps[1]) ||
+         !setInteger(link.fromSlot, *parts[2], steps[2]) ||
+         !setName(link.to, *parts[3], steps[3]) || !setInteger(link.toSlot, *parts[4], steps[4]))) {
         return false;
     }
-    NodeGraph& opened = *openGraphs.back();
     link.position = levels.back().position;
-    opened.links.push_back(std::move(link));
+    openGraphs.back()->links.emplace_back() = std::move(link);
+    if (data.isMap()) keepLinkMembers(data);
     return true;
+}
+
+// Connections have no attributes: what else there is goes to the patch around them.
+void GraphReader::keepLinkMembers(Unstructured const& link) {
+    Unstructured::Map members = *link.ifMap();
+    for (char const* known : {"origin_id", "origin_slot", "target_id", "target_slot", "type"}) {
+        members.erase(known);
+    }
+    if (members.size() > 1) openGraphs.back()->linkMembers.emplace_back(std::move(members));
 }
 
 bool GraphReader::onClose() {

@@ -20,7 +20,7 @@ public:
     GraphReader() : JsonReader(DataBuilder::Strictness::Lenient) {}
 
     NodeGraph graph;
-    std::deque<NodeGraph> definitions;
+    std::deque<Definition> definitions;
 
 private:
     enum class Place : unsigned char {
@@ -53,6 +53,7 @@ private:
 
     bool push(Place place);
     bool openGraph(NodeGraph& opened, bool isDefinition);
+    void keepLinkMembers(Unstructured const& link);
     bool openInGraph(bool isObject);
     bool openInNode(bool isObject);
     bool set(Scalar& scalar);
@@ -67,7 +68,9 @@ private:
     std::vector<Level> levels;
     std::vector<NodeGraph*> openGraphs;
     std::vector<GraphNode*> openNodes;
+    // One of the two.
     std::deque<Port>* openPorts = nullptr;
+    std::vector<Port>* openDefinitionPorts = nullptr;
     Unstructured::Map otherDefinitions;
 };
 

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <string_view>
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
@@ -15,6 +16,9 @@ namespace tarn::engine::detail {
 namespace {
 
 constexpr std::size_t kMostPatches = 1000000;
+// What all copies of shared definitions may take, about: a small document is not to fill the
+// memory.
+constexpr std::size_t kMostCopiedBytes = std::size_t(256) << 20;
 constexpr std::size_t kMostNotes = 100;
 // How links of a definition name its own inputs and outputs.
 constexpr long long kInputNode = -10;
@@ -59,16 +63,55 @@ std::string shown(NodeName const& name) {
     return name.text ? "\"" + printable(*name.text) + "\"" : std::to_string(name.number);
 }
 
-// How many patches each definition becomes, with those inside it, and how deep they are.
+// About what data takes in memory.
+std::size_t bytesOf(Unstructured const& data) {
+    constexpr std::size_t kEntry = 64;  // Of a map, beside its key.
+    std::size_t bytes = 0;
+    std::vector<Unstructured const*> pending{&data};
+    while (!pending.empty()) {
+        Unstructured const& next = *pending.back();
+        pending.pop_back();
+        bytes += sizeof(Unstructured);
+        if (std::string const* const text = next.ifString()) bytes += sizeof *text + text->size();
+        if (Unstructured::Array const* const array = next.ifArray()) {
+            for (Unstructured const& element : *array) pending.push_back(&element);
+        }
+        if (Unstructured::Map const* const map = next.ifMap()) {
+            for (auto const& [key, element] : *map) {
+                bytes += kEntry + key.size();
+                pending.push_back(&element);
+            }
+        }
+    }
+    return bytes;
+}
+
+std::size_t bytesOf(std::map<std::string, Unstructured> const& attributes) {
+    std::size_t bytes = 0;
+    for (auto const& [key, element] : attributes) bytes += key.size() + bytesOf(element);
+    return bytes;
+}
+
+template <class Ports>
+std::size_t bytesOfPorts(Ports const& ports) {
+    std::size_t bytes = 0;
+    for (Port const& port : ports) {
+        bytes += sizeof port + port.name.size() + bytesOf(port.attributes);
+    }
+    return bytes;
+}
+
+// What each definition becomes, with those inside it.
 class Sizes {
 public:
-    Sizes(std::deque<NodeGraph> const& all,
+    Sizes(std::deque<Definition> const& all,
           std::unordered_map<std::string, std::size_t> const& byId)
         : definitions(all), positions(byId), sizes(all.size()) {}
 
     struct Size {
         std::size_t patches = 0;
-        std::size_t depth = 0;
+        std::size_t copiedBytes = 0;
+        std::size_t depth = 1;
     };
 
     // False where a definition contains itself.
@@ -77,50 +120,35 @@ public:
         std::vector<State> states(definitions.size(), State::New);
         for (std::size_t start = 0; start < definitions.size(); ++start) {
             std::vector<Visit> open;
-            if (states[start] == State::New) open.push_back({start, usesIn(definitions[start]), 0});
+            if (states[start] == State::New) open.push_back(visit(start));
             while (!open.empty()) {
-                Visit& visit = open.back();
-                states[visit.definition] = State::Open;
-                if (visit.next == visit.uses.size()) {
-                    sizes[visit.definition] = sizeOf(definitions[visit.definition]);
-                    states[visit.definition] = State::Done;
+                Visit& last = open.back();
+                states[last.definition] = State::Open;
+                if (last.next == last.uses.size()) {
+                    sizes[last.definition] = sizeOf(definitions[last.definition]);
+                    states[last.definition] = State::Done;
                     open.pop_back();
                     continue;
                 }
-                Use const use = visit.uses[visit.next++];
+                Use const use = last.uses[last.next++];
                 if (states[use.definition] == State::Open) {
                     describeCircle(open, use, error);
                     return false;
                 }
-                if (states[use.definition] == State::New) {
-                    open.push_back({use.definition, usesIn(definitions[use.definition]), 0});
-                }
+                if (states[use.definition] == State::New) open.push_back(visit(use.definition));
             }
         }
         return true;
     }
 
-    Size sizeOf(NodeGraph const& graph) const {
-        Size size{2, 1};  // Of a definition, the ends.
-        for (GraphNode const& node : graph.nodes) {
-            Size inner;
-            auto const use = positions.find(node.type);
-            if (node.inside) {
-                inner = sizeOf(*node.inside);
-            } else if (use != positions.end()) {
-                inner = sizes[use->second];
-            }
-            // No sum of these overflows.
-            size.patches = std::min(size.patches + inner.patches + 1, kMostPatches + 1);
-            size.depth = std::max(size.depth, inner.depth + 1);
-        }
-        return size;
-    }
+    // Of the whole: the nodes themselves are no copies.
+    Size sizeOf(NodeGraph const& graph) const { return sizeOf(graph, false); }
 
 private:
     struct Use {
         std::size_t definition;
-        std::string pointer;
+        NodeGraph const* graph;
+        std::size_t node;
     };
     struct Visit {
         std::size_t definition;
@@ -128,19 +156,59 @@ private:
         std::size_t next;
     };
 
-    std::vector<Use> usesIn(NodeGraph const& graph) const {
-        std::vector<Use> uses;
+    Size sizeOf(Definition const& definition) const {
+        Size size = sizeOf(definition.graph, true);
+        size.patches += 2;  // The ends.
+        size.copiedBytes += 2 * sizeof(Patch) + definition.id.size() + definition.title.size() +
+                            bytesOfPorts(definition.inputs) + bytesOfPorts(definition.outputs) +
+                            bytesOf(definition.graph.attributes);
+        return size;
+    }
+
+    // No sum of these overflows.
+    Size sizeOf(NodeGraph const& graph, bool isCopied) const {
+        Size size;
+        if (isCopied) size.copiedBytes = graph.links.size() * sizeof(Connection);
+        for (std::size_t i = 0; i < graph.nodes.size(); ++i) {
+            GraphNode const& node = graph.nodes[i];
+            Size inner{0, 0, 0};
+            auto const use = positions.find(node.type);
+            if (node.inside) {
+                inner = sizeOf(*node.inside, isCopied);
+            } else if (use != positions.end()) {
+                inner = sizes[use->second];
+            }
+            size.patches = std::min(size.patches + inner.patches + 1, kMostPatches + 1);
+            size.depth = std::max(size.depth, inner.depth + 1);
+            size.copiedBytes += inner.copiedBytes + (isCopied ? bytesOfNode(node) : 0);
+            size.copiedBytes = std::min(size.copiedBytes, kMostCopiedBytes + 1);
+        }
+        return size;
+    }
+
+    static std::size_t bytesOfNode(GraphNode const& node) {
+        std::size_t bytes = sizeof(Patch) + node.type.size() + bytesOf(node.attributes);
+        if (node.ports)
+            bytes += bytesOfPorts(node.ports->inputs) + bytesOfPorts(node.ports->outputs);
+        return bytes;
+    }
+
+    Visit visit(std::size_t definition) const {
+        Visit result{definition, {}, 0};
+        findUses(definitions[definition].graph, result.uses);
+        return result;
+    }
+
+    void findUses(NodeGraph const& graph, std::vector<Use>& uses) const {
         for (std::size_t i = 0; i < graph.nodes.size(); ++i) {
             GraphNode const& node = graph.nodes[i];
             auto const use = positions.find(node.type);
             if (node.inside) {
-                std::vector<Use> const inner = usesIn(*node.inside);
-                uses.insert(uses.end(), inner.begin(), inner.end());
+                findUses(*node.inside, uses);
             } else if (use != positions.end()) {
-                uses.push_back({use->second, graph.pointer + "/nodes/" + std::to_string(i)});
+                uses.push_back({use->second, &graph, i});
             }
         }
-        return uses;
     }
 
     void describeCircle(std::vector<Visit> const& open, Use const& use,
@@ -151,32 +219,32 @@ private:
             isInside = isInside || visit.definition == use.definition;
             if (isInside) path += nameOf(visit.definition) + " > ";
         }
-        error.pointer = use.pointer;
+        error.pointer = pointerTo(*use.graph) + "/nodes/" + std::to_string(use.node);
         error.message = "the shared definition " + nameOf(use.definition) +
                         " contains itself: " + path + nameOf(use.definition);
     }
 
-    std::string nameOf(std::size_t definition) const {
-        NodeGraph const& graph = definitions[definition];
-        return "\"" + printable(graph.title.empty() ? graph.id : graph.title) + "\"";
+    std::string nameOf(std::size_t position) const {
+        Definition const& definition = definitions[position];
+        return "\"" + printable(definition.title.empty() ? definition.id : definition.title) + "\"";
     }
 
-    std::deque<NodeGraph> const& definitions;
+    std::deque<Definition> const& definitions;
     std::unordered_map<std::string, std::size_t> const& positions;
     std::vector<Size> sizes;
 };
 
 class Maker {
 public:
-    Maker(std::deque<NodeGraph>& all, std::unordered_map<std::string, std::size_t> const& byId,
+    Maker(std::deque<Definition>& all, std::unordered_map<std::string, std::size_t> const& byId,
           DocumentInfo& made)
         : definitions(all), positions(byId), uses(all.size(), 0), info(made) {}
 
     // The root's own identifier comes last, so that nodes keep theirs.
     void make(NodeGraph& graph, Patch& root) {
         claim(graph);
-        fill(root, graph, true);
-        root.id = freeIdentifier(1);
+        fill(root, graph, nullptr, true);
+        root.id = freeIdentifier();
         for (std::size_t count : uses) info.unusedDefinitions += count == 0 ? 1 : 0;
     }
 
@@ -184,9 +252,11 @@ private:
     // Nodes keep their identifiers before any other gets a free one, and the outer ones before the
     // inner ones.
     void claim(NodeGraph& graph) {
-        for (GraphNode& node : graph.nodes) node.id = claimed(node.name);
-        for (GraphNode const& node : graph.nodes) {
-            if (node.inside) claim(*node.inside);
+        for (std::size_t i = 0; i < graph.nodes.size(); ++i) {
+            graph.nodes[i].id = claimed(graph.nodes[i].name);
+        }
+        for (std::size_t i = 0; i < graph.nodes.size(); ++i) {
+            if (graph.nodes[i].inside) claim(*graph.nodes[i].inside);
         }
     }
 
@@ -202,42 +272,38 @@ private:
 
     // The patches and connections of `graph` become those of `patch`. What is used for the last
     // time is moved and not copied.
-    void fill(Patch& patch, NodeGraph& graph, bool isLastUse) {
+    void fill(Patch& patch, NodeGraph& graph, Definition const* definition, bool isLastUse) {
         Places places;
-        places.reserve(graph.nodes.size() + 2);
+        std::size_t const count = graph.nodes.size();
+        places.reserve(count + 2);
         std::vector<unsigned long long> ids;
-        ids.reserve(graph.nodes.size());
-        for (GraphNode const& node : graph.nodes) {
-            places.emplace_back(node.name, places.size());
+        ids.reserve(count);
+        for (std::size_t i = 0; i < count; ++i) {
+            GraphNode const& node = graph.nodes[i];
+            places.emplace_back(node.name, i);
             // Those of a copy have not been claimed before.
             ids.push_back(isLastUse ? node.id : claimed(node.name));
         }
         for (unsigned long long& id : ids) {
-            if (id == 0) id = freeIdentifier(0);
+            if (id == 0) id = freeIdentifier();
         }
         std::vector<Patch> children;
-        children.reserve(graph.nodes.size() + 2);
-        for (std::size_t i = 0; i < ids.size(); ++i) {
-            if (isLastUse) {
-                children.push_back(child(std::move(graph.nodes.front()), ids[i], patch));
-                graph.nodes.pop_front();
-            } else {
-                children.push_back(child(graph.nodes[i], ids[i], patch));
-            }
+        children.reserve(count + 2);
+        GroupTags const tags = tagsOf(patch);
+        for (std::size_t i = 0; i < count; ++i) {
+            children.push_back(isLastUse ? child(graph.nodes.takeFirst(), ids[i], tags)
+                                         : child(graph.nodes[i], ids[i], tags));
         }
-        if (!graph.inputs.empty()) {
-            places.emplace_back(NodeName{kInputNode}, children.size());
-            children.push_back(end(graph.inputNode, kGroupInputKind, graph.inputs));
-        }
-        if (!graph.outputs.empty()) {
-            places.emplace_back(NodeName{kOutputNode}, children.size());
-            children.push_back(end(graph.outputNode, kGroupOutputKind, graph.outputs));
+        if (definition != nullptr) {
+            addEnd(children, places, definition->inputNode, kGroupInputKind, definition->inputs);
+            addEnd(children, places, definition->outputNode, kGroupOutputKind, definition->outputs);
         }
         // Of nodes of one name the first comes first.
         std::sort(places.begin(), places.end());
         std::vector<Connection> connections;
         connections.reserve(graph.links.size());
-        for (GraphLink const& link : graph.links) {
+        for (std::size_t i = 0; i < graph.links.size(); ++i) {
+            GraphLink const& link = graph.links[i];
             Connection connection;
             std::string const missing = connect(link, places, children, connection);
             if (missing.empty()) {
@@ -246,37 +312,69 @@ private:
             }
             ++info.omittedLinks;
             if (info.notes.size() < kMostNotes) {
-                info.notes.push_back(graph.pointer + "/links/" + std::to_string(link.position) +
+                info.notes.push_back(pointerTo(graph) + "/links/" + std::to_string(link.position) +
                                      ": link " + std::to_string(link.id) +
                                      " left out: there is no " + missing);
             }
         }
         if (!children.empty()) patch.children = arrayOf(std::move(children));
         if (!connections.empty()) patch.connections = arrayOf(std::move(connections));
+        if (!graph.linkMembers.empty()) {
+            addAttribute(patch, "linkMembers", Unstructured(graph.linkMembers));
+        }
     }
 
-    Patch child(GraphNode&& node, unsigned long long id, Patch const& parent) {
+    // Under that key, or the first like it that is free.
+    static void addAttribute(Patch& patch, std::string key, Unstructured value) {
+        while (patch.attributes.count(key) != 0) key += "_";
+        patch.attributes.emplace(std::move(key), std::move(value));
+    }
+
+    // The tags of a group's ports, by their names.
+    struct GroupTags {
+        std::unordered_map<std::string, unsigned long long> inputs;
+        std::unordered_map<std::string, unsigned long long> outputs;
+    };
+
+    static GroupTags tagsOf(Patch const& group) {
+        GroupTags tags;
+        for (Port const& port : *group.inputs) tags.inputs[port.name] = port.tag;
+        for (Port const& port : *group.outputs) tags.outputs[port.name] = port.tag;
+        return tags;
+    }
+
+    Patch child(GraphNode&& node, unsigned long long id, GroupTags const& tags) {
         GraphNode::Ports ports;
         if (node.ports) ports = std::move(*node.ports);
         Patch patch = started(node.name, std::move(node.type), std::move(node.attributes), id);
-        finish(patch, ports, parent, node.inside != nullptr);
+        finish(patch, ports, tags, node.inside != nullptr);
         if (node.inside) {
-            patch.attributes.merge(node.inside->attributes);
-            fill(patch, *node.inside, true);
+            addMembers(patch, std::move(node.inside->attributes));
+            fill(patch, *node.inside, nullptr, true);
         }
         return patch;
     }
 
-    Patch child(GraphNode const& node, unsigned long long id, Patch const& parent) {
+    Patch child(GraphNode const& node, unsigned long long id, GroupTags const& tags) {
         GraphNode::Ports ports;
         if (node.ports) ports = *node.ports;
         Patch patch = started(node.name, node.type, node.attributes, id);
-        finish(patch, ports, parent, node.inside != nullptr);
+        finish(patch, ports, tags, node.inside != nullptr);
         if (node.inside) {
-            patch.attributes.insert(node.inside->attributes.begin(), node.inside->attributes.end());
-            fill(patch, *node.inside, false);
+            addMembers(patch, node.inside->attributes);
+            fill(patch, *node.inside, nullptr, false);
         }
         return patch;
+    }
+
+    // Those of an inline subgraph become its node's, and stay apart where the node has the same.
+    static void addMembers(Patch& patch, std::map<std::string, Unstructured> members) {
+        auto const id = members.find("id");
+        Unstructured::Map apart;
+        if (id != members.end()) apart.insert(members.extract(id));
+        patch.attributes.merge(members);
+        apart.merge(members);
+        if (!apart.empty()) addAttribute(patch, "subgraph", Unstructured(std::move(apart)));
     }
 
     Patch started(NodeName const& name, std::string type,
@@ -293,13 +391,12 @@ private:
         }
         if (name.text || name.number < 0 || static_cast<unsigned long long>(name.number) != id) {
             ++info.renumberedNodes;
-            patch.attributes["id"] =
-                name.text ? Unstructured(*name.text) : Unstructured(name.number);
+            if (!name.text) patch.attributes["id"] = name.number;
         }
         return patch;
     }
 
-    void finish(Patch& patch, GraphNode::Ports& ports, Patch const& parent, bool hasInside) {
+    void finish(Patch& patch, GraphNode::Ports& ports, GroupTags const& tags, bool hasInside) {
         auto const found = patch.attributes.find("properties");
         bool const hasProperties = found != patch.attributes.end();
         finishPorts(ports.inputs, hasProperties ? &found->second : nullptr);
@@ -313,8 +410,8 @@ private:
             retagTime(ports.outputs);
         } else if (hasProperties) {
             std::string const name = found->second.stringAt({"name"}, "");
-            if (patch.builtin == kGroupInputKind) retagEnd(ports.outputs, *parent.inputs, name);
-            if (patch.builtin == kGroupOutputKind) retagEnd(ports.inputs, *parent.outputs, name);
+            if (patch.builtin == kGroupInputKind) retagEnd(ports.outputs, tags.inputs, name);
+            if (patch.builtin == kGroupOutputKind) retagEnd(ports.inputs, tags.outputs, name);
         }
         takeInto(patch.inputs, ports.inputs);
         takeInto(patch.outputs, ports.outputs);
@@ -325,44 +422,62 @@ private:
 
     // The inside of the definition becomes that of the patch.
     void use(std::size_t position, Patch& patch) {
-        NodeGraph& graph = definitions[position];
+        Definition& definition = definitions[position];
         ++uses[position];
         patch.builtin = kGroupKind;
-        if (patch.name.empty()) patch.name = graph.title;
-        Unstructured::Map about = graph.attributes;
-        about["id"] = graph.id;
-        about["name"] = graph.title;
-        patch.attributes.emplace("definition", std::move(about));
-        fill(patch, graph, false);
+        if (patch.name.empty()) patch.name = definition.title;
+        Unstructured::Map about = definition.graph.attributes;
+        about["id"] = definition.id;
+        about["name"] = definition.title;
+        if (!hasEnd(definition.inputNode, definition.inputs)) {
+            about["inputNode"] = definition.inputNode;
+        }
+        if (!hasEnd(definition.outputNode, definition.outputs)) {
+            about["outputNode"] = definition.outputNode;
+        }
+        addAttribute(patch, "definition", Unstructured(std::move(about)));
+        fill(patch, definition.graph, &definition, false);
+    }
+
+    // Whether what is said of that end is said of a patch, or nothing is said.
+    static bool hasEnd(Unstructured const& node, std::vector<Port> const& ports) {
+        return node.isNull() || (node.isMap() && !ports.empty());
     }
 
     // Of a definition: the patch inside it that stands for its inputs or its outputs.
-    Patch end(Unstructured const& node, unsigned long long kind, std::deque<Port> const& ofGroup) {
+    void addEnd(std::vector<Patch>& children, Places& places, Unstructured const& node,
+                unsigned long long kind, std::vector<Port> const& ofGroup) {
+        if (ofGroup.empty()) return;
+        long long const usual = kind == kGroupInputKind ? kInputNode : kOutputNode;
+        places.emplace_back(NodeName{node.integerAt({"id"}, usual)}, children.size());
         Patch patch;
-        patch.id = freeIdentifier(0);
+        patch.id = freeIdentifier();
         patch.builtin = kind;
         patch.name = kindToString(kind);
         if (Unstructured::Map const* const members = node.ifMap()) {
             patch.attributes = *members;
             patch.attributes.erase("id");
         }
-        std::deque<Port> ports = ofGroup;
+        std::deque<Port> ports(ofGroup.begin(), ofGroup.end());
         finishPorts(ports, nullptr);
         takeInto(kind == kGroupInputKind ? patch.outputs : patch.inputs, ports);
-        return patch;
+        children.push_back(std::move(patch));
     }
 
-    // Identifiers, tags, types and defaults. A property of a port's name is its default.
+    // Identifiers, tags, types and defaults. A property is the default of the first port of its
+    // name.
     void finishPorts(std::deque<Port>& ports, Unstructured const* properties) {
+        std::unordered_set<std::string_view> names;
         for (std::size_t i = 0; i < ports.size(); ++i) {
             Port& port = ports[i];
+            bool const isFirst = names.insert(port.name).second;
             port.id = ++lastPortId;
             port.tag = i + 1;
             auto const type = port.attributes.find("type");
             port.typeInfo =
                 typeInfoOf(type == port.attributes.end() ? Unstructured() : type->second);
             Unstructured const* setting =
-                properties == nullptr ? nullptr : properties->find(port.name);
+                properties == nullptr || !isFirst ? nullptr : properties->find(port.name);
             if (setting == nullptr && i == 0 && properties != nullptr) {
                 setting = properties->find("value");
             }
@@ -379,17 +494,16 @@ private:
     }
 
     // The ends of a group find the group's ports by name; here that is turned into tags.
-    static void retagEnd(std::deque<Port>& ends, std::vector<Port> const& ofGroup,
+    static void retagEnd(std::deque<Port>& ends,
+                         std::unordered_map<std::string, unsigned long long> const& tags,
                          std::string const& name) {
-        if (ends.empty()) return;
-        for (Port const& port : ofGroup) {
-            if (port.name == name) ends[0].tag = port.tag;
-        }
+        auto const tag = tags.find(name);
+        if (!ends.empty() && tag != tags.end()) ends[0].tag = tag->second;
     }
 
     // A use has some of its definition's ports, in any order: each gets the tag of the first one of
     // its name that is not taken, and those of no such name tags of their own.
-    static void joinByName(std::deque<Port>& ports, std::deque<Port> const& ofDefinition) {
+    static void joinByName(std::deque<Port>& ports, std::vector<Port> const& ofDefinition) {
         std::unordered_map<std::string, std::vector<std::size_t>> byName;
         for (std::size_t i = ofDefinition.size(); i-- > 0;)
             byName[ofDefinition[i].name].push_back(i);
@@ -408,6 +522,7 @@ private:
     // Fills `connection` in, or names what is not there.
     static std::string connect(GraphLink const& link, Places const& places,
                                std::vector<Patch> const& patches, Connection& connection) {
+        if (!link.hasEnds) return "node at one of its ends";
         Patch const* const from = find(link.from, places, patches);
         if (from == nullptr) return "node " + shown(link.from);
         Patch const* const to = find(link.to, places, patches);
@@ -440,14 +555,12 @@ private:
         return std::string(side) + " " + std::to_string(slot) + " of node " + shown(node);
     }
 
-    // The one that is wanted where it is free; 0 wants none.
-    unsigned long long freeIdentifier(unsigned long long wanted) {
-        if (wanted != 0 && patchIds.insert(wanted).second) return wanted;
+    unsigned long long freeIdentifier() {
         while (!patchIds.insert(nextFree).second) ++nextFree;
         return nextFree;
     }
 
-    std::deque<NodeGraph>& definitions;
+    std::deque<Definition>& definitions;
     std::unordered_map<std::string, std::size_t> const& positions;
     std::vector<std::size_t> uses;
     DocumentInfo& info;
@@ -465,7 +578,22 @@ bool NodeName::operator<(NodeName const& other) const {
     return *text < *other.text;
 }
 
-bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root,
+std::string pointerTo(NodeGraph const& graph) {
+    std::vector<NodeGraph const*> path;
+    for (NodeGraph const* g = &graph; g != nullptr; g = g->around) path.push_back(g);
+    std::string pointer;
+    for (auto g = path.rbegin(); g != path.rend(); ++g) {
+        std::string const position = std::to_string((*g)->position);
+        if ((*g)->around != nullptr) {
+            pointer += "/nodes/" + position + "/subgraph";
+        } else if ((*g)->isDefinition) {
+            pointer += "/definitions/subgraphs/" + position;
+        }
+    }
+    return pointer;
+}
+
+bool toPatches(NodeGraph& graph, std::deque<Definition>& definitions, Patch& root,
                DocumentInfo& info, DocumentError& error) {
     std::unordered_map<std::string, std::size_t> positions;
     for (std::size_t i = 0; i < definitions.size(); ++i) {
@@ -477,12 +605,12 @@ bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root
     if (size.patches > kMostPatches && !definitions.empty()) {
         error.message = "with its shared definitions the graph has more than " +
                         std::to_string(kMostPatches) + " nodes";
-        return false;
-    }
-    if (size.depth > kDeepestGroups) {
+    } else if (size.copiedBytes > kMostCopiedBytes) {
+        error.message = "the copies of its shared definitions take more than 256 MiB";
+    } else if (size.depth > kDeepestGroups) {
         error.message = "groups nest deeper than " + std::to_string(kDeepestGroups) + " levels";
-        return false;
     }
+    if (!error.message.empty()) return false;
     root.name = "graph";
     root.builtin = kGroupKind;
     root.attributes = std::move(graph.attributes);

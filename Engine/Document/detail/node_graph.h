@@ -5,6 +5,7 @@
 #define TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
 
 #include <Engine/Base/patch.h>
+#include <Engine/Document/detail/lists.h>
 #include <Engine/Document/document.h>
 
 #include <cstddef>
@@ -12,6 +13,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace tarn::engine::detail {
 
@@ -52,29 +54,43 @@ struct GraphLink {
     long long fromSlot = 0;
     NodeName to;
     long long toSlot = 0;
+    /// False where one of the four is null.
+    bool hasEnds = true;
 };
 
 struct NodeGraph {
-    /// The JSON pointer to it.
-    std::string pointer;
-    std::deque<GraphNode> nodes;
-    std::deque<GraphLink> links;
+    LazyList<GraphNode> nodes;
+    LazyList<GraphLink> links;
     /// All other members.
     std::map<std::string, Unstructured> attributes;
+    /// What there is of its links beside their ends, an object for each that has more.
+    Unstructured::Array linkMembers;
 
-    /// Of a shared definition: what its uses have as `type`, what people call it, its ports, and
-    /// what is said of the nodes that stand for them inside.
+    /// The graph that has it inside a node, and the position of that node; or else, of a shared
+    /// definition, its position in the list of them.
+    NodeGraph const* around = nullptr;
+    std::size_t position = 0;
+    bool isDefinition = false;
+};
+
+/// A graph that nodes use by its `id`.
+struct Definition {
+    NodeGraph graph;
     std::string id;
     std::string title;
-    std::deque<Port> inputs;
-    std::deque<Port> outputs;
+    std::vector<Port> inputs;
+    std::vector<Port> outputs;
+    /// What is said of the nodes that stand for these ports inside.
     Unstructured inputNode;
     Unstructured outputNode;
 };
 
+/// The JSON pointer to the graph. Linear in how deep it is.
+std::string pointerTo(NodeGraph const& graph);
+
 /// Makes patches of a graph and of the shared definitions that its nodes use. False where that is
 /// impossible; then `error` says why. The graph is used up.
-bool toPatches(NodeGraph& graph, std::deque<NodeGraph>& definitions, Patch& root,
+bool toPatches(NodeGraph& graph, std::deque<Definition>& definitions, Patch& root,
                DocumentInfo& info, DocumentError& error);
 
 }  // namespace tarn::engine::detail
