@@ -75,6 +75,7 @@ void data();
 void paths();
 void easing();
 void graphs();
+void edits();
 void documentFiles();
 
 }  // namespace bench

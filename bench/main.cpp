@@ -144,6 +144,7 @@ int main(int argc, char** argv) {
     bench::paths();
     bench::easing();
     bench::graphs();
+    bench::edits();
     bench::documentFiles();
 
     benchmark::Initialize(&count, arguments.data());

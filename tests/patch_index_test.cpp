@@ -2,6 +2,7 @@
 
 #include "support/allocations.h"
 #include "support/death.h"
+#include "support/edits.h"
 #include "support/graph_model.h"
 #include "support/graphs.h"
 #include "support/random.h"
@@ -220,46 +221,215 @@ TEST(PatchIndex, IsNotSlowedByIdentifiersThatWereChosenForIt) {
     }
 }
 
+namespace {
+
+// What the walks answer about this identifier.
+void expectAnswers(PatchIndex const& index, unsigned long long id) {
+    Patch const& root = index.root();
+    Patch const* const found = findPatchRecursive(root, id);
+    ASSERT_EQ(index.findPatch(id), found);
+    Patch const* const parent = found == nullptr ? nullptr : modelParent(root, found);
+    ASSERT_EQ(index.parentOf(id), parent);
+    expectView(index.incomingConnectionsToPatch(id), parent,
+               parent ? findIncomingConnectionsToPatch(*parent, id) : Set());
+    expectView(index.outgoingConnectionsFromPatch(id), parent,
+               parent ? findOutgoingConnectionsFromPatch(*parent, id) : Set());
+
+    ASSERT_EQ(index.findInputPort(id), modelPort(root, &Patch::inputs, id).port);
+    ASSERT_EQ(index.findOutputPort(id), modelPort(root, &Patch::outputs, id).port);
+    Patch const* const owner = modelOwner(root, id);
+    ASSERT_EQ(index.ownerOfPort(id), owner);
+
+    Patch const* const ownersParent = owner ? modelParent(root, owner) : nullptr;
+    auto const incoming =
+        ownersParent ? findIncomingConnectionToPort(*ownersParent, id) : Optional<Connection>();
+    Connection const* const indexed = index.incomingConnection(id);
+    ASSERT_EQ(indexed != nullptr, incoming.hasValue());
+    if (incoming) {
+        ASSERT_EQ(*indexed, *incoming);
+        ASSERT_EQ(indexed, &*std::find(ownersParent->connections->begin(),
+                                       ownersParent->connections->end(), *incoming));
+    }
+
+    Set const outgoing = findOutgoingConnectionsFromPort(root, id);
+    ConnectionView const view = index.outgoingConnections(id);
+    ASSERT_EQ(Set(view.begin(), view.end()), outgoing);
+    ASSERT_EQ(view.size(), outgoing.size());
+    for (std::size_t n = 1; n < view.size(); ++n) ASSERT_LT(&view[n - 1], &view[n]);
+}
+
+}  // namespace
+
 TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {
     tests::Random random(3);
     for (int i = 0; i < 1500; ++i) {
         PatchIndex const index(randomPatch(random, 4));
-        Patch const& root = index.root();
         for (unsigned long long id : {0ULL, 1ULL, 2ULL, 3ULL, 4ULL, 5ULL, 6ULL, 7ULL, 8ULL, 9ULL,
                                       10ULL, 11ULL, 12ULL, 1ULL << 32, ULLONG_MAX}) {
             SCOPED_TRACE(testing::Message() << "tree " << i << ", id " << id);
-            Patch const* const found = findPatchRecursive(root, id);
-            ASSERT_EQ(index.findPatch(id), found);
-            Patch const* const parent = found == nullptr ? nullptr : modelParent(root, found);
-            ASSERT_EQ(index.parentOf(id), parent);
-            expectView(index.incomingConnectionsToPatch(id), parent,
-                       parent ? findIncomingConnectionsToPatch(*parent, id) : Set());
-            expectView(index.outgoingConnectionsFromPatch(id), parent,
-                       parent ? findOutgoingConnectionsFromPatch(*parent, id) : Set());
-
-            ASSERT_EQ(index.findInputPort(id), modelPort(root, &Patch::inputs, id).port);
-            ASSERT_EQ(index.findOutputPort(id), modelPort(root, &Patch::outputs, id).port);
-            Patch const* const owner = modelOwner(root, id);
-            ASSERT_EQ(index.ownerOfPort(id), owner);
-
-            Patch const* const ownersParent = owner ? modelParent(root, owner) : nullptr;
-            auto const incoming = ownersParent ? findIncomingConnectionToPort(*ownersParent, id)
-                                               : Optional<Connection>();
-            Connection const* const indexed = index.incomingConnection(id);
-            ASSERT_EQ(indexed != nullptr, incoming.hasValue());
-            if (incoming) {
-                ASSERT_EQ(*indexed, *incoming);
-                ASSERT_EQ(indexed, &*std::find(ownersParent->connections->begin(),
-                                               ownersParent->connections->end(), *incoming));
-            }
-
-            Set const outgoing = findOutgoingConnectionsFromPort(root, id);
-            ConnectionView const view = index.outgoingConnections(id);
-            ASSERT_EQ(Set(view.begin(), view.end()), outgoing);
-            ASSERT_EQ(view.size(), outgoing.size());
-            for (std::size_t n = 1; n < view.size(); ++n) ASSERT_LT(&view[n - 1], &view[n]);
+            expectAnswers(index, id);
         }
         if (HasFatalFailure()) return;
+    }
+}
+
+TEST(PatchIndex, AgreesWithTheWalksAfterChainsOfUpdates) {
+    Random random(5);
+    for (int i = 0; i < 60; ++i) {
+        AnyDocument any(random);
+        PatchIndex index(any.patch(3));
+        std::vector<Patch> history{index.root()};
+        for (int step = 0; step < 25; ++step) {
+            Patch next;
+            Patch const former = index.root();
+            PatchIndex const copy = random.below(8) == 0 ? index : PatchIndex(Patch());
+            switch (random.below(8)) {
+                case 0: next = history[random.below(history.size())]; break;
+                case 1: next = Model(former).toPatch(); break;  // Shares nothing.
+                case 2: next = randomPatch(random, 3); break;   // Identifiers repeat.
+                default: {
+                    Model model(former);
+                    PatchEdit edit(index);
+                    for (std::size_t n = random.below(6); n > 0; --n) {
+                        static_cast<void>(editOnce(any, edit, model));
+                    }
+                    next = edit.commit();
+                }
+            }
+            index.update(next);
+            history.push_back(next);
+            ASSERT_EQ(index.root(), next);
+            SCOPED_TRACE(testing::Message() << "chain " << i << ", step " << step);
+            for (unsigned long long id = 0; id < 150; ++id) expectAnswers(index, id);
+            if (copy.root().id != 0) {
+                ASSERT_EQ(copy.root(), former);
+                for (unsigned long long id = 0; id < 50; ++id) expectAnswers(copy, id);
+            }
+            if (HasFatalFailure()) return;
+        }
+    }
+}
+
+TEST(PatchIndex, FollowsUpdatesOfEachKind) {
+    auto const base = [] {
+        return patch(1,
+                     {withPorts(patch(2, {patch(4)}), {port(21)}, {port(22)}),
+                      withPorts(patch(3), {port(31)}, {port(32)})},
+                     {{2, 22, 3, 31}, {3, 32, 2, 21}});
+    };
+    struct Row {
+        char const* what;
+        std::function<void(Model&)> change;
+    };
+    for (Row const& row : {
+             Row{"nothing", [](Model&) {}},
+             Row{"identifier of the root", [](Model& m) { m.fields.id = 9; }},
+             Row{"identifier 0", [](Model& m) { m.find(3).patch->fields.id = 0; }},
+             Row{"a patch twice", [](Model& m) { m.children.push_back(m.children.front()); }},
+             Row{"a patch of the root's identifier",
+                 [](Model& m) { m.children.emplace_back(patch(1)); }},
+             Row{"an added patch twice",
+                 [](Model& m) {
+                     m.children.emplace_back(patch(7));
+                     m.children.emplace_back(patch(7));
+                 }},
+             Row{"a port twice", [](Model& m) { m.find(4).patch->inputs.push_back(port(21)); }},
+             Row{"an added port twice",
+                 [](Model& m) {
+                     m.find(4).patch->inputs = {port(41)};
+                     m.find(4).patch->outputs = {port(41)};
+                 }},
+             Row{"a port of the other side",
+                 [](Model& m) { std::swap(m.find(2).patch->inputs, m.find(2).patch->outputs); }},
+             Row{"a connection to an output",
+                 [](Model& m) {
+                     m.connections.push_back({3, 32, 2, 22});
+                 }},
+             Row{"a connection to an added output",
+                 [](Model& m) {
+                     m.connections.push_back({3, 32, 2, 23});
+                     m.find(2).patch->outputs.push_back(port(23));
+                 }},
+             Row{"a connection that repeats",
+                 [](Model& m) {
+                     m.connections.push_back({2, 22, 3, 31});
+                 }},
+             Row{"connections in another order",
+                 [](Model& m) { std::swap(m.connections[0], m.connections[1]); }},
+             Row{"children in another order", [](Model& m) { m.children.reverse(); }},
+             Row{"ports of the root",
+                 [](Model& m) {
+                     m.inputs = {port(11)};
+                     m.outputs = {port(12)};
+                 }},
+             Row{"a child becomes the parent of its parent",
+                 [](Model& m) {
+                     m.movePatch(4, 1, 0);
+                     m.movePatch(2, 4, 0);
+                 }},
+             Row{"a parent goes, its child stays",
+                 [](Model& m) {
+                     m.movePatch(4, 3, 0);
+                     m.removePatch(2);
+                 }},
+             Row{"into an added patch",
+                 [](Model& m) {
+                     m.addPatch(1, patch(7, {patch(8)}), 0);
+                     m.movePatch(3, 8, 0);
+                 }},
+             Row{"all of it", [](Model& m) { m = Model(patch(1)); }},
+         }) {
+        SCOPED_TRACE(row.what);
+        Model model(base());
+        row.change(model);
+        PatchIndex index(base());
+        for (Patch const& next : {model.toPatch(), base(), model.toPatch()}) {
+            index.update(next);
+            ASSERT_EQ(index.root(), next);
+            for (unsigned long long id = 0; id < 50; ++id) expectAnswers(index, id);
+        }
+    }
+}
+
+TEST(PatchIndex, UpdatesSurviveFailingAllocations) {
+    Random random(6);
+    for (int i = 0; i < 12; ++i) {
+        AnyDocument any(random);
+        PatchIndex index(any.patch(2));
+        Patch const former = index.root();
+        Model model(former);
+        PatchEdit edit(index);
+        for (int n = 0; n < 5; ++n) ASSERT_TRUE(editOnce(any, edit, model));
+        Patch const next = edit.commit();
+        failEachAllocation([&] { index.update(next); },
+                           [&] {
+                               EXPECT_EQ(index.root().children, former.children);
+                               for (unsigned long long id = 0; id < 40; ++id) {
+                                   expectAnswers(index, id);
+                               }
+                           });
+        EXPECT_EQ(index.root(), next);
+        for (unsigned long long id = 0; id < 60; ++id) expectAnswers(index, id);
+    }
+}
+
+// Each is a little larger than the one before, and now and then one is made anew.
+TEST(PatchIndex, SurvivesManyUpdates) {
+    PatchIndex index(patch(1, {withPorts(patch(2), {port(1)}, {port(2)})}));
+    for (int i = 0; i < 3000; ++i) {
+        PatchEdit edit(index);
+        if (i % 500 == 499) {
+            unsigned long long const end = edit.freshPatchId();
+            for (unsigned long long id = 3; id < end; ++id) edit.removePatch(id);
+        } else {
+            unsigned long long const id = edit.freshPatchId();
+            Port const input = port(edit.freshPortId());
+            ASSERT_TRUE(edit.addPatch(1, withPorts(patch(id), {input}, {})));
+            ASSERT_TRUE(edit.connect({2, 2, id, input.id}));
+        }
+        index.update(edit.commit());
+        if (i % 100 > 1) continue;
+        for (unsigned long long id = 0; id < 600; ++id) expectAnswers(index, id);
     }
 }
 

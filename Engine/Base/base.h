@@ -15,6 +15,8 @@
 #include <Engine/Base/media.h>
 #include <Engine/Base/optional.h>
 #include <Engine/Base/patch.h>
+#include <Engine/Base/patch_changes.h>
+#include <Engine/Base/patch_edit.h>
 #include <Engine/Base/patch_index.h>
 #include <Engine/Base/path.h>
 #include <Engine/Base/path_geometry.h>

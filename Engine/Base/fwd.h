@@ -38,6 +38,15 @@ class ConnectionView;
 class PatchIndex;
 class EvalPatchIndex;
 
+// patch_edit.h
+class PatchEdit;
+
+// patch_changes.h
+enum class PortField : unsigned char;
+enum class PatchField : unsigned char;
+struct PortChange;
+struct PatchChange;
+
 // points.h, path.h
 class Points;
 enum class PathInstruction : unsigned char;

@@ -16,6 +16,10 @@
 
 namespace tarn::engine {
 
+namespace detail {
+struct PatchTables;
+}
+
 /// Some of the connections of one list, each once, in the order of the list. Nothing is copied: a
 /// view and its references live as long as the index that gave it.
 class ConnectionView {
@@ -112,9 +116,21 @@ public:
     TARN_ENGINE_BASE_EXPORT ConnectionView
     outgoingConnectionsFromPatch(unsigned long long id) const;
 
+    /// Makes this the index of another root: afterwards its answers are those of
+    /// `PatchIndex(root)`. The cost follows what differs from the root before, lists that are one
+    /// object not being looked at. It is that of a new index where copies share this one's tables,
+    /// where identifiers repeat or a connection leads to an output, and now and then after many
+    /// updates.
+    ///
+    /// Views from before are no longer valid, and `root()` is another patch. Pointers to patches,
+    /// ports and connections live as long as the lists that they refer into: those of the former
+    /// root, while somebody holds it, and all that the new one shares with it. A failing
+    /// allocation leaves the index as it was. Nobody may ask this index anything meanwhile.
+    TARN_ENGINE_BASE_EXPORT void update(Patch root);
+
 private:
-    struct Tables;
-    std::shared_ptr<Tables const> tables;
+    friend class PatchEdit;
+    std::shared_ptr<detail::PatchTables> tables;
 };
 
 /// The same for the evaluation form, whose lists everyone who shares them may change. The index

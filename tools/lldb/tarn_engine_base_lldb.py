@@ -254,7 +254,7 @@ def index_root(value):
     shared = member(value, "shared")
     if shared.IsValid():
         return pointee(value, shared)
-    tables = record(value, "PatchIndex::Tables")  # The library's own, and in its symbols alone.
+    tables = record(value, "detail::PatchTables")  # The library's own, and in its symbols alone.
     address = member(value, "tables", "_M_ptr").GetValueAsUnsigned()
     return member(at(value, "tables", address, tables), "root") if address and tables.IsValid() else None
 

@@ -72,12 +72,13 @@ std::size_t bytesOf(Unstructured const& data) {
         Unstructured const& next = *pending.back();
         pending.pop_back();
         bytes += sizeof(Unstructured);
-        if (std::string const* const text = next.ifString()) bytes += sizeof *text + text->size();
+        if (std::string const* const text = next.ifString())
+            bytes += sizeof(std::string) + text->size();
         if (Unstructured::Array const* const array = next.ifArray()) {
             for (Unstructured const& element : *array) pending.push_back(&element);
         }
-        if (Unstructured::Map const* const map = next.ifMap()) {
-            for (auto const& [key, element] : *map) {
+        if (Unstructured::Map const* const members = next.ifMap()) {
+            for (auto const& [key, element] : *members) {
                 bytes += kEntry + key.size();
                 pending.push_back(&element);
             }
@@ -215,9 +216,9 @@ private:
                         DocumentError& error) const {
         std::string path;
         bool isInside = false;
-        for (Visit const& visit : open) {
-            isInside = isInside || visit.definition == use.definition;
-            if (isInside) path += nameOf(visit.definition) + " > ";
+        for (Visit const& outer : open) {
+            isInside = isInside || outer.definition == use.definition;
+            if (isInside) path += nameOf(outer.definition) + " > ";
         }
         error.pointer = pointerTo(*use.graph) + "/nodes/" + std::to_string(use.node);
         error.message = "the shared definition " + nameOf(use.definition) +

@@ -19,14 +19,17 @@ std::uint64_t bitsOf(double number) {
     return bits;
 }
 
-// All of the text, as it would be written.
+// Whether all of the text is that number, as it would be written.
+template <class Integer>
+bool isDecimal(std::string_view text, Integer& number) {
+    char const* const end = text.data() + text.size();
+    return std::from_chars(text.data(), end, number).ptr == end && std::to_string(number) == text;
+}
+
 template <class Integer>
 Optional<Integer> decimal(std::string_view text) {
     Integer number = 0;
-    char const* const end = text.data() + text.size();
-    auto const [stop, error] = std::from_chars(text.data(), end, number);
-    if (text.empty() || stop != end || error != std::errc()) return std::nullopt;
-    if (std::to_string(number) != text) return std::nullopt;
+    if (!isDecimal(text, number)) return std::nullopt;
     return number;
 }
 

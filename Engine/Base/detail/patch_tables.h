@@ -1,0 +1,227 @@
+// Engine/Base/detail/patch_tables.h: what the indexes of graphs know. Not installed.
+
+#ifndef TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
+#define TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
+
+#include <Engine/Base/detail/hash_table.h>
+#include <Engine/Base/patch.h>
+#include <Engine/Base/patch_index.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <unordered_map>
+#include <vector>
+
+namespace tarn::engine::detail {
+
+struct PatchSlot {
+    std::uint64_t key = 0;
+    std::uint32_t record = kNone;
+    bool isFree() const { return record == kNone; }
+};
+
+template <class AnyPort>
+struct PortSlot {
+    std::uint64_t key = 0;
+    AnyPort const* port = nullptr;
+    std::uint32_t owner = kNone;
+    /// For an input the position of its incoming connection, for an output its group of outgoing
+    /// ones; `kNone` where there is none.
+    std::uint32_t link = kNone;
+    bool isFree() const { return port == nullptr; }
+};
+
+template <class AnyPatch>
+struct PatchRecord {
+    /// Null for a record that is free.
+    AnyPatch const* patch = nullptr;
+    std::uint32_t parent = kNone;
+    /// Groups of connections to and from the patch; `kNone` where there are none.
+    std::uint32_t incoming = kNone;
+    std::uint32_t outgoing = kNone;
+    /// What the last updates have seen of it.
+    std::uint32_t mark = 0;
+};
+
+/// An assertion failure for a record with a null list.
+inline void requireLists(EvalPatch const& patch) {
+    static_cast<void>(elementsOf(patch.inputs, "inputs != nullptr"));
+    static_cast<void>(elementsOf(patch.outputs, "outputs != nullptr"));
+    static_cast<void>(elementsOf(patch.children, "children != nullptr"));
+}
+inline void requireLists(Patch const& patch) {
+    static_cast<void>(elementsOf(patch.inputs, "inputs != nullptr"));
+    static_cast<void>(elementsOf(patch.outputs, "outputs != nullptr"));
+    static_cast<void>(elementsOf(patch.connections, "connections != nullptr"));
+    static_cast<void>(elementsOf(patch.children, "children != nullptr"));
+}
+
+/// Every patch, and where to find it and its ports. The first record is that of the root. In a new
+/// graph the records stand in the order in which a search looks at the patches, so that the
+/// children of a patch are neighbours.
+template <class AnyPatch, class AnyPort>
+struct Graph {
+    explicit Graph(AnyPatch const& root)
+        : records(inSearchOrder(root)),
+          patches(patchSlots()),
+          inputs(portSlots(&AnyPatch::inputs)),
+          outputs(portSlots(&AnyPatch::outputs), inputs.hashFunction()) {}
+
+    static std::vector<PatchRecord<AnyPatch>> inSearchOrder(AnyPatch const& root) {
+        requireLists(root);
+        std::vector<PatchRecord<AnyPatch>> found{{&root, kNone}};
+        std::vector<std::uint32_t> toEnter{0};
+        while (!toEnter.empty()) {
+            std::uint32_t const parent = toEnter.back();
+            toEnter.pop_back();
+            auto const first = static_cast<std::uint32_t>(found.size());
+            for (AnyPatch const& child : *found[parent].patch->children) {
+                requireLists(child);
+                found.push_back({&child, parent});
+            }
+            requireCountable(found.size());
+            for (auto i = static_cast<std::uint32_t>(found.size()); i > first; --i) {
+                if (!found[i - 1].patch->children->empty()) toEnter.push_back(i - 1);
+            }
+        }
+        found.shrink_to_fit();
+        return found;
+    }
+
+    std::vector<PatchSlot> patchSlots() const {
+        std::vector<PatchSlot> slots;
+        slots.reserve(records.size());
+        for (std::uint32_t i = 0; i < records.size(); ++i) {
+            if (records[i].patch->id != 0) slots.push_back({records[i].patch->id, i});
+        }
+        return slots;
+    }
+
+    template <class List>
+    std::vector<PortSlot<AnyPort>> portSlots(List AnyPatch::*ports) {
+        auto const listOf = [&](std::size_t i) { return (records[i].patch->*ports).get(); };
+        std::vector<PortSlot<AnyPort>> slots;
+        slots.reserve(records.size());
+        for (std::uint32_t i = 0; i < records.size(); ++i) {
+            if (i + 2 * kAhead < records.size()) detail::prefetch(listOf(i + 2 * kAhead));
+            if (i + kAhead < records.size()) detail::prefetch(listOf(i + kAhead)->data());
+            for (AnyPort const& port : *listOf(i)) slots.push_back({port.id, &port, i});
+        }
+        portCount += slots.size();
+        return slots;
+    }
+
+    std::uint32_t recordOf(unsigned long long id) const {
+        return id == 0 ? kNone : patches.at(id).record;
+    }
+
+    AnyPatch const* findPatch(unsigned long long id) const {
+        std::uint32_t const record = recordOf(id);
+        return record == kNone ? nullptr : records[record].patch;
+    }
+
+    AnyPatch const* parentOf(unsigned long long id) const {
+        std::uint32_t const record = recordOf(id);
+        std::uint32_t const parent = record == kNone ? kNone : records[record].parent;
+        return parent == kNone ? nullptr : records[parent].patch;
+    }
+
+    std::uint32_t ownerOfPort(unsigned long long portId) const {
+        std::uint32_t const ofInput = inputs.at(portId).owner;
+        std::uint32_t const ofOutput = outputs.at(portId).owner;
+        return ofInput <= ofOutput ? ofInput : ofOutput;
+    }
+
+    std::vector<PatchRecord<AnyPatch>> records;
+    HashTable<PatchSlot> patches;
+    std::size_t portCount = 0;  // Repeated ones included.
+    HashTable<PortSlot<AnyPort>> inputs;
+    HashTable<PortSlot<AnyPort>> outputs;
+};
+
+/// A connection, and where it stands.
+struct ConnectionPlace {
+    Connection const* connection;
+    std::uint32_t parent;
+    std::uint32_t position;
+};
+
+/// Appends the connections of the list, each once.
+void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
+                std::vector<ConnectionPlace>& places);
+
+/// What a `PatchIndex` knows.
+struct PatchTables {
+    explicit PatchTables(Patch patch);
+
+    /// Takes the new root over and makes this what it would be for that one. False where it has to
+    /// be made anew instead; then, and where an allocation fails, both are as they were.
+    bool update(Patch& newRoot);
+
+    /// The position of the record of the patch's first child; it has one.
+    std::uint32_t firstChildOf(std::uint32_t record) const;
+    /// That of the child at `position` in `children`, which are those of one patch, for whoever
+    /// goes through them in order: `previous` is that of the one before, or `kNone`.
+    std::uint32_t childRecord(std::vector<Patch> const& children, std::size_t position,
+                              std::uint32_t previous) const {
+        Patch const& child = children[position];
+        std::uint32_t const next = previous + 1;
+        bool const isNext = next < graph.records.size() && graph.records[next].patch == &child;
+        return isNext ? next : graph.recordOf(child.id);
+    }
+
+    /// The connections of a group in the list of `parent`.
+    ConnectionView view(std::uint32_t parent, std::uint32_t group) const {
+        if (group == kNone) return {};
+        std::vector<Connection> const& list = *graph.records[parent].patch->connections;
+        return {list.data(), &positions[group] + 1, positions[group]};
+    }
+
+    Patch root;
+    Graph<Patch, Port> graph;
+    /// Groups of connections behind one another: how many there are, then their positions in the
+    /// list of their parent.
+    std::vector<std::uint32_t> positions;
+    /// How many of the positions are of groups that are no longer there, and which records are
+    /// free.
+    std::size_t unusedPositions = 0;
+    std::vector<std::uint32_t> freeRecords;
+    /// Whether every patch but the root has an identifier of its own that is not 0, and every port
+    /// one that no other has. Then no answer depends on an order.
+    bool hasUniqueIds = false;
+    /// None is larger.
+    unsigned long long largestPatchId = 0;
+    unsigned long long largestPortId = 0;
+    /// Which update saw a record last.
+    std::uint32_t lastMark = 0;
+
+    /// Both are for graphs that use one identifier for ports of two kinds.
+    std::unordered_map<unsigned long long, std::uint32_t, SeededHash> innerOwners;
+    std::unordered_map<unsigned long long, std::uint32_t, SeededHash> incomingToOutputs;
+
+private:
+    friend class PatchUpdate;
+
+    /// A connection's membership in a group.
+    struct Member {
+        std::uint32_t* group;
+        std::uint32_t position;
+    };
+
+    void lookAtIds();
+    void groupConnections();
+    std::vector<ConnectionPlace> placesOfConnections() const;
+    void findMembers(std::vector<ConnectionPlace> const& places, std::vector<Member>& members);
+    void addMembers(ConnectionPlace const& place, std::vector<Member>& members);
+    std::uint32_t innerOwner(PortSlot<Port> const& output);
+
+    // The three passes over groups: how large each is, where each begins, and what is in it.
+    static void count(std::vector<Member> const& members);
+    // A group of that size gets its place.
+    void layOut(std::uint32_t& group, std::size_t& end) const;
+    void fill(std::vector<Member> const& members);
+};
+
+}  // namespace tarn::engine::detail
+
+#endif

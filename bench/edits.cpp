@@ -1,0 +1,157 @@
+#include "bench.h"
+#include "graph_documents.h"
+
+#include <Engine/Base/patch_changes.h>
+#include <Engine/Base/patch_edit.h>
+#include <Engine/Base/patch_index.h>
+
+#include <malloc.h>
+
+#include <map>
+#include <memory>
+#include <ostream>
+#include <streambuf>
+#include <string>
+#include <utility>
+#include <vector>
+
+using namespace tarn::engine;
+
+namespace {
+
+constexpr std::size_t kPatches = 100000;
+constexpr std::size_t kMany = 1000000;
+constexpr std::size_t kGroup = 100;
+
+double heapBytes() {
+    struct mallinfo2 const info = mallinfo2();
+    return static_cast<double>(info.uordblks + info.hblkhd);
+}
+
+// The root with another default value of the input of the patch `id`, or of the next one where that
+// is a group.
+Patch edited(PatchIndex const& index, unsigned long long id, double value) {
+    PatchEdit edit(index);
+    Port* const input = edit.inputPort(id * 2);
+    (input != nullptr ? input : edit.inputPort(id * 2 + 2))->defaultValue = value;
+    return edit.commit();
+}
+
+// A document, one that shares nothing with it, and one that differs by an edit deep inside.
+struct Document {
+    Document(std::size_t patches, std::size_t groupSize)
+        : place(patches / 2 + 7),
+          index(bench::documentOf(patches, groupSize)),
+          twin(bench::documentOf(patches, groupSize)),
+          first(index.root()),
+          second(edited(index, place, -1.0)) {
+        index.update(first);
+        bench::agree(patchChanges(first, second).size() == 1, "what an edit changes");
+    }
+
+    unsigned long long place;
+    PatchIndex index;
+    Patch twin;
+    Patch first;
+    Patch second;
+    bool isSecond = false;
+};
+
+// Made when it is first asked for: the large ones take a while.
+Document& document(std::size_t patches, std::size_t groupSize) {
+    static std::map<std::pair<std::size_t, std::size_t>, std::unique_ptr<Document>> made;
+    std::unique_ptr<Document>& found = made[{patches, groupSize}];
+    if (found == nullptr) found = std::make_unique<Document>(patches, groupSize);
+    return *found;
+}
+
+struct NullBuffer : std::streambuf {
+    std::streamsize xsputn(char const*, std::streamsize n) override { return n; }
+    int overflow(int c) override { return c; }
+};
+
+auto edit(Document& d) { return edited(d.index, d.place, 0.25); }
+auto update(Document& d) {
+    d.isSecond = !d.isSecond;
+    d.index.update(d.isSecond ? d.second : d.first);
+    return d.isSecond;
+}
+auto changes(Document& d) { return patchChanges(d.first, d.second); }
+auto build(Document& d) { return PatchIndex(d.first); }
+auto compare(Document& d) { return d.first == d.twin; }
+auto convert(Document& d) { return EvalPatch(d.first); }
+auto text(Document& d) {
+    NullBuffer buffer;
+    std::ostream stream(&buffer);
+    stream << d.first;
+    return stream.good();
+}
+
+template <class Work>
+void measure(std::string const& operation, std::string const& who, std::size_t patches,
+             std::size_t groupSize, Work work) {
+    bench::measure(
+        operation, who, [=] { return &document(patches, groupSize); },
+        [work](Document* d) { return work(*d); });
+}
+
+// Beside building the index, which is what an edit cost before.
+template <class Work>
+void besideAnIndex(std::string const& name, std::size_t groupSize, double atMost, Work work) {
+    std::string const operation =
+        name + ", 100,000 patches " + (groupSize == kPatches ? "in one list" : "in groups");
+    measure(operation, "ours", kPatches, groupSize, work);
+    measure(operation, "building an index", kPatches, groupSize, build);
+    bench::target(operation, atMost, "building an index");
+}
+
+// A document of ten times the size, beside ten times the work on the smaller one.
+template <class Work>
+void ofMany(std::string const& name, Work work) {
+    std::string const operation = name + ", 1,000,000 patches in groups";
+    measure(operation, "ours", kMany, kGroup, work);
+    measure(operation, "ten times 100,000", kPatches, kGroup, [work](Document& d) {
+        for (int i = 0; i < 9; ++i) benchmark::DoNotOptimize(work(d));
+        return work(d);
+    });
+    bench::target(operation, 1.5, "ten times 100,000");
+}
+
+void memory() {
+    for (std::size_t const patches : {kPatches, kMany}) {
+        std::string const operation =
+            "bytes a patch, " + std::to_string(patches) + " patches with two ports";
+        double const before = heapBytes();
+        Patch const root = bench::documentOf(patches, kGroup);
+        bench::record(operation, "ours", (heapBytes() - before) / static_cast<double>(patches));
+    }
+    PatchIndex index(bench::documentOf(kPatches, kGroup));
+    std::vector<Patch> history;
+    history.reserve(1001);
+    double const before = heapBytes();
+    for (unsigned long long step = 0; step < 1000; ++step) {
+        history.push_back(index.root());
+        index.update(edited(index, step * 97 + 7, 0.5));
+    }
+    bench::record("bytes of an undo step, 100,000 patches in groups", "ours",
+                  (heapBytes() - before) / 1000);
+}
+
+}  // namespace
+
+void bench::edits() {
+    for (std::size_t const groupSize : {kGroup, kPatches}) {
+        bool const isFlat = groupSize == kPatches;
+        besideAnIndex("an edit of a port", groupSize, isFlat ? 10.0 : 0.01, edit);
+        besideAnIndex("the update after it", groupSize, isFlat ? 0.1 : 0.02, update);
+        besideAnIndex("what it changed", groupSize, isFlat ? 10.0 : 0.01, changes);
+    }
+    ofMany("build an index", build);
+    ofMany("== unshared", compare);
+    ofMany("convert for evaluation", convert);
+    ofMany("debug text", text);
+    ofMany("an edit of a port", edit);
+    ofMany("the update after it", update);
+    ofMany("what it changed", changes);
+    memory();
+}
