@@ -438,8 +438,8 @@ TEST_F(DocumentRoad, WritesAPageThatNeedsNothingElse) {
                   "dots <span class=\"type\">Positions</span>", "<span>3 in the loop</span>",
                   "Exponential In-Out", "<li>curveTo 20 11.0457, 11.0457 20, 0 20</li>",
                   "motion (patch 2), speed (port 201) {2}", "max=\"119\""}},
-             Row{"small.json --report-frames 1", {"max=\"0\"", "The document draws no path"}},
-             Row{"node_graph.json", {"left out", "The document draws no path"}},
+             Row{"small.json", {"id=\"outputs\"", "aria-valuemax=\"119\""}},
+             Row{"node_graph.json", {"left out"}},
          }) {
         SCOPED_TRACE(row.arguments);
         std::string const file = (folder / "report.html").string();
@@ -457,6 +457,11 @@ TEST_F(DocumentRoad, WritesAPageThatNeedsNothingElse) {
         for (char const* other : {" src=", "url(", "@import", "href=\"http", "{{", "}}\n"}) {
             EXPECT_EQ(page.find(other), std::string::npos) << other;
         }
+        bool const draws =
+            run(kDocuments + row.arguments + " --frames 120 --paths").output.find(": M ") !=
+            std::string::npos;
+        EXPECT_EQ(page.find("id=\"animation\"") != std::string::npos, draws);
+        EXPECT_EQ(page.find("href=\"#animation\"") != std::string::npos, draws);
     }
 }
 
@@ -550,4 +555,59 @@ TEST_F(DocumentRoad, KeepsAPageSmallWhereTheFramesAreNot) {
     EXPECT_LT(std::filesystem::file_size(page), 60000000u);
     EXPECT_NE(contentsOf(page).find(" of 10000 frames: more would be too large."),
               std::string::npos);
+}
+
+TEST_F(DocumentRoad, ComparesTwoDocuments) {
+    std::string const first = write("first.json", document(R"({"id":2,"name":"a"},{"id":3})"));
+    std::string const second = write(
+        "second.json",
+        R"({"framesPerSecond":24,"root":{"id":1,"children":[{"id":2,"name":"b"},{"id":4}]}})");
+    std::string const foreign = write("foreign.json", graph(R"([{"id":5,"type":"x"}])"));
+    std::string const wrong = write("wrong.json", "{");
+    struct Row {
+        char const* what;
+        std::string arguments;
+        int status;
+        std::string output;
+        std::string errors;
+    };
+    for (Row const& row : {
+             Row{"the same", first + " --compare " + first, 0, "", ""},
+             Row{"changed", first + " --compare " + second, 1,
+                 "changed patch 2 \"a\": name \"a\" -> \"b\"\nadded patch 4 to patch 1\nremoved "
+                 "patch 3 from patch 1\nchanged frames per second 60.0 -> 24.0\n",
+                 ""},
+             Row{"the other way round", second + " --compare " + first, 1,
+                 "changed patch 2 \"b\": name \"b\" -> \"a\"\nadded patch 3 to patch 1\nremoved "
+                 "patch 4 from patch 1\nchanged frames per second 24.0 -> 60.0\n",
+                 ""},
+             Row{"a foreign one", foreign + " --compare " + foreign, 0, "", ""},
+             Row{"a wrong one", first + " --compare " + wrong, 2, "",
+                 "document_road: " + wrong + ": line 1, column 2: the JSON ends too early\n"},
+             Row{"a wrong first one", wrong + " --compare " + first, 2, "",
+                 "document_road: " + wrong + ": line 1, column 2: the JSON ends too early\n"},
+             Row{"none", first + " --compare " + first + "x", 2, "",
+                 "document_road: " + first + "x: there is no such file\n"},
+             Row{"a page over it", first + " --compare " + second + " --report " + second, 2, "",
+                 "document_road: " + second + " is the document itself\n"},
+         }) {
+        SCOPED_TRACE(row.what);
+        Outcome const outcome = run(row.arguments);
+        EXPECT_EQ(outcome.status, row.status);
+        EXPECT_EQ(outcome.output, row.output);
+        EXPECT_EQ(outcome.errors, row.errors);
+    }
+    EXPECT_EQ(
+        run(first + " --compare " + second + " --report " + (folder / "page.html").string()).status,
+        1);
+    std::string const page = contentsOf(folder / "page.html");
+    for (char const* part :
+         {"<g class=\"patch changed\"", "<g class=\"patch added\"", "<g class=\"patch removed\"",
+          "<a href=\"#patch-3\">patch 3 from patch 1</a>", "id=\"patch-3\"", "id=\"changes\""}) {
+        EXPECT_NE(page.find(part), std::string::npos) << part;
+    }
+    // There is nothing to play, nothing to plot, and no attribute.
+    for (char const* part : {"id=\"animation\"", "id=\"outputs\"", "id=\"attributes\"", "{{"}) {
+        EXPECT_EQ(page.find(part), std::string::npos) << part;
+    }
 }

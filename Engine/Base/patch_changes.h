@@ -15,21 +15,28 @@
 namespace tarn::engine {
 
 /// What may differ in a port that is in both documents.
-enum class PortField : unsigned char { Tag, Name, TypeInfo, DefaultValue, Attributes };
+enum class PortField : unsigned char {
+    Tag = 0,
+    Name = 1,
+    TypeInfo = 2,
+    DefaultValue = 3,
+    Attributes = 4,
+};
 
 /// What may differ in a patch that is in both documents, beside its ports and connections. The
 /// orders are those of what is in both: of the ports, the connections, the children.
 enum class PatchField : unsigned char {
-    Id,  // Of the root alone: all others are known by it.
-    Builtin,
-    Descriptor,
-    ModelLayer,
-    Name,
-    Attributes,
-    InputOrder,
-    OutputOrder,
-    ConnectionOrder,
-    ChildOrder,
+    /// Of the root alone: all others are known by it.
+    Id = 0,
+    Builtin = 1,
+    Descriptor = 2,
+    ModelLayer = 3,
+    Name = 4,
+    Attributes = 5,
+    InputOrder = 6,
+    OutputOrder = 7,
+    ConnectionOrder = 8,
+    ChildOrder = 9,
 };
 
 /// An input or an output that was added to a patch, removed from it or changed.
@@ -37,6 +44,7 @@ struct PortChange {
     /// An added one is null before, a removed one after.
     Port const* before = nullptr;
     Port const* after = nullptr;
+    /// Otherwise it is an output.
     bool isInput = false;
     /// What differs, where the port is in both; in the order of the enumerators.
     std::vector<PortField> fields = {};
@@ -49,8 +57,9 @@ struct PortChange {
 struct PatchChange {
     /// A patch that is in one document only; one that has another parent; one that differs in what
     /// is its own. A patch may be moved and changed.
-    enum class Kind : unsigned char { Added, Removed, Moved, Changed };
+    enum class Kind : unsigned char { Added = 0, Removed = 1, Moved = 2, Changed = 3 };
 
+    /// What happened, and the identifier of the patch: of a root that has another one, the former.
     Kind kind = Kind::Changed;
     unsigned long long id = 0;
     /// The patch; null before for an added one, null after for a removed one.

@@ -1,9 +1,10 @@
 // Engine/Base/patch_edit.h: changes to a document, made at once.
 //
+//     PatchIndex index(root);
 //     PatchEdit edit(index);
 //     if (Port* port = edit.inputPort(31)) port->defaultValue = 0.75;
 //     edit.connect({2, 21, 3, 31});
-//     Patch const root = edit.commit();  // The former root is as it was.
+//     Patch const next = edit.commit();  // `root` is as it was.
 
 #ifndef TARN_ENGINE_BASE_PATCH_EDIT_H
 #define TARN_ENGINE_BASE_PATCH_EDIT_H

@@ -28,13 +28,14 @@ struct Anchor {
     Type type;
 };
 
-std::string wire(Connection const& connection, Anchor const& from, Anchor const& to) {
+std::string wire(Connection const& connection, Anchor const& from, Anchor const& to,
+                 std::string const& mark) {
     double const bend = std::clamp(std::abs(to.x - from.x) / 2.0, 30.0, 160.0);
     Path const path = PathBuilder()
                           .moveTo({from.x, from.y})
                           .curveTo({from.x + bend, from.y}, {to.x - bend, to.y}, {to.x, to.y})
                           .build();
-    return "<path class=\"t-" + typeToString(from.type) + "\" data-from=\"" +
+    return "<path class=\"t-" + typeToString(from.type) + mark + "\" data-from=\"" +
            std::to_string(connection.fromPortId) + "\" data-to=\"" +
            std::to_string(connection.toPortId) + "\" d=\"" + pathData(path) + "\"/>\n";
 }
@@ -117,7 +118,19 @@ std::vector<std::string> Drawing::describe(Patch const& patch) const {
         parts.push_back("a group of " + std::to_string(patch.children->size()));
     }
     addAttributes(parts, patch.attributes);
+    if (marks != nullptr) {
+        auto const words = marks->words.find(patch.id);
+        if (words != marks->words.end()) {
+            parts.insert(parts.end(), words->second.begin(), words->second.end());
+        }
+    }
     return parts;
+}
+
+std::string Drawing::markOf(Patch const& patch) const {
+    if (marks == nullptr) return "";
+    auto const kind = marks->kinds.find(patch.id);
+    return kind == marks->kinds.end() ? "" : kind->second;
 }
 
 std::string Drawing::port(Port const& port, bool isInput, double width, double y) const {
@@ -141,11 +154,13 @@ std::string Drawing::box(Box const& box) const {
     Patch const& patch = *box.patch;
     bool const isGroup = !patch.children->empty();
     std::ostringstream text;
-    text << "<g class=\"patch\" transform=\"translate(" << number(box.x) << " " << number(box.y)
-         << ")\"><rect class=\"body\" width=\"" << number(box.width) << "\" height=\""
-         << number(box.height) << "\" rx=\"6\"/>"
+    std::string const mark = markOf(patch);
+    text << "<g class=\"patch" << (mark.empty() ? "" : " " + mark) << "\" transform=\"translate("
+         << number(box.x) << " " << number(box.y) << ")\"><rect class=\"body\" width=\""
+         << number(box.width) << "\" height=\"" << number(box.height) << "\" rx=\"6\"/>"
          << "<g class=\"heading\" tabindex=\"-1\" data-parts=\"" << partsText(describe(patch))
          << "\"";
+    if (!mark.empty()) text << " id=\"patch-" << patch.id << "\"";
     if (isGroup) {
         text << " role=\"button\" aria-expanded=\"false\" data-level=\"level-" << patch.id << "\"";
     } else {
@@ -154,6 +169,7 @@ std::string Drawing::box(Box const& box) const {
     text << "><rect class=\"bar\" width=\"" << number(box.width) << "\" height=\""
          << number(kHeadingHeight) << "\" rx=\"6\"/><text x=\"" << number(kTextIndent)
          << "\" y=\"17\">" << escaped(headingOf(patch)) << "</text>";
+    if (!mark.empty()) text << "<text x=\"4\" y=\"17\">" << signOfChange(mark) << "</text>";
     if (isGroup) {
         text << "<text class=\"fold end\" x=\"" << number(box.width - kTextIndent)
              << "\" y=\"17\">+</text>";
@@ -185,11 +201,21 @@ std::string Drawing::graph(Level const& level, std::string const& attributes) co
             inputs[port.id] = {drawn.x, drawn.y + rowMiddle(row++), port.typeInfo.type};
         }
     }
-    for (Connection const& connection : *level.group->connections) {
+    auto const addWire = [&](Connection const& connection, std::string const& mark) {
         auto const from = outputs.find(connection.fromPortId);
         auto const to = inputs.find(connection.toPortId);
         if (from != outputs.end() && to != inputs.end()) {
-            text << wire(connection, from->second, to->second);
+            text << wire(connection, from->second, to->second, mark);
+        }
+    };
+    for (Connection const& connection : *level.group->connections) {
+        bool const isAdded = marks != nullptr && marks->added.count(connection) != 0;
+        addWire(connection, isAdded ? " added" : "");
+    }
+    if (marks != nullptr) {
+        auto const removed = marks->removed.find(level.group->id);
+        if (removed != marks->removed.end()) {
+            for (Connection const& connection : removed->second) addWire(connection, " removed");
         }
     }
     text << "</g>\n";

@@ -8,6 +8,7 @@
 
 #include "document.h"
 #include "layout.h"
+#include "marks.h"
 #include "scene.h"
 
 #include <Engine/Base/patch_index.h>
@@ -35,7 +36,9 @@ std::string colorText(tarn::engine::FloatVec4 color);
 
 class Drawing {
 public:
-    explicit Drawing(tarn::engine::Patch const& root) : index(root) {}
+    // Marks the changes, where there are any; they have to outlive the drawing.
+    explicit Drawing(tarn::engine::Patch const& root, Marks const* changes = nullptr)
+        : index(root), marks(changes) {}
 
     // One level: boxes with their ports, and the connections between them. `attributes` go into the
     // opening tag.
@@ -49,8 +52,11 @@ private:
     std::string box(Box const& box) const;
     std::string port(tarn::engine::Port const& port, bool isInput, double width, double y) const;
     std::string portName(unsigned long long patchId, unsigned long long portId) const;
+    // "changed", or empty.
+    std::string markOf(tarn::engine::Patch const& patch) const;
 
     tarn::engine::PatchIndex index;
+    Marks const* marks;
 };
 
 // The outlines as `path` elements.

@@ -25,6 +25,7 @@ using namespace tarn::engine;
 namespace {
 
 constexpr int kBadInput = 2;
+constexpr int kDiffers = 1;
 
 // A line on standard error that is written over, and only where people watch and wait.
 class Progress {
@@ -81,6 +82,39 @@ std::string quoted(std::string const& text) {
     return result + "'";
 }
 
+// As `diff` ends: 0 for the same, 1 for changes, 2 for trouble.
+int compare(std::string const& file, std::string const& other, std::string const& report,
+            long long reportFrames) {
+    std::string const* current = &file;
+    try {
+        Document const before = openDocument(file);
+        current = &other;
+        Document const after = openDocument(other);
+        Marks const marks = marksOf(before.root, after.root);
+        if (!report.empty()) {
+            for (std::string const& input : {file, other}) refuseToReplace(input, report);
+            std::filesystem::path const fileName = std::filesystem::path(other).filename();
+            writeFile(report, pageText(after, fileName.string(), reportFrames, &marks));
+        }
+        std::string text = to_string(marks.changes);
+        double const rates[] = {before.info.framesPerSecond, after.info.framesPerSecond};
+        if (rates[0] != rates[1]) {
+            text += "changed frames per second " + Unstructured(rates[0]).toText() + " -> " +
+                    Unstructured(rates[1]).toText() + "\n";
+        }
+        std::cout << text << std::flush;
+        if (!std::cout) throw std::runtime_error("the output cannot be written");
+        return text.empty() ? 0 : kDiffers;
+    } catch (InputError const& error) {
+        std::cerr << "document_road: " << printable(*current) << ": " << error.what() << "\n";
+    } catch (std::runtime_error const& error) {
+        std::cerr << "document_road: " << error.what() << "\n";
+    } catch (std::bad_alloc const&) {
+        std::cerr << "document_road: " << printable(*current) << ": not enough memory\n";
+    }
+    return kBadInput;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -95,6 +129,7 @@ int main(int argc, char** argv) {
     std::string report;
     std::string picture;
     std::string copy;
+    std::string other;
     std::optional<unsigned long long> patchId;
     std::optional<unsigned long long> portId;
     app.add_option("FILE", file, "The document")->required();
@@ -126,12 +161,17 @@ int main(int argc, char** argv) {
     app.add_option("--write", copy,
                    "Save what was read, in the form of documents; may be FILE itself")
         ->type_name("JSON");
+    app.add_option("--compare", other,
+                   "Print what is changed in the document FILE2, a line each, and nothing else; "
+                   "ends with 1 where they differ. The page marks the changes")
+        ->type_name("FILE2");
     try {
         app.parse(argc, argv);
     } catch (CLI::ParseError const& error) {
         return app.exit(error) == 0 ? 0 : kBadInput;
     }
 
+    if (!other.empty()) return compare(file, other, report, reportFrames);
     try {
         Document const document = openDocument(file);
         std::string const changes = document.info.summary();

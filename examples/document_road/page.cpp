@@ -276,11 +276,20 @@ std::string rootPortsText(Drawing const& drawing, Patch const& root) {
            "</summary><ul class=\"ports\">\n" + items + "</ul></details>\n";
 }
 
-std::string levelsText(Document const& document) {
-    std::vector<Level> const levels = layOut(document.root);
+// The plots of outputs that stay as they are show nothing.
+bool isConstant(Plot const& plot) {
+    auto const isFlat = [](Line const& line) {
+        return std::adjacent_find(line.values.begin(), line.values.end(), std::not_equal_to<>()) ==
+               line.values.end();
+    };
+    return plot.changes.empty() && std::all_of(plot.lines.begin(), plot.lines.end(), isFlat);
+}
+
+std::string levelsText(Patch const& root, Marks const* marks) {
+    std::vector<Level> const levels = layOut(root);
     std::unordered_map<Patch const*, Level const*> levelOf;
     for (Level const& level : levels) levelOf.emplace(level.group, &level);
-    Drawing const drawing(document.root);
+    Drawing const drawing(root, marks);
     std::ostringstream text;
     // A level's figure holds those of the groups in it: closing it closes them.
     std::function<void(Level const&, int)> const write = [&](Level const& level, int depth) {
@@ -458,8 +467,29 @@ std::string attributesText(Document const& document) {
     };
     write(document.root);
     std::string const list = text.str();
-    return list.empty() ? "<p>The document has no attributes.</p>\n"
-                        : "<ul class=\"tree\">\n" + list + "</ul>\n";
+    return list.empty() ? "" : "<ul class=\"tree\">\n" + list + "</ul>\n";
+}
+
+std::string changesText(Marks const* marks, std::string const& levels) {
+    constexpr std::size_t kMostChanges = 2000;
+    if (marks == nullptr) return "";
+    if (marks->changes.empty()) return "<p>The documents are the same.</p>\n";
+    std::string text = "<ul tabindex=\"0\" aria-label=\"Changes\">\n";
+    for (std::size_t i = 0; i < std::min(marks->changes.size(), kMostChanges); ++i) {
+        PatchChange const& change = marks->changes[i];
+        std::string const kind = kindOfChange(change.kind);
+        std::string const line = to_string(change).substr(kind.size() + 1);
+        std::string const id = "patch-" + std::to_string(change.id);
+        bool const isDrawn = levels.find("id=\"" + id + "\"") != std::string::npos;
+        text += "<li><span class=\"mark\">" + signOfChange(kind) + " " + kind + "</span> " +
+                (isDrawn ? "<a href=\"#" + id + "\">" + escaped(line) + "</a>" : escaped(line)) +
+                "</li>\n";
+    }
+    text += "</ul>\n";
+    if (marks->changes.size() > kMostChanges) {
+        text += "<p>" + std::to_string(marks->changes.size() - kMostChanges) + " more.</p>\n";
+    }
+    return text;
 }
 
 std::string paragraphs(std::string const& lines) {
@@ -490,7 +520,8 @@ std::string dataText(Film const& film, Document const& document) {
     return text;
 }
 
-// The template with its {{NAMES}} filled in.
+// The template with its {{NAMES}} filled in; what is from {{#NAME}} to {{/NAME}} stays where that
+// part is not empty.
 std::string filled(std::string const& page, std::map<std::string, std::string> const& parts) {
     std::string text;
     std::size_t done = 0;
@@ -498,23 +529,35 @@ std::string filled(std::string const& page, std::map<std::string, std::string> c
          open = page.find("{{", done)) {
         std::size_t const close = page.find("}}", open);
         text += page.substr(done, open - done);
-        text += parts.at(page.substr(open + 2, close - open - 2));
+        std::string const name = page.substr(open + 2, close - open - 2);
         done = close + 2;
+        if (name[0] == '#' && parts.at(name.substr(1)).empty()) {
+            std::string const end = "{{/" + name.substr(1) + "}}";
+            done = page.find(end, done) + end.size();
+        } else if (name[0] != '#' && name[0] != '/') {
+            text += parts.at(name);
+        }
     }
     return text + page.substr(done);
 }
 
 }  // namespace
 
-std::string pageText(Document const& document, std::string const& fileName, long long frames) {
+std::string pageText(Document const& document, std::string const& fileName, long long frames,
+                     Marks const* marks) {
     Film const film = filmOf(document, frames);
     auto const shown = static_cast<long long>(film.frames.size());
     std::ostringstream plots;
+    std::size_t constant = 0;
     for (std::size_t i = 0; i < film.plots.size(); ++i) {
         Plot const& plot = film.plots[i];
-        plots << plotText(plot, i, shown, film.texts.at(plot.texts.front()));
+        if (isConstant(plot)) {
+            ++constant;
+        } else {
+            plots << plotText(plot, i, shown, film.texts.at(plot.texts.front()));
+        }
     }
-    if (film.plots.empty()) plots << "<p>The document has no outputs.</p>\n";
+    std::string const levels = levelsText(marks != nullptr ? marks->shown : document.root, marks);
     std::string const name = escaped(printable(fileName));
     return filled(
         page_files::kPageHtml,
@@ -524,18 +567,21 @@ std::string pageText(Document const& document, std::string const& fileName, long
          {"GRAPH_CSS", page_files::kGraphCss},
          {"CSS", page_files::kPageCss},
          {"SCRIPT", page_files::kPageJs},
-         {"DRAWN", film.bounds.isEmpty ? " hidden" : ""},
-         {"NOT_DRAWN", film.bounds.isEmpty ? "" : " hidden"},
+         {"CHANGES", changesText(marks, levels)},
          {"VIEW", stageText(film)},
-         {"SCENE", scenePaths(film.first)},
+         {"SCENE", film.bounds.isEmpty ? "" : scenePaths(film.first) + "\n"},
          {"LAST_FRAME", std::to_string(shown - 1)},
          {"CUT_SHORT", shown == frames ? std::string()
                                        : "<p>The page keeps the first " + std::to_string(shown) +
                                              " of " + std::to_string(frames) +
                                              " frames: more would be too large.</p>\n"},
          {"LEGEND", legendText(document)},
-         {"LEVELS", levelsText(document)},
+         {"LEVELS", levels},
          {"PLOTS", plots.str()},
+         {"CONSTANT", constant == 0 ? ""
+                                    : "<p>Not shown: " + counted(constant, "output", "outputs") +
+                                          (constant == 1 ? " that never changes.</p>\n"
+                                                         : " that never change.</p>\n")},
          {"CURVES", curvesText()},
          {"SHAPES", shapesText()},
          {"ATTRIBUTES", attributesText(document)},

@@ -7,10 +7,13 @@
 #define DOCUMENT_ROAD_PAGE_H
 
 #include "document.h"
+#include "marks.h"
 
 #include <string>
 
-// `fileName` is shown as the heading; `frames` are evaluated and played.
-std::string pageText(Document const& document, std::string const& fileName, long long frames);
+// `fileName` is shown as the heading; `frames` are evaluated and played. Where there are `marks`,
+// the changes are listed and marked in the graph.
+std::string pageText(Document const& document, std::string const& fileName, long long frames,
+                     Marks const* marks = nullptr);
 
 #endif

@@ -39,7 +39,7 @@ for header in "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h; do
         printf '#include <%s>\n#include <Engine/Base/assertion.h>\n' "$name"
         printf '#include <Engine/Base/patch.h>\n#include <Engine/Base/path.h>\n#include <iostream>\n'
         printf 'using namespace tarn::engine;\nvoid follow(Connection const&);\nvoid use(Type);\nbool hasValue();\n'
-        printf 'extern Patch root;\nextern unsigned long long portId;\nextern std::string text;\n'
+        printf 'extern Patch root;\nextern Patch before;\nextern Patch after;\nextern unsigned long long portId;\nextern std::string text;\n'
         use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
         [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
         case $use in

@@ -44,11 +44,13 @@ function showHandles(group, d) {
 // Animation
 
 const drawn = byId("drawn");
-const slider = byId("frame");
-const play = byId("play");
+// Where nothing is drawn there is no player; plots keep the frame all the same.
+const slider = byId("frame") ?? document.createElement("input");
+const play = byId("play") ?? document.createElement("button");
 const charts = [...document.querySelectorAll(".chart")];
 
 function showScene() {
+    if (!drawn) return;
     const items = data.frames[frame];
     while (drawn.children.length < items.length) drawn.append(svgElement("path", {}));
     [...drawn.children].forEach((path, i) => {
@@ -86,7 +88,7 @@ function showFrame(next) {
     const time = `${frame}, ${(frame / data.framesPerSecond).toFixed(2)} s`;
     slider.value = frame;
     slider.setAttribute("aria-valuetext", time);
-    byId("time").textContent = time;
+    if (drawn) byId("time").textContent = time;
     showScene();
     for (const chart of charts) {
         chart.setAttribute("aria-valuenow", frame);
@@ -123,8 +125,8 @@ slider.addEventListener("input", () => {
     setPlaying(false);
     showFrame(Number(slider.value));
 });
-byId("show-points").addEventListener("change", showScene);
-byId("animation").addEventListener("keydown", (event) => {
+byId("show-points")?.addEventListener("change", showScene);
+byId("animation")?.addEventListener("keydown", (event) => {
     if (event.target === slider && event.key === " ") {
         event.preventDefault();
         setPlaying(!playing);
@@ -256,6 +258,19 @@ for (const button of document.querySelectorAll(".zoom")) {
         const scale = graph.width.baseVal.value / view.width * Number(button.dataset.factor);
         graph.setAttribute("width", view.width * Math.min(Math.max(scale, 0.1), 3));
         graph.setAttribute("height", view.height * Math.min(Math.max(scale, 0.1), 3));
+    });
+}
+
+// Changes: each leads to its patch, and opens the groups that it is in.
+
+for (const link of document.querySelectorAll("#changes a")) {
+    link.addEventListener("click", (event) => {
+        event.preventDefault();
+        const heading = byId(link.hash.slice(1));
+        for (let level = heading.closest(".level"); level; level = level.parentElement.closest(".level")) {
+            if (level.hidden) setOpen(document.querySelector(`[data-level="${level.id}"]`), true);
+        }
+        heading.focus();
     });
 }
 

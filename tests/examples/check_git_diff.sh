@@ -1,0 +1,35 @@
+#!/bin/sh
+# Lets git compare versions of a document by tools/git/diff_documents.
+#
+#     check_git_diff.sh SOURCE_DIR DOCUMENT_ROAD
+set -eu
+
+root=$1
+export DOCUMENT_ROAD=$2
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+cd "$work"
+export HOME="$work" GIT_CONFIG_NOSYSTEM=1
+git init --quiet .
+git config user.name tester
+git config user.email tester@localhost
+git config diff.patches.command "$root/tools/git/diff_documents"
+echo '*.json diff=patches' > .git/info/attributes
+echo '{"root": {"id": 1, "name": "first"}}' > a.json
+echo '{"root": {"id": 1}}' > gone.json
+git add .
+git commit --quiet --message "Add documents"
+echo '{"root": {"id": 1, "name": "second"}}' > a.json
+echo '{"root": {"id": 1}}' > new.json
+git rm --quiet gone.json
+git add new.json
+cat > expected <<'END'
+a.json:
+changed patch 1 "first": name "first" -> "second"
+gone.json:
+removed the document
+new.json:
+added the document
+END
+git diff --no-renames HEAD > actual
+diff expected actual
