@@ -1,12 +1,15 @@
-// Random trees with identifiers that occur many times: walks beside a model and an index; text,
-// equality and conversion.
+// Random trees with identifiers that occur many times: walks beside a model and an index, edits,
+// updates and changes; text, equality and conversion.
 
 #include "fuzz.h"
 
 #include "support/graph_model.h"
 
+#include <Engine/Base/patch_changes.h>
+#include <Engine/Base/patch_edit.h>
 #include <Engine/Base/patch_index.h>
 
+#include <algorithm>
 #include <sstream>
 
 using namespace fuzz;
@@ -107,6 +110,46 @@ void checkEvaluation(EvalPatchIndex const& index, unsigned long long id) {
           "a parent of the evaluation form");
 }
 
+// Whatever is asked of it, the document stays what it is.
+Patch edited(Input& input, PatchIndex const& index) {
+    Patch const before = index.root();
+    PatchEdit edit(index);
+    for (std::size_t n = input.below(8); n > 0; --n) {
+        unsigned long long const id = input.below(14);
+        unsigned long long const other = input.below(14);
+        switch (input.below(9)) {
+            case 0: {
+                Patch* const patch = edit.patch(id);
+                if (patch != nullptr) patch->builtin = other;
+                break;
+            }
+            case 1: {
+                Port* const port = edit.inputPort(id);
+                if (port != nullptr) port->tag = other;
+                break;
+            }
+            case 2: edit.addInputPort(id, tests::port(other), input.below(3)); break;
+            case 3: edit.removeOutputPort(id); break;
+            case 4: edit.addPatch(id, tests::randomPatch(input, 1), input.below(3)); break;
+            case 5: edit.removePatch(id); break;
+            case 6: edit.movePatch(id, other, input.below(3)); break;
+            case 7: edit.connect({id, input.below(12), other, input.below(12)}); break;
+            default: edit.disconnect({input.below(4), id, input.below(4), other});
+        }
+    }
+    Patch after = edit.commit();
+    check(index.root() == before, "an edited document");
+    return after;
+}
+
+void checkChanges(Patch const& before, Patch const& after) {
+    std::vector<PatchChange> const changes = patchChanges(before, after);
+    check(changes.empty() == (before == after), "changes");
+    std::string const text = to_string(changes);
+    check(static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n')) == changes.size(),
+          "a line for each change");
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
@@ -134,6 +177,14 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     for (unsigned long long id = 0; id < 14; ++id) {
         checkQueries(index, id);
         checkEvaluation(evaluatedIndex, id);
+    }
+
+    Patch const next = edited(input, index);
+    PatchIndex updated(root);
+    for (Patch const& state : {next, other, edited(input, PatchIndex(other)), root}) {
+        checkChanges(updated.root(), state);
+        updated.update(state);
+        for (unsigned long long id = 0; id < 14; ++id) checkQueries(updated, id);
     }
     return 0;
 }
