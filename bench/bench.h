@@ -65,6 +65,13 @@ void measureOn(std::string const& operation, std::string const& who, Input const
         operation, who, [&input] { return &input; }, [work](Input const* in) { return work(*in); });
 }
 
+/// Whether the operation is one of those that were asked for.
+bool isWanted(std::string const& operation);
+
+/// Microseconds that the operation ("read", "parse", "write" or "dump") takes on the document in
+/// that file. For a process that does nothing else.
+double documentOperation(std::string const& operation, std::string const& file);
+
 /// A figure that is no time, such as bytes, shown beside the others.
 void record(std::string operation, std::string who, double figure);
 

@@ -121,20 +121,22 @@ void memory() {
     for (std::size_t const patches : {kPatches, kMany}) {
         std::string const operation =
             "bytes a patch, " + std::to_string(patches) + " patches with two ports";
+        if (!bench::isWanted(operation)) continue;
         double const before = heapBytes();
         Patch const root = bench::documentOf(patches, kGroup);
         bench::record(operation, "ours", (heapBytes() - before) / static_cast<double>(patches));
     }
+    std::string const step = "bytes of an undo step, 100,000 patches in groups";
+    if (!bench::isWanted(step)) return;
     PatchIndex index(bench::documentOf(kPatches, kGroup));
     std::vector<Patch> history;
     history.reserve(1001);
     double const before = heapBytes();
-    for (unsigned long long step = 0; step < 1000; ++step) {
+    for (unsigned long long i = 0; i < 1000; ++i) {
         history.push_back(index.root());
-        index.update(edited(index, step * 97 + 7, 0.5));
+        index.update(edited(index, i * 97 + 7, 0.5));
     }
-    bench::record("bytes of an undo step, 100,000 patches in groups", "ours",
-                  (heapBytes() - before) / 1000);
+    bench::record(step, "ours", (heapBytes() - before) / 1000);
 }
 
 }  // namespace

@@ -10,6 +10,9 @@
 #include <atomic>
 #include <cstdio>
 #include <map>
+#include <regex>
+#include <string_view>
+#include <string>
 #include <thread>
 #include <vector>
 
@@ -20,6 +23,11 @@ namespace {
 std::vector<Target>& targets() {
     static std::vector<Target> list;
     return list;
+}
+
+std::string& filter() {
+    static std::string pattern;
+    return pattern;
 }
 
 // By operation, then by who did it: the time of each repetition.
@@ -111,6 +119,10 @@ void target(std::string operation, double atMost, std::string against) {
     targets().push_back({std::move(operation), atMost, std::move(against)});
 }
 
+bool isWanted(std::string const& operation) {
+    return std::regex_search(operation, std::regex(filter()));
+}
+
 void announce(std::string const& operation) { operationNamed(operation); }
 
 void record(std::string operation, std::string who, double figure) {
@@ -130,6 +142,20 @@ int main(int argc, char** argv) {
     std::thread second([&done] {
         while (!done) std::this_thread::sleep_for(std::chrono::milliseconds(50));
     });
+
+    if (argc == 4 && std::string_view(argv[1]) == "--apart") {
+        std::printf("%.1f\n", bench::documentOperation(argv[2], argv[3]));
+        done = true;
+        second.join();
+        return 0;
+    }
+    constexpr std::string_view kFilter = "--benchmark_filter=";
+    for (int i = 1; i < argc; ++i) {
+        std::string_view const argument = argv[i];
+        if (argument.substr(0, kFilter.size()) == kFilter) {
+            bench::filter() = argument.substr(kFilter.size());
+        }
+    }
 
     std::vector<char*> arguments(argv, argv + argc);
     char interleave[] = "--benchmark_enable_random_interleaving=true";
