@@ -11,8 +11,8 @@
 #include <cstdio>
 #include <map>
 #include <regex>
-#include <string_view>
 #include <string>
+#include <string_view>
 #include <thread>
 #include <vector>
 
@@ -98,7 +98,7 @@ void printOperation(Operation const& operation) {
     double const own = median(ours->second);
     std::printf("| %s | %.4g (%.4g) | %s | ", operation.name.c_str(), own, minimum(ours->second),
                 peers.c_str());
-    if (best > 0.0) std::printf("%.2f", own / best);
+    if (best > 0.0) std::printf("%.3g", own / best);
     std::printf(" | ");
     char const* separator = "";
     for (Target const& t : targets()) {
@@ -106,7 +106,7 @@ void printOperation(Operation const& operation) {
         bool const named = operation.times.count(t.against) != 0;
         double const reference = named ? median(operation.times.at(t.against)) : best;
         double const ratio = own / reference;
-        std::printf("%s%.2f of %s, at most %.4g%s", separator, ratio, t.against.c_str(), t.atMost,
+        std::printf("%s%.3g of %s, at most %.4g%s", separator, ratio, t.against.c_str(), t.atMost,
                     ratio <= t.atMost ? "" : " (missed)");
         separator = "; ";
     }

@@ -72,19 +72,20 @@ public:
     std::vector<PatchChange> run(Patch const& before, Patch const& after) {
         pairs.push_back({&before, &after, nullptr, nullptr});
         comparePairs();
-        if (!onlyAfter.empty() && !onlyBefore.empty()) findPlacesBefore();
-        std::reverse(onlyAfter.begin(), onlyAfter.end());
+        isMoving = true;
+        // What is only in one of the two was moved, as a rule with all that is in it: then nothing
+        // in there is looked at.
+        std::vector<Place> rest;
+        for (std::size_t i = 0; i < onlyAfter.size(); ++i) {
+            Place const place = onlyAfter[i];
+            if (!findMoved(place, false)) rest.push_back(place);
+        }
+        onlyAfter.assign(rest.rbegin(), rest.rend());
         while (!onlyAfter.empty()) {
             Place const place = onlyAfter.back();
             onlyAfter.pop_back();
             std::size_t const waiting = onlyAfter.size();
-            if (Place const* const former = takePlaceBefore(place.patch->id)) {
-                isMoving = true;
-                changes.push_back({PatchChange::Kind::Moved, place.patch->id, former->patch,
-                                   place.patch, former->parent, place.parent});
-                pairs.push_back({former->patch, place.patch, former->parent, place.parent});
-                comparePairs();
-            } else {
+            if (!findMoved(place, true)) {
                 changes.push_back({PatchChange::Kind::Added, place.patch->id, nullptr, place.patch,
                                    nullptr, place.parent});
                 for (Patch const& child : childrenOf(*place.patch)) {
@@ -234,32 +235,52 @@ private:
         return !isInOrder(positions);
     }
 
-    // Whatever is inside of what is in the former document only may have been moved.
-    void findPlacesBefore() {
+    using Places = std::unordered_map<unsigned long long, std::vector<Place>, SeededHash>;
+
+    // Whether the patch was elsewhere before; then both are compared. Looks for it among what has
+    // lost its place, and where `isDeep` inside of that too.
+    bool findMoved(Place const& place, bool isDeep) {
+        for (; knownRoots < onlyBefore.size(); ++knownRoots) {
+            rootsBefore[onlyBefore[knownRoots].patch->id].push_back(onlyBefore[knownRoots]);
+        }
+        Place former = takeFrom(rootsBefore, place.patch->id);
+        if (former.patch == nullptr && isDeep) {
+            if (!hasPlacesInside) findPlacesInside();
+            former = takeFrom(placesInside, place.patch->id);
+        }
+        if (former.patch == nullptr) return false;
+        changes.push_back({PatchChange::Kind::Moved, place.patch->id, former.patch, place.patch,
+                           former.parent, place.parent});
+        pairs.push_back({former.patch, place.patch, former.parent, place.parent});
+        comparePairs();
+        return true;
+    }
+
+    void findPlacesInside() {
+        hasPlacesInside = true;
         std::vector<Place> pending(onlyBefore.rbegin(), onlyBefore.rend());
         while (!pending.empty()) {
             Place const place = pending.back();
             pending.pop_back();
-            placesBefore[place.patch->id].push_back(place);
+            if (taken.count(place.patch) != 0) continue;
+            placesInside[place.patch->id].push_back(place);
             std::vector<Patch> const& children = childrenOf(*place.patch);
             for (auto child = children.rbegin(); child != children.rend(); ++child) {
                 pending.push_back({&*child, place.patch});
             }
         }
-        for (auto& entry : placesBefore) std::reverse(entry.second.begin(), entry.second.end());
+        for (auto& entry : placesInside) std::reverse(entry.second.begin(), entry.second.end());
     }
 
-    // The next place of that identifier that nothing was found for, or null.
-    Place const* takePlaceBefore(unsigned long long id) {
-        auto const known = placesBefore.find(id);
-        if (known == placesBefore.end()) return nullptr;
-        std::vector<Place>& places = known->second;
-        while (!places.empty()) {
-            lastTaken = places.back();
-            places.pop_back();
-            if (taken.count(lastTaken.patch) == 0) return &lastTaken;
+    // A place of that identifier that nothing was found for, or none.
+    Place takeFrom(Places& places, unsigned long long id) const {
+        auto const known = places.find(id);
+        while (known != places.end() && !known->second.empty()) {
+            Place const place = known->second.back();
+            known->second.pop_back();
+            if (taken.count(place.patch) == 0) return place;
         }
-        return nullptr;
+        return {nullptr, nullptr};
     }
 
     void reportRemoved() {
@@ -281,8 +302,10 @@ private:
     std::vector<Pair> pairs;  // To be compared.
     std::vector<Place> onlyBefore;
     std::vector<Place> onlyAfter;
-    std::unordered_map<unsigned long long, std::vector<Place>, SeededHash> placesBefore;
-    Place lastTaken{nullptr, nullptr};
+    Places rootsBefore;  // Of the first `knownRoots` of `onlyBefore`.
+    std::size_t knownRoots = 0;
+    Places placesInside;
+    bool hasPlacesInside = false;
     bool isMoving = false;
     std::unordered_set<Patch const*> taken;
 };
@@ -290,6 +313,7 @@ private:
 // The text.
 
 constexpr std::size_t kLongestText = 60;
+constexpr std::size_t kMostConnections = 20;
 
 std::string shown(std::string const& text) { return Unstructured(text).toText(kLongestText); }
 
@@ -439,8 +463,16 @@ std::string differences(PatchChange const& change) {
     };
     for (PatchField const field : change.fields) add(shown(field, *change.before, *change.after));
     for (PortChange const& port : change.ports) add(shown(port));
-    for (Connection const& c : change.connectionsRemoved) add("disconnected " + shown(c));
-    for (Connection const& c : change.connectionsAdded) add("connected " + shown(c));
+    auto const addAll = [&](char const* what, std::vector<Connection> const& connections) {
+        for (std::size_t i = 0; i < std::min(connections.size(), kMostConnections); ++i) {
+            add(what + shown(connections[i]));
+        }
+        if (connections.size() > kMostConnections) {
+            add(what + std::to_string(connections.size() - kMostConnections) + " more");
+        }
+    };
+    addAll("disconnected ", change.connectionsRemoved);
+    addAll("connected ", change.connectionsAdded);
     return text;
 }
 

@@ -78,18 +78,20 @@ struct PatchChange {
 };
 
 /// What differs, as changes from `before` to `after`; empty exactly where the two are equal.
-/// Patches and ports are known by their identifiers (those that repeat, by their turns); everything
-/// is compared as `==` does. A patch that is added or removed with others inside it is followed by
-/// theirs. Changes of the same documents the other way round are the same with before and after
-/// exchanged, in another order.
+/// Patches and ports are known by their identifiers, those that repeat by their turns as far as
+/// they stand in one place; everything is compared as `==` does. A patch that is added or removed
+/// with others inside it is followed by theirs. Changes of the same documents the other way round
+/// are the same with before and after exchanged, in another order.
 ///
 /// Lists that are one object are not looked at: to compare a document with its edited copy costs
-/// what the edit copied, else it is linear. Nothing recurses.
+/// what the edit copied, else it is linear. (Where patches are added while others are removed, all
+/// that is in the removed ones is looked at.) Nothing recurses.
 TARN_ENGINE_BASE_EXPORT std::vector<PatchChange> patchChanges(Patch const& before,
                                                               Patch const& after);
 
 /// A line for people, without its end: what happened to which patch, with names and values; long
-/// values are cut. `changed patch 7 "fade": input 31 "progress" default 0.5 -> 0.75`
+/// values are cut, and so are more than twenty connections. `changed patch 7 "fade": input 31
+/// "progress" default 0.5 -> 0.75`
 TARN_ENGINE_BASE_EXPORT std::string to_string(PatchChange const& change);
 /// All of them, each on a line of its own with its end.
 TARN_ENGINE_BASE_EXPORT std::string to_string(std::vector<PatchChange> const& changes);

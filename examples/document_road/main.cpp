@@ -90,18 +90,18 @@ int compare(std::string const& file, std::string const& other, std::string const
         Document const before = openDocument(file);
         current = &other;
         Document const after = openDocument(other);
-        Marks const marks = marksOf(before.root, after.root);
+        Marks marks = marksOf(before.root, after.root);
+        double const rates[] = {before.info.framesPerSecond, after.info.framesPerSecond};
+        if (rates[0] != rates[1]) {
+            marks.frameRates = "changed frames per second " + Unstructured(rates[0]).toText() +
+                               " -> " + Unstructured(rates[1]).toText() + "\n";
+        }
         if (!report.empty()) {
             for (std::string const& input : {file, other}) refuseToReplace(input, report);
             std::filesystem::path const fileName = std::filesystem::path(other).filename();
             writeFile(report, pageText(after, fileName.string(), reportFrames, &marks));
         }
-        std::string text = to_string(marks.changes);
-        double const rates[] = {before.info.framesPerSecond, after.info.framesPerSecond};
-        if (rates[0] != rates[1]) {
-            text += "changed frames per second " + Unstructured(rates[0]).toText() + " -> " +
-                    Unstructured(rates[1]).toText() + "\n";
-        }
+        std::string const text = to_string(marks.changes) + marks.frameRates;
         std::cout << text << std::flush;
         if (!std::cout) throw std::runtime_error("the output cannot be written");
         return text.empty() ? 0 : kDiffers;
@@ -171,7 +171,7 @@ int main(int argc, char** argv) {
         return app.exit(error) == 0 ? 0 : kBadInput;
     }
 
-    if (!other.empty()) return compare(file, other, report, reportFrames);
+    if (app.count("--compare") > 0) return compare(file, other, report, reportFrames);
     try {
         Document const document = openDocument(file);
         std::string const changes = document.info.summary();

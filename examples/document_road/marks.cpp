@@ -1,7 +1,8 @@
 #include "marks.h"
 
-#include <Engine/Base/patch_edit.h>
 #include <Engine/Base/patch_index.h>
+
+#include <utility>
 
 using namespace tarn::engine;
 
@@ -21,22 +22,59 @@ std::string signOfChange(std::string const& kind) {
     return kind == "moved" ? ">" : "~";
 }
 
+namespace {
+
+using Removed = std::unordered_map<Patch const*, std::vector<Patch>>;
+
+// The patch with what was removed from it and from those inside it.
+Patch withRemoved(Patch const& patch, Removed const& removed) {
+    Patch result = patch;
+    std::vector<Patch> children;
+    for (Patch const& child : *patch.children) children.push_back(withRemoved(child, removed));
+    auto const found = removed.find(&patch);
+    if (found != removed.end()) {
+        children.insert(children.end(), found->second.begin(), found->second.end());
+    }
+    result.children = arrayOf(std::move(children));
+    return result;
+}
+
+// A removed patch, with those inside it that were removed too.
+Patch removedAlone(Patch const& patch, std::unordered_set<Patch const*> const& removed) {
+    Patch result = patch;
+    std::vector<Patch> children;
+    for (Patch const& child : *patch.children) {
+        if (removed.count(&child) != 0) children.push_back(removedAlone(child, removed));
+    }
+    result.children = arrayOf(std::move(children));
+    return result;
+}
+
+}  // namespace
+
 Marks marksOf(Patch const& before, Patch const& after) {
     Marks marks;
     marks.changes = patchChanges(before, after);
-    PatchEdit edit{PatchIndex(after)};
+    PatchIndex const index(after);
+    std::unordered_set<Patch const*> gone;
     for (PatchChange const& change : marks.changes) {
-        // A moved patch may be changed too.
-        marks.kinds.emplace(change.id, kindOfChange(change.kind));
-        marks.words[change.id].push_back(to_string(change));
-        marks.added.insert(change.connectionsAdded.begin(), change.connectionsAdded.end());
-        if (!change.connectionsRemoved.empty())
-            marks.removed[change.id] = change.connectionsRemoved;
-        // Inside of another that was removed it is shown already.
-        if (change.kind == PatchChange::Kind::Removed) {
-            edit.addPatch(change.parentBefore->id, *change.before);
-        }
+        if (change.after == nullptr) gone.insert(change.before);
     }
-    marks.shown = edit.commit();
+    Removed removed;
+    for (PatchChange const& change : marks.changes) {
+        Patch const& patch = change.after != nullptr ? *change.after : *change.before;
+        // The root has no box; and a moved patch may be changed too.
+        if (&patch != &after) marks.kinds.emplace(patch.id, kindOfChange(change.kind));
+        marks.words[patch.id].push_back(to_string(change));
+        marks.added.insert(change.connectionsAdded.begin(), change.connectionsAdded.end());
+        if (!change.connectionsRemoved.empty()) marks.removed[patch.id] = change.connectionsRemoved;
+        // Inside of another that was removed it is shown there.
+        if (change.after != nullptr || gone.count(change.parentBefore) != 0) continue;
+        Patch const* const parent = index.findPatch(change.parentBefore->id);
+        // The index has a root of its own.
+        bool const isInRoot = change.parentBefore == &before || parent == &index.root();
+        removed[isInRoot ? &after : parent].push_back(removedAlone(*change.before, gone));
+    }
+    marks.shown = removed.empty() ? after : withRemoved(after, removed);
     return marks;
 }

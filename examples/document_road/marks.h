@@ -20,10 +20,12 @@ std::string kindOfChange(tarn::engine::PatchChange::Kind kind);
 std::string signOfChange(std::string const& kind);
 
 struct Marks {
-    // The later document, with what was removed in its former places.
+    // The later document, with what was removed behind the other children of its former parent.
     tarn::engine::Patch shown;
     std::vector<tarn::engine::PatchChange> changes;
-    // By the identifier of the patch: its kind, and all of its changes in words.
+    // Both frame rates, where they differ.
+    std::string frameRates;
+    // By the identifier that the patch is shown with: its kind, and all of its changes in words.
     std::unordered_map<unsigned long long, std::string> kinds;
     std::unordered_map<unsigned long long, std::vector<std::string>> words;
     std::unordered_set<tarn::engine::Connection> added;

@@ -15,6 +15,7 @@
 #include <map>
 #include <sstream>
 #include <unordered_map>
+#include <unordered_set>
 
 using namespace tarn::engine;
 
@@ -295,7 +296,7 @@ std::string levelsText(Patch const& root, Marks const* marks) {
     std::function<void(Level const&, int)> const write = [&](Level const& level, int depth) {
         Patch const& group = *level.group;
         std::string const name = escaped(nameOf(group));
-        text << "<figure class=\"level\" id=\"level-" << group.id << "\""
+        text << "<figure class=\"level\" tabindex=\"-1\" id=\"level-" << group.id << "\""
              << (depth > 1 ? " hidden" : "") << ">\n<figcaption><span class=\"name\">" << name
              << "</span> <span class=\"type\">level " << depth << ", patch " << group.id << ", "
              << group.children->size() << (group.children->size() == 1 ? " patch" : " patches")
@@ -336,7 +337,7 @@ std::string levelsText(Patch const& root, Marks const* marks) {
     return text.str();
 }
 
-std::string legendText(Document const& document) {
+std::string legendText(Patch const& root) {
     std::map<std::string, std::string> types;
     std::function<void(Patch const&)> const add = [&](Patch const& patch) {
         for (auto const& list : {patch.inputs, patch.outputs}) {
@@ -348,7 +349,7 @@ std::string legendText(Document const& document) {
         }
         for (Patch const& child : *patch.children) add(child);
     };
-    add(document.root);
+    add(root);
     std::string text;
     for (auto const& [name, type] : types) {
         text += "<li class=\"t-" + type + "\">" + name + "</li>\n";
@@ -470,21 +471,44 @@ std::string attributesText(Document const& document) {
     return list.empty() ? "" : "<ul class=\"tree\">\n" + list + "</ul>\n";
 }
 
+// The values of the attributes `id` that begin with `prefix`.
+std::unordered_set<std::string> idsIn(std::string const& markup, std::string const& prefix) {
+    std::unordered_set<std::string> ids;
+    std::string const start = " id=\"" + prefix;
+    for (std::size_t at = markup.find(start); at != std::string::npos;
+         at = markup.find(start, at + 1)) {
+        ids.insert(markup.substr(at + 5, markup.find('"', at + 5) - at - 5));
+    }
+    return ids;
+}
+
+// A change leads to its patch; where that is not drawn, to the level that it is in.
 std::string changesText(Marks const* marks, std::string const& levels) {
     constexpr std::size_t kMostChanges = 2000;
     if (marks == nullptr) return "";
-    if (marks->changes.empty()) return "<p>The documents are the same.</p>\n";
+    if (marks->changes.empty() && marks->frameRates.empty()) {
+        return "<p>The documents are the same.</p>\n";
+    }
+    std::unordered_set<std::string> const patches = idsIn(levels, "patch-");
+    std::unordered_set<std::string> const groups = idsIn(levels, "level-");
     std::string text = "<ul tabindex=\"0\" aria-label=\"Changes\">\n";
     for (std::size_t i = 0; i < std::min(marks->changes.size(), kMostChanges); ++i) {
         PatchChange const& change = marks->changes[i];
+        Patch const& patch = change.after != nullptr ? *change.after : *change.before;
+        Patch const* const parent =
+            change.after != nullptr ? change.parentAfter : change.parentBefore;
         std::string const kind = kindOfChange(change.kind);
-        std::string const line = to_string(change).substr(kind.size() + 1);
-        std::string const id = "patch-" + std::to_string(change.id);
-        bool const isDrawn = levels.find("id=\"" + id + "\"") != std::string::npos;
+        std::string const line = escaped(to_string(change).substr(kind.size() + 1));
+        std::string id = "patch-" + std::to_string(patch.id);
+        bool isThere = parent != nullptr && patches.count(id) != 0;
+        if (!isThere) {
+            id = "level-" + std::to_string(parent != nullptr ? parent->id : patch.id);
+            isThere = groups.count(id) != 0;
+        }
         text += "<li><span class=\"mark\">" + signOfChange(kind) + " " + kind + "</span> " +
-                (isDrawn ? "<a href=\"#" + id + "\">" + escaped(line) + "</a>" : escaped(line)) +
-                "</li>\n";
+                (isThere ? "<a href=\"#" + id + "\">" + line + "</a>" : line) + "</li>\n";
     }
+    if (!marks->frameRates.empty()) text += "<li>" + escaped(marks->frameRates) + "</li>\n";
     text += "</ul>\n";
     if (marks->changes.size() > kMostChanges) {
         text += "<p>" + std::to_string(marks->changes.size() - kMostChanges) + " more.</p>\n";
@@ -575,7 +599,7 @@ std::string pageText(Document const& document, std::string const& fileName, long
                                        : "<p>The page keeps the first " + std::to_string(shown) +
                                              " of " + std::to_string(frames) +
                                              " frames: more would be too large.</p>\n"},
-         {"LEGEND", legendText(document)},
+         {"LEGEND", legendText(marks != nullptr ? marks->shown : document.root)},
          {"LEVELS", levels},
          {"PLOTS", plots.str()},
          {"CONSTANT", constant == 0 ? ""

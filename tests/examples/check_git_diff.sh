@@ -17,19 +17,35 @@ git config diff.patches.command "$root/tools/git/diff_documents"
 echo '*.json diff=patches' > .git/info/attributes
 echo '{"root": {"id": 1, "name": "first"}}' > a.json
 echo '{"root": {"id": 1}}' > gone.json
+echo '{"other": 1}' > other.json
 git add .
 git commit --quiet --message "Add documents"
 echo '{"root": {"id": 1, "name": "second"}}' > a.json
 echo '{"root": {"id": 1}}' > new.json
 git rm --quiet gone.json
+echo '{"other": 2}' > other.json
 git add new.json
 cat > expected <<'END'
 a.json:
 changed patch 1 "first": name "first" -> "second"
 gone.json:
-removed the document
+removed
 new.json:
-added the document
+added
+other.json:
 END
 git diff --no-renames HEAD > actual
-diff expected actual
+grep -v '^[-+@]' actual | diff expected -
+grep -q '^+{"other": 2}' actual
+
+# In the middle of a merge.
+git commit --quiet --all --message "Change documents"
+git checkout --quiet -b branch
+echo '{"root": {"id": 1, "name": "theirs"}}' > a.json
+git commit --quiet --all --message "Change it there"
+git checkout --quiet -
+echo '{"root": {"id": 1, "name": "ours"}}' > a.json
+git commit --quiet --all --message "Change it here"
+if git merge --quiet branch > /dev/null; then exit 1; fi
+git diff --cached > actual
+grep -q '^not merged$' actual

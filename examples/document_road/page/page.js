@@ -261,16 +261,16 @@ for (const button of document.querySelectorAll(".zoom")) {
     });
 }
 
-// Changes: each leads to its patch, and opens the groups that it is in.
+// Changes: each leads to its patch, or to the level that it is in, and opens the groups around it.
 
 for (const link of document.querySelectorAll("#changes a")) {
     link.addEventListener("click", (event) => {
         event.preventDefault();
-        const heading = byId(link.hash.slice(1));
-        for (let level = heading.closest(".level"); level; level = level.parentElement.closest(".level")) {
+        const item = byId(link.hash.slice(1));
+        for (let level = item.closest(".level"); level; level = level.parentElement.closest(".level")) {
             if (level.hidden) setOpen(document.querySelector(`[data-level="${level.id}"]`), true);
         }
-        heading.focus();
+        item.focus();
     });
 }
 
