@@ -8,6 +8,8 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <cmath>
+#include <ctime>
 #include <functional>
 #include <new>
 #include <utility>
@@ -318,6 +320,72 @@ TEST(PatchEdit, GivesFreshIdentifiers) {
     EXPECT_EQ(other.freshPatchId(), 3u);
     EXPECT_EQ(other.freshPatchId(), 4u);
     EXPECT_EQ(other.freshPortId(), 2u);
+}
+
+TEST(PatchEdit, GivesNoIdentifierTwice) {
+    PatchIndex const index(patch(1, {patch(2)}));
+    PatchEdit edit(index);
+    EXPECT_EQ(edit.freshPatchId(), 3u);
+    EXPECT_EQ(edit.freshPortId(), 1u);
+    EXPECT_TRUE(edit.addPatch(1, withPorts(patch(ULLONG_MAX), {port(ULLONG_MAX)}, {})));
+    EXPECT_EQ(edit.freshPatchId(), 4u);
+    EXPECT_EQ(edit.freshPortId(), 2u);
+}
+
+TEST(PatchEdit, SeesTheSignOfAZero) {
+    PatchIndex const index(smallGraph());
+    {
+        PatchEdit edit(index);
+        edit.inputPort(41)->defaultValue = -0.0;
+        PatchIndex const changed(edit.commit());
+        EXPECT_TRUE(std::signbit(double(changed.findInputPort(41)->defaultValue)));
+    }
+    PatchEdit edit(index);
+    edit.patch(4)->attributes["a"] = 0.0;
+    PatchIndex const zero(edit.commit());
+    PatchEdit other(zero);
+    other.patch(4)->attributes["a"] = -0.0;
+    PatchIndex const changed(other.commit());
+    EXPECT_TRUE(std::signbit(changed.findPatch(4)->attributes.at("a").asFloat()));
+}
+
+TEST(PatchEdit, KeepsWhatItHasHandedOut) {
+    PatchIndex const index(smallGraph());
+    PatchEdit edit(index);
+    Patch* const patch = edit.patch(4);
+    Port* const input = edit.inputPort(21);
+    EXPECT_TRUE(edit.removeInputPort(21));
+    EXPECT_TRUE(edit.removePatch(2));
+    input->tag = 3;
+    patch->name = "gone";
+    EXPECT_EQ(edit.commit().children->size(), 1u);
+}
+
+TEST(PatchEdit, CopiesNoListForWhatIsGoneAgain) {
+    Patch const before = smallGraph();
+    PatchIndex const index(before);
+    PatchEdit edit(index);
+    EXPECT_TRUE(edit.addPatch(3, patch(90)));
+    edit.patch(90)->name = "x";
+    EXPECT_TRUE(edit.removePatch(90));
+    EXPECT_EQ(edit.commit().children, before.children);
+}
+
+// Adding to one list and editing documents whose identifiers repeat takes time that follows how
+// much is done.
+TEST(PatchEdit, TakesTimeThatFollowsWhatIsDone) {
+    std::vector<Patch> groups;
+    for (unsigned long long id = 2; id < 20002; ++id) groups.push_back(patch(id, {patch(1)}));
+    PatchIndex const index(patch(1, std::move(groups)));
+    std::clock_t const start = std::clock();
+    PatchEdit edit(index);
+    for (unsigned long long id = 100000; id < 120000; ++id) {
+        ASSERT_TRUE(edit.addPatch(id - 99998, patch(id)));
+        ASSERT_TRUE(edit.addInputPort(2, port(id)));
+    }
+    edit.commit();
+    // Quadratic, it is seconds; under tools that look at everything it is one.
+    EXPECT_LT(static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC, 10.0);
 }
 
 TEST(PatchEdit, WorksWhereIdentifiersRepeat) {

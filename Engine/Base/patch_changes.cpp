@@ -76,8 +76,9 @@ public:
         // What is only in one of the two was moved, as a rule with all that is in it: then nothing
         // in there is looked at.
         std::vector<Place> rest;
-        for (std::size_t i = 0; i < onlyAfter.size(); ++i) {
-            Place const place = onlyAfter[i];
+        std::size_t next = 0;
+        while (next < onlyAfter.size()) {  // It grows on the way.
+            Place const place = onlyAfter[next++];
             if (!findMoved(place, false)) rest.push_back(place);
         }
         onlyAfter.assign(rest.rbegin(), rest.rend());

@@ -3,9 +3,12 @@
 #include <Engine/Base/detail/patch_tables.h>
 
 #include <algorithm>
+#include <cmath>
 #include <deque>
 #include <iterator>
 #include <list>
+#include <map>
+#include <string>
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
@@ -38,6 +41,7 @@ struct Node {
     // As it is before, the lists of the edit left out; and as it will be.
     Patch const* base = nullptr;
     Patch fields = {};
+    bool isHandedOut = false;  // Otherwise the fields are as they were.
     PortEdits inputs = {};
     PortEdits outputs = {};
     // Its children by their numbers, once there is another order of them.
@@ -56,10 +60,6 @@ template <class Container>
 void absorb(Container& container, Container&& elements) noexcept {
     container.merge(elements);
 }
-template <class Container>
-void makeRoom(Container& container, std::size_t further) {
-    container.reserve(container.size() + further);
-}
 
 std::vector<Port> const& portsOf(Patch const& patch, Side side) {
     return side == Side::Input ? *patch.inputs : *patch.outputs;
@@ -69,6 +69,58 @@ template <class T>
 void insertAt(std::vector<T>& list, std::size_t position, T element) noexcept {
     std::size_t const place = std::min(position, list.size());
     list.insert(list.begin() + static_cast<std::ptrdiff_t>(place), std::move(element));
+}
+
+// Whether nothing tells them apart, not even the sign of a zero. Data and paths that are other
+// objects count as others.
+bool isSame(Value const& a, Value const& b) {
+    if (a.type() != b.type() || a != b) return false;
+    switch (a.type()) {
+        case Type::Float:
+        case Type::Vec2:
+        case Type::Vec3:
+        case Type::Vec4: {
+            FloatVec4 const x = a;
+            FloatVec4 const y = b;
+            return std::signbit(x.x) == std::signbit(y.x) &&
+                   std::signbit(x.y) == std::signbit(y.y) &&
+                   std::signbit(x.z) == std::signbit(y.z) && std::signbit(x.w) == std::signbit(y.w);
+        }
+        case Type::Path: return a.ifPath() == b.ifPath();
+        case Type::Unstructured: return a.ifUnstructured() == b.ifUnstructured();
+        case Type::Mat4:  // Compared by its bytes.
+        case Type::Int:
+        case Type::Boolean:
+        case Type::Image:
+        case Type::Video:
+        case Type::Sound:
+        case Type::String:
+        case Type::Model: break;
+    }
+    return true;
+}
+
+bool isSame(Optional<Value> const& a, Optional<Value> const& b) {
+    return a.hasValue() == b.hasValue() && (!a || isSame(*a, *b));
+}
+
+using Attributes = std::map<std::string, Unstructured>;
+
+// The text knows the sign of a zero.
+bool isSame(Unstructured const& a, Unstructured const& b) {
+    constexpr std::size_t kAll = std::numeric_limits<std::size_t>::max();
+    return a == b && a.toText(kAll, kAll) == b.toText(kAll, kAll);
+}
+
+bool isSame(Attributes const& a, Attributes const& b) {
+    return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](auto const& x, auto const& y) {
+        return x.first == y.first && isSame(x.second, y.second);
+    });
+}
+
+bool haveSameFields(Patch const& a, Patch const& b) {
+    return a.builtin == b.builtin && a.descriptor == b.descriptor && a.name == b.name &&
+           a.modelLayer == b.modelLayer && isSame(a.attributes, b.attributes);
 }
 
 }  // namespace
@@ -86,7 +138,10 @@ public:
 
     Patch* patch(unsigned long long id) {
         std::uint32_t const number = find(id);
-        return number == kNone ? nullptr : &touch(number).fields;
+        if (number == kNone) return nullptr;
+        Node& node = touch(number);
+        node.isHandedOut = true;
+        return &node.fields;
     }
 
     Port* port(unsigned long long portId, Side side) {
@@ -101,7 +156,7 @@ public:
         std::uint32_t const owner = find(patchId);
         if (owner == kNone || port.id == 0 || isPortTaken(port.id)) return false;
         PortEdits& ports = openPorts(touch(owner), side);
-        makeRoom(ports.entries, 1);
+        detail::reserveFor(ports.entries, 1);
         auto& known = side == Side::Input ? addedInputs : addedOutputs;
         PortEntry entry{port.id, nullptr, nullptr};
         entry.own = std::make_unique<Port>(std::move(port));
@@ -115,6 +170,7 @@ public:
         PortPlace const place = findPort(portId, side);
         if (place.owner == kNone) return false;
         PortEdits& ports = openPorts(touch(place.owner), side);
+        detail::reserveFor(removedPorts, 1);
         std::uint32_t const parent = parentOf(place.owner);
         if (parent != kNone) {
             unsigned long long const owner = patchOf(place.owner).id;
@@ -123,7 +179,9 @@ public:
                                            : c.fromPatchId == owner && c.fromPortId == portId;
             });
         }
-        ports.entries.erase(ports.entries.begin() + static_cast<std::ptrdiff_t>(place.position));
+        auto const entry = ports.entries.begin() + static_cast<std::ptrdiff_t>(place.position);
+        removedPorts.push_back(std::move(entry->own));
+        ports.entries.erase(entry);
         return true;
     }
 
@@ -132,7 +190,7 @@ public:
         if (parent == kNone) return false;
         Node& node = touch(parent);
         openOrder(node, parent);
-        makeRoom(node.order, 1);
+        detail::reserveFor(node.order, 1);
         std::size_t const before = added.size();
         try {
             return addTree(parent, patch, node, position);
@@ -149,7 +207,7 @@ public:
         Node& node = touch(parent);
         openOrder(node, parent);
         std::unordered_set<std::uint32_t> one{number};
-        makeRoom(removed, 1);
+        detail::reserveSlots(removed, 1);
         disconnectAll(parent, number, [id](Connection const& c) {
             return c.fromPatchId == id || c.toPatchId == id;
         });
@@ -167,11 +225,11 @@ public:
         Node& to = touch(target);
         openOrder(from, source);
         openOrder(to, target);
-        makeRoom(to.order, 1);
+        detail::reserveFor(to.order, 1);
         if (source != target) {
             std::unordered_map<std::uint32_t, std::uint32_t> one;
             if (parents.count(number) == 0) one.emplace(number, target);
-            makeRoom(parents, 1);
+            detail::reserveSlots(parents, 1);
             disconnectAll(source, number, [id](Connection const& c) {
                 return c.fromPatchId == id || c.toPatchId == id;
             });
@@ -215,15 +273,16 @@ public:
     }
 
     unsigned long long freshPatchId() {
-        return fresh(largestPatchId, lastPatchGap, [this](unsigned long long id) {
-            return tables->graph.recordOf(id) != kNone || addedPatches.count(id) != 0;
+        return fresh(largestPatchId, lastPatchGap, givenPatches, [this](unsigned long long id) {
+            return tables->graph.recordOf(id) != kNone || addedPatches.count(id) != 0 ||
+                   givenPatches.count(id) != 0;
         });
     }
 
     unsigned long long freshPortId() {
-        return fresh(largestPortId, lastPortGap, [this](unsigned long long id) {
+        return fresh(largestPortId, lastPortGap, givenPorts, [this](unsigned long long id) {
             return tables->graph.ownerOfPort(id) != kNone || addedInputs.count(id) != 0 ||
-                   addedOutputs.count(id) != 0;
+                   addedOutputs.count(id) != 0 || givenPorts.count(id) != 0;
         });
     }
 
@@ -233,6 +292,7 @@ public:
         Patch answer = root;
         result = std::move(root);
         nodes.clear();
+        removedPorts.clear();
         added.clear();
         trees.clear();
         tables = nullptr;
@@ -359,6 +419,19 @@ private:
         return ports;
     }
 
+    // Of a patch of a document whose identifiers repeat.
+    std::uint32_t firstChildOf(std::uint32_t record) const {
+        auto const& records = tables->graph.records;
+        if (firstChildren.empty()) {
+            std::vector<std::uint32_t> first(records.size(), kNone);
+            for (std::size_t i = records.size(); i > 1; --i) {
+                first[records[i - 1].parent] = static_cast<std::uint32_t>(i - 1);
+            }
+            firstChildren = std::move(first);
+        }
+        return firstChildren[record];
+    }
+
     std::vector<std::uint32_t> childrenOf(std::uint32_t number) const {
         std::vector<Patch> const& children = *patchOf(number).children;
         std::vector<std::uint32_t> numbers(children.size());
@@ -367,7 +440,7 @@ private:
         bool const areNeighbours = isAdded(number) || !tables->hasUniqueIds;
         if (areNeighbours) {
             previous = (isAdded(number) ? added[number - recordCount()].firstChild
-                                        : tables->firstChildOf(number)) -
+                                        : firstChildOf(number)) -
                        1;
         }
         for (std::size_t i = 0; i < children.size(); ++i) {
@@ -424,9 +497,9 @@ private:
             for (Patch const& child : *inner.children) added.push_back({&child, number, kNone});
             detail::requireCountable(recordCount() + added.size());
         }
-        makeRoom(addedPatches, ids.size());
-        makeRoom(addedInputs, inputIds.size());
-        makeRoom(addedOutputs, outputIds.size());
+        detail::reserveSlots(addedPatches, ids.size());
+        detail::reserveSlots(addedInputs, inputIds.size());
+        detail::reserveSlots(addedOutputs, outputIds.size());
         replaceWith(addedPatches, std::move(ids));
         replaceWith(addedInputs, std::move(inputIds));
         replaceWith(addedOutputs, std::move(outputIds));
@@ -481,18 +554,25 @@ private:
         forEachBefore(parent, child, [&](Connection const& c) {
             if (isMeant(c)) gone.insert(c);
         });
-        makeRoom(node.disconnected, gone.size());
+        detail::reserveSlots(node.disconnected, gone.size());
         absorb(node.disconnected, std::move(gone));
         for (auto c = node.connected.begin(); c != node.connected.end();) {
             c = isMeant(c->first) ? node.connected.erase(c) : std::next(c);
         }
     }
 
+    using Ids = std::unordered_set<unsigned long long, detail::SeededHash>;
+
+    // Counts on from the largest; then takes what is free below.
     template <class IsTaken>
-    unsigned long long fresh(unsigned long long& largest, unsigned long long& lastGap,
-                             IsTaken isTaken) {
-        if (largest != std::numeric_limits<unsigned long long>::max()) return ++largest;
-        while (lastGap != std::numeric_limits<unsigned long long>::max()) {
+    static unsigned long long fresh(unsigned long long& largest, unsigned long long& lastGap,
+                                    Ids& given, IsTaken isTaken) {
+        constexpr unsigned long long kLast = std::numeric_limits<unsigned long long>::max();
+        if (largest != kLast) {
+            given.insert(largest + 1);
+            return ++largest;
+        }
+        while (lastGap != kLast) {
             if (!isTaken(++lastGap)) return lastGap;
         }
         return 0;
@@ -525,6 +605,7 @@ private:
 
     private:
         void finish(std::uint32_t number, Node const& node) {
+            if (state.removed.count(number) != 0) return;
             Patch made = node.fields;
             Patch const& base = *node.base;
             made.id = base.id;
@@ -534,10 +615,8 @@ private:
             if (made.children == base.children) finishChildren(made, number, node);
             bool const isChanged = made.inputs != base.inputs || made.outputs != base.outputs ||
                                    made.connections != base.connections ||
-                                   made.children != base.children || made.builtin != base.builtin ||
-                                   made.descriptor != base.descriptor || made.name != base.name ||
-                                   made.modelLayer != base.modelLayer ||
-                                   made.attributes != base.attributes;
+                                   made.children != base.children ||
+                                   (node.isHandedOut && !haveSameFields(made, base));
             if (!isChanged) return;
             std::uint32_t const parent = state.parentOf(number);
             finished.emplace(number, std::move(made));
@@ -547,9 +626,11 @@ private:
         static void finishPorts(Array<Port>& list, Array<Port> const& base,
                                 PortEdits const& edits) {
             if (list != base || !edits.isOpen) return;
-            bool const isSame = std::equal(
-                edits.entries.begin(), edits.entries.end(), base->begin(), base->end(),
-                [](PortEntry const& e, Port const& p) { return &e.port() == &p || same(e, p); });
+            bool const isSame =
+                std::equal(edits.entries.begin(), edits.entries.end(), base->begin(), base->end(),
+                           [](PortEntry const& e, Port const& p) {
+                               return e.own == nullptr ? e.base == &p : same(e, p);
+                           });
             if (isSame) return;
             std::vector<Port> ports;
             ports.reserve(edits.entries.size());
@@ -561,7 +642,15 @@ private:
         }
 
         static bool same(PortEntry const& entry, Port const& port) {
-            return entry.base == &port && entry.port() == port;
+            Port const& own = *entry.own;
+            return entry.base == &port && own.tag == port.tag && own.name == port.name &&
+                   own.typeInfo.type == port.typeInfo.type &&
+                   own.typeInfo.subtype == port.typeInfo.subtype &&
+                   isSame(own.typeInfo.min, port.typeInfo.min) &&
+                   isSame(own.typeInfo.max, port.typeInfo.max) &&
+                   isSame(own.typeInfo.extra, port.typeInfo.extra) &&
+                   isSame(own.defaultValue, port.defaultValue) &&
+                   isSame(own.attributes, port.attributes);
         }
 
         static void finishConnections(Patch& patch, Node const& node) {
@@ -637,12 +726,16 @@ private:
     Numbers addedOutputs;
     std::unordered_map<std::uint32_t, std::uint32_t> parents;  // Of patches that were moved.
     std::unordered_set<std::uint32_t> removed;
+    std::vector<std::unique_ptr<Port>> removedPorts;  // Callers may still have pointers to them.
+    mutable std::vector<std::uint32_t> firstChildren;
     std::size_t lastConnection = 0;
     unsigned long long largestPatchId;
     unsigned long long largestPortId;
     // Below it no identifier is free; used once the largest there is has been given away.
     unsigned long long lastPatchGap = 0;
     unsigned long long lastPortGap = 0;
+    Ids givenPatches;
+    Ids givenPorts;
 };
 
 PatchEdit::PatchEdit(PatchIndex const& index) : state(std::make_unique<State>(index.tables)) {}

@@ -29,8 +29,9 @@ namespace tarn::engine {
 ///
 /// What is not there, what is taken or what does not fit answers false or null and changes nothing;
 /// so does a failing allocation, which throws. Where identifiers repeat, the patch and the port are
-/// those that the index finds. Each call takes constant time on average, but for the lists of the
-/// patch that it changes and for the levels above it. One thread at a time.
+/// those that the index finds, until they are removed. Each call takes constant time on average,
+/// but for the lists of the patch that it changes and for the levels above it. One thread at a
+/// time.
 class PatchEdit {
 public:
     /// The place behind all others.
@@ -45,8 +46,8 @@ public:
 
     /// The patch (the port) as it will be, to be changed in place; null for one that is not there
     /// or is removed. Valid until `commit`, whatever else is changed. The `id` stays, whatever is
-    /// written there. A list that is assigned to the patch takes the place of the former one and of
-    /// all changes made to that; the edit knows nothing of what is in it.
+    /// written there. Another list that is assigned to the patch takes the place of the former one
+    /// and of all changes made to that; the edit knows nothing of what is in it.
     TARN_ENGINE_BASE_EXPORT Patch* patch(unsigned long long id);
     TARN_ENGINE_BASE_EXPORT Port* inputPort(unsigned long long portId);
     TARN_ENGINE_BASE_EXPORT Port* outputPort(unsigned long long portId);
@@ -78,7 +79,8 @@ public:
     /// Adds the connection; an input may have several. False where it is there already, and where
     /// its ends are not an output and an input of two children of one patch, or of one child.
     TARN_ENGINE_BASE_EXPORT bool connect(Connection connection);
-    /// Removes the connection, wherever it stands in the list. False where there is none.
+    /// Removes the connection, wherever it stands in the list of the patch that one of its ends is
+    /// a child of. False where there is none.
     TARN_ENGINE_BASE_EXPORT bool disconnect(Connection connection);
 
     /// An identifier that neither the former document has nor this edit has seen; each call gives
@@ -86,9 +88,9 @@ public:
     TARN_ENGINE_BASE_EXPORT unsigned long long freshPatchId();
     TARN_ENGINE_BASE_EXPORT unsigned long long freshPortId();
 
-    /// The new root. What was changed back to what it was before is no change: a root without any
-    /// has the lists of the former one. Afterwards the edit is done: it answers null and false, and
-    /// the same root again.
+    /// The new root. What was changed back to what it was before, to the last bit, is no change: a
+    /// root without any has the lists of the former one. Afterwards the edit is done: it answers
+    /// null and false, and the same root again.
     TARN_ENGINE_BASE_EXPORT Patch commit();
 
 private:

@@ -69,14 +69,6 @@ void PatchTables::lookAtIds() {
     }
 }
 
-std::uint32_t PatchTables::firstChildOf(std::uint32_t record) const {
-    std::vector<Patch> const& children = *graph.records[record].patch->children;
-    if (hasUniqueIds) return graph.recordOf(children.front().id);
-    auto const isFirst = [&](PatchRecord<Patch> const& r) { return r.parent == record; };
-    auto const found = std::find_if(graph.records.begin(), graph.records.end(), isFirst);
-    return static_cast<std::uint32_t>(found - graph.records.begin());
-}
-
 void PatchTables::groupConnections() {
     std::vector<Member> members;
     findMembers(placesOfConnections(), members);

@@ -8,13 +8,6 @@ namespace tarn::engine::detail {
 
 namespace {
 
-// Room for so many further elements, at a cost that does not add up.
-template <class T>
-void reserveFor(std::vector<T>& list, std::size_t further) {
-    std::size_t const wanted = list.size() + further;
-    if (wanted > list.capacity()) list.reserve(std::max(wanted, 2 * list.capacity()));
-}
-
 using Ids = std::unordered_set<unsigned long long, SeededHash>;
 
 // What becomes of the ports of one kind.
@@ -246,6 +239,7 @@ private:
             dropGroups(graph.records[record], graph.records[record].patch->outputs);
             graph.patches.erase(graph.records[record].patch->id);
         }
+        for (unsigned long long const id : outputs.erased) dropGroup(graph.outputs.at(id).link);
         applyErasures(graph.inputs, inputs);
         applyErasures(graph.outputs, outputs);
         for (Refresh const& now : refreshed) {

@@ -60,8 +60,10 @@ struct SeededHash {
 template <class Slot>
 class HashTable {
 public:
+    explicit HashTable(std::vector<Slot> const& filled)
+        : HashTable(filled, SeededHash{mixed(reinterpret_cast<std::uintptr_t>(this))}) {}
     /// Tables with one seed have their keys in one order.
-    explicit HashTable(std::vector<Slot> const& filled, SeededHash seeded = SeededHash())
+    HashTable(std::vector<Slot> const& filled, SeededHash seeded)
         : slots(sizeFor(filled.size())), hash(seeded) {
         for (std::size_t i = 0; i < filled.size(); ++i) {
             if (i + kAhead < filled.size()) prefetch(filled[i + kAhead].key);
@@ -149,6 +151,21 @@ private:
     std::size_t count = 0;
     SeededHash hash;
 };
+
+/// Room for so many further elements, at a cost that does not add up.
+template <class T>
+void reserveFor(std::vector<T>& list, std::size_t further) {
+    std::size_t const wanted = list.size() + further;
+    if (wanted > list.capacity()) list.reserve(std::max(wanted, 2 * list.capacity()));
+}
+/// The same for a container of the standard library that hashes.
+template <class Container>
+void reserveSlots(Container& container, std::size_t further) {
+    auto const room = static_cast<double>(container.bucket_count()) *
+                      static_cast<double>(container.max_load_factor());
+    std::size_t const wanted = container.size() + further;
+    if (static_cast<double>(wanted) >= room) container.reserve(2 * wanted);
+}
 
 }  // namespace tarn::engine::detail
 

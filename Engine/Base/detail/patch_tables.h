@@ -158,10 +158,8 @@ struct PatchTables {
     /// be made anew instead; then, and where an allocation fails, both are as they were.
     bool update(Patch& newRoot);
 
-    /// The position of the record of the patch's first child; it has one.
-    std::uint32_t firstChildOf(std::uint32_t record) const;
-    /// That of the child at `position` in `children`, which are those of one patch, for whoever
-    /// goes through them in order: `previous` is that of the one before, or `kNone`.
+    /// The record of the child at `position` in `children`, which are those of one patch, for
+    /// whoever goes through them in order: `previous` is that of the one before, or `kNone`.
     std::uint32_t childRecord(std::vector<Patch> const& children, std::size_t position,
                               std::uint32_t previous) const {
         Patch const& child = children[position];
