@@ -11,7 +11,9 @@
 #include <system_error>
 #include <utility>
 
-#if !defined(_WIN32)
+#if defined(_WIN32)
+#include <process.h>
+#else
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -33,11 +35,28 @@ std::string reason(char const* what, int number) {
 }
 
 #if defined(_WIN32)
+int processNumber() { return ::_getpid(); }
+#else
+int processNumber() { return ::getpid(); }
+#endif
+
+// A name in the target's folder that no other writer takes, however long the target's own is.
+fs::path nameBeside(fs::path const& target) {
+    static std::atomic<unsigned> count{0};
+    constexpr std::size_t kLongest = 200;
+    fs::path name = target.filename();
+    if (name.native().size() > kLongest) name = "document";
+    auto const now = std::chrono::steady_clock::now().time_since_epoch().count();
+    name += "." + std::to_string(processNumber()) + "-" + std::to_string(now) + "-" +
+            std::to_string(count++) + ".unfinished";
+    return target.parent_path() / name;
+}
+
+#if defined(_WIN32)
 
 bool writeBeside(fs::path const& target, fs::path& beside, std::string_view content,
                  std::string& problem) {
-    beside = target;
-    beside += ".unfinished";
+    beside = nameBeside(target);
     std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(_wfopen(beside.c_str(), L"wb"),
                                                          &std::fclose);
     bool const isWritten =
@@ -84,18 +103,6 @@ bool copyPermissions(int file, struct stat const& old) {
         errno = 0;  // The permissions are what counts.
     }
     return ::fchmod(file, old.st_mode & 07777) == 0;
-}
-
-// A name in the target's folder that no other writer takes, however long the target's own is.
-fs::path nameBeside(fs::path const& target) {
-    static std::atomic<unsigned> count{0};
-    constexpr std::size_t kLongest = 200;
-    std::string name = target.filename().string();
-    if (name.size() > kLongest) name = "document";
-    auto const now = std::chrono::steady_clock::now().time_since_epoch().count();
-    name += "." + std::to_string(::getpid()) + "-" + std::to_string(now) + "-" +
-            std::to_string(count++) + ".unfinished";
-    return target.parent_path() / name;
 }
 
 bool writeBeside(fs::path const& target, fs::path& beside, std::string_view content,
