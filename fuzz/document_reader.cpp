@@ -3,8 +3,8 @@
 
 #include "fuzz.h"
 
-#include "document.h"
-#include "report.h"
+#include "animation/document.h"
+#include "animation/labels.h"
 
 #include <sstream>
 

@@ -2,11 +2,13 @@
 //
 //     document_road examples/documents/small.json --frames 3
 
-#include "document.h"
-#include "drawing.h"
-#include "page.h"
-#include "report.h"
-#include "scene.h"
+#include "console.h"
+
+#include "animation/document.h"
+#include "animation/labels.h"
+#include "report/drawing.h"
+#include "report/marks.h"
+#include "report/page.h"
 
 #include <CLI/CLI.hpp>
 

@@ -1,4 +1,4 @@
-#include "document.h"
+#include "animation/document.h"
 
 #include <sstream>
 #include <utility>

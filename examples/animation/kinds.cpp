@@ -1,4 +1,4 @@
-#include "kinds.h"
+#include "animation/kinds.h"
 
 #include <Engine/Base/easing.h>
 #include <Engine/Base/layers.h>

@@ -1,9 +1,9 @@
-#include "drawing.h"
+#include "report/drawing.h"
 
-#include "evaluator.h"
-#include "markup.h"
+#include "animation/evaluator.h"
+#include "animation/labels.h"
+#include "animation/markup.h"
 #include "page_files.h"
-#include "report.h"
 
 #include <algorithm>
 #include <cmath>

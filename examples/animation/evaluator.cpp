@@ -1,6 +1,6 @@
-#include "evaluator.h"
+#include "animation/evaluator.h"
 
-#include "kinds.h"
+#include "animation/kinds.h"
 
 #include <algorithm>
 #include <set>

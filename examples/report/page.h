@@ -3,11 +3,11 @@
 //
 //     std::ofstream("report.html") << pageText(document, "animation.json", 120);
 
-#ifndef DOCUMENT_ROAD_PAGE_H
-#define DOCUMENT_ROAD_PAGE_H
+#ifndef REPORT_PAGE_H
+#define REPORT_PAGE_H
 
-#include "document.h"
-#include "marks.h"
+#include "animation/document.h"
+#include "report/marks.h"
 
 #include <string>
 

@@ -2,8 +2,8 @@
 //
 //     std::cout << "<path d='" << pathData(PathBuilder().circle({0, 0}, 5.0).build()) << "'/>";
 
-#ifndef DOCUMENT_ROAD_MARKUP_H
-#define DOCUMENT_ROAD_MARKUP_H
+#ifndef ANIMATION_MARKUP_H
+#define ANIMATION_MARKUP_H
 
 #include <Engine/Base/path.h>
 

@@ -2,8 +2,8 @@
 //
 //     Kind const* kind = kindByNumber(*stringToKind("oscillator"));
 
-#ifndef DOCUMENT_ROAD_KINDS_H
-#define DOCUMENT_ROAD_KINDS_H
+#ifndef ANIMATION_KINDS_H
+#define ANIMATION_KINDS_H
 
 #include <Engine/Base/value.h>
 

@@ -1,8 +1,8 @@
-#include "scene.h"
+#include "animation/scene.h"
 
-#include "evaluator.h"
-#include "kinds.h"
-#include "markup.h"
+#include "animation/evaluator.h"
+#include "animation/kinds.h"
+#include "animation/markup.h"
 
 #include <algorithm>
 
@@ -49,19 +49,4 @@ std::vector<Drawn> Scene::now() const {
         }
     }
     return result;
-}
-
-std::string pathsText(Document const& document, long long frames, long long every) {
-    Evaluator evaluator(document);
-    Scene const scene(document, evaluator.root());
-    std::string text;
-    for (long long frame = 0; frame < frames; ++frame) {
-        evaluator.evaluate(frame);
-        if (frame % every != 0) continue;
-        for (Drawn const& drawn : scene.now()) {
-            text += "frame " + std::to_string(frame) + ", " + printable(drawn.name) + ": " +
-                    drawn.data + "\n";
-        }
-    }
-    return text;
 }

@@ -1,4 +1,4 @@
-#include "markup.h"
+#include "animation/markup.h"
 
 #include <Engine/Base/svg_path.h>
 

@@ -3,8 +3,8 @@
 //     Marks const marks = marksOf(before.root, after.root);
 //     Drawing const drawing(marks.shown, marks);
 
-#ifndef DOCUMENT_ROAD_MARKS_H
-#define DOCUMENT_ROAD_MARKS_H
+#ifndef REPORT_MARKS_H
+#define REPORT_MARKS_H
 
 #include <Engine/Base/patch.h>
 #include <Engine/Base/patch_changes.h>

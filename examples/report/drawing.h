@@ -3,13 +3,13 @@
 //     Drawing drawing(document.root);
 //     std::string const svg = drawing.graph(layOut(document.root).front());
 
-#ifndef DOCUMENT_ROAD_DRAWING_H
-#define DOCUMENT_ROAD_DRAWING_H
+#ifndef REPORT_DRAWING_H
+#define REPORT_DRAWING_H
 
-#include "document.h"
-#include "layout.h"
-#include "marks.h"
-#include "scene.h"
+#include "animation/document.h"
+#include "animation/scene.h"
+#include "report/layout.h"
+#include "report/marks.h"
 
 #include <Engine/Base/patch_index.h>
 

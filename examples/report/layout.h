@@ -3,8 +3,8 @@
 //     std::vector<Level> const levels = layOut(document.root);
 //     Box const& box = levels.front().boxes.front();
 
-#ifndef DOCUMENT_ROAD_LAYOUT_H
-#define DOCUMENT_ROAD_LAYOUT_H
+#ifndef REPORT_LAYOUT_H
+#define REPORT_LAYOUT_H
 
 #include <Engine/Base/patch.h>
 
@@ -46,8 +46,7 @@ std::string shortened(std::string const& text, std::size_t longest);
 // How many columns a fixed-width face takes for it.
 std::size_t columnsOf(std::string const& text);
 
-// What a patch is called: its name, or else its kind; and where it is drawn, not longer than that.
-std::string nameOf(tarn::engine::Patch const& patch);
+// What a patch is called where it is drawn: its name, cut to `kLongestLabel`.
 std::string headingOf(tarn::engine::Patch const& patch);
 // "radius Number".
 std::string labelOf(tarn::engine::Port const& port);

@@ -4,10 +4,10 @@
 //     evaluator.evaluate(12);
 //     EvalPort const* port = findOutputPort(evaluator.root(), 34);
 
-#ifndef DOCUMENT_ROAD_EVALUATOR_H
-#define DOCUMENT_ROAD_EVALUATOR_H
+#ifndef ANIMATION_EVALUATOR_H
+#define ANIMATION_EVALUATOR_H
 
-#include "document.h"
+#include "animation/document.h"
 
 #include <Engine/Base/patch.h>
 

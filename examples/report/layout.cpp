@@ -1,6 +1,6 @@
-#include "layout.h"
+#include "report/layout.h"
 
-#include "report.h"
+#include "animation/labels.h"
 
 #include <algorithm>
 #include <chrono>
@@ -228,10 +228,6 @@ std::string shortened(std::string const& text, std::size_t longest) {
         i = end;
     }
     return result + "\u2026";
-}
-
-std::string nameOf(Patch const& patch) {
-    return printable(patch.name.empty() ? kindName(patch) : patch.name);
 }
 
 std::string headingOf(Patch const& patch) { return shortened(nameOf(patch), kLongestLabel); }

@@ -3,8 +3,8 @@
 //     Document document = openDocument("examples/documents/animation.json");
 //     Patch const* patch = findPatchRecursive(document.root, 7);
 
-#ifndef DOCUMENT_ROAD_DOCUMENT_H
-#define DOCUMENT_ROAD_DOCUMENT_H
+#ifndef ANIMATION_DOCUMENT_H
+#define ANIMATION_DOCUMENT_H
 
 #include <Engine/Document/document.h>
 

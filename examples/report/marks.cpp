@@ -1,4 +1,4 @@
-#include "marks.h"
+#include "report/marks.h"
 
 #include <Engine/Base/patch_index.h>
 

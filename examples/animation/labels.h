@@ -1,18 +1,31 @@
-// What the program prints, as texts.
+// What people are shown of patches, ports and values, as strings of one line.
+//
+//     std::cout << nameOf(patch) << ": " << shownValues(port.values) << "\n";
 
-#ifndef DOCUMENT_ROAD_REPORT_H
-#define DOCUMENT_ROAD_REPORT_H
+#ifndef ANIMATION_LABELS_H
+#define ANIMATION_LABELS_H
 
-#include "document.h"
-#include "evaluator.h"
+#include "animation/document.h"
+
+#include <Engine/Base/patch.h>
 
 #include <cstddef>
 #include <functional>
 #include <string>
 #include <vector>
 
+// Every patch with its level, which is 1 for the root, each before its children.
+void forEachPatch(
+    tarn::engine::Patch const& root,
+    std::function<void(tarn::engine::Patch const& patch, std::size_t level)> const& visit);
+
 // A column of a table takes no more bytes.
 constexpr std::size_t kWidestCell = 40;
+// A value on the page takes no more bytes.
+constexpr std::size_t kLongestText = 1000;
+
+// The string, cut between two characters and ended with "..." where it has more bytes.
+std::string cutToBytes(std::string text, std::size_t longest = kWidestCell);
 
 // An output whose values are shown.
 struct ShownOutput {
@@ -31,6 +44,9 @@ std::string shownValues(tarn::engine::Loop const& values, std::size_t longest = 
 // "oscillator".
 std::string kindName(tarn::engine::Patch const& patch);
 
+// Its name, or else its kind.
+std::string nameOf(tarn::engine::Patch const& patch);
+
 // "Number [type: float] from 0 to 1, default 0".
 std::string portTypeText(tarn::engine::Port const& port);
 
@@ -39,16 +55,5 @@ std::string counted(std::size_t count, std::string const& one, std::string const
 
 // How many patches, ports and connections there are, and of which types; what was left out.
 std::string countsText(Document const& document);
-
-// What a patch (a port) is, where it belongs, and what it is connected to. Empty where no patch
-// (port) has the identifier.
-std::string patchText(Document const& document, unsigned long long id);
-std::string portText(Document const& document, unsigned long long id);
-
-// One row for each `every`-th of the frames 0 to `frames` - 1, one column for each of the root's
-// outputs, or for each output without a connection where the root has none. `progress` is called
-// before each frame.
-std::string framesText(Document const& document, long long frames, long long every,
-                       std::function<void(long long frame)> const& progress);
 
 #endif

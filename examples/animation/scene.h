@@ -4,11 +4,11 @@
 //     Scene scene(document, evaluator.root());
 //     for (Drawn const& drawn : scene.now()) std::cout << drawn.name << " " << drawn.data << "\n";
 
-#ifndef DOCUMENT_ROAD_SCENE_H
-#define DOCUMENT_ROAD_SCENE_H
+#ifndef ANIMATION_SCENE_H
+#define ANIMATION_SCENE_H
 
-#include "document.h"
-#include "report.h"
+#include "animation/document.h"
+#include "animation/labels.h"
 
 #include <Engine/Base/path.h>
 
@@ -42,8 +42,5 @@ private:
     std::vector<ShownOutput> paths;
     std::vector<tarn::engine::EvalPatch const*> layers;
 };
-
-// "frame 0, ring: M 5 0 ...", a line for each outline of each `every`-th frame.
-std::string pathsText(Document const& document, long long frames, long long every);
 
 #endif
