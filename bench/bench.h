@@ -1,6 +1,9 @@
-// bench/bench.h: one measured piece of work, done by us and by each of our peers.
+// bench/bench.h: operations, done by us and by each of our peers, every one in a process of its
+// own.
 //
-//     measure("copy numbers", "ours", [] { return numbers(); }, [](auto const& loop) { ... });
+//     operation("copy numbers").ours(on(numbers<Value>, copy)).peer("QVariant",
+//     on(numbers<QVariant>, copy))
+//         .atMost(1.15);
 
 #ifndef TARN_BENCH_BENCH_H
 #define TARN_BENCH_BENCH_H
@@ -8,74 +11,99 @@
 #include <benchmark/benchmark.h>
 
 #include <chrono>
-#include <cstdlib>
-#include <iostream>
+#include <functional>
+#include <memory>
 #include <string>
 #include <utility>
+#include <vector>
 
 namespace bench {
 
-/// What ours may cost, as a multiple: of the best peer, or of the one peer that is named.
-struct Target {
-    std::string operation;
-    double atMost;
-    std::string against;
+/// Runs what is measured as often as asked for, and gives a figure for each time: microseconds, or
+/// what the figure is in.
+using Implementation = std::function<std::vector<double>(int repetitions)>;
+
+/// Times `run`, which gives the seconds that one iteration took, with Google Benchmark.
+std::vector<double> timed(int repetitions, std::function<double()> const& run);
+
+/// The seconds that `work(input)` takes. It returns what it made, so that its destruction is not
+/// timed.
+template <class Work, class Input>
+double secondsOf(Work const& work, Input& input) {
+    auto const start = std::chrono::steady_clock::now();
+    auto result = work(input);
+    benchmark::DoNotOptimize(result);
+    benchmark::ClobberMemory();
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+}
+
+/// `work` on one input, made before.
+template <class Make, class Work>
+Implementation on(Make make, Work work) {
+    return [=](int repetitions) {
+        auto const input = make();
+        return timed(repetitions, [&] { return secondsOf(work, input); });
+    };
+}
+
+/// `work` on an input of its own each time. Making that is not timed.
+template <class Make, class Work>
+Implementation onEach(Make make, Work work) {
+    return [=](int repetitions) {
+        return timed(repetitions, [&] {
+            auto input = make();
+            return secondsOf(work, input);
+        });
+    };
+}
+
+/// `work` without an input.
+template <class Work>
+Implementation doing(Work work) {
+    return on([] { return 0; }, [work](int) { return work(); });
+}
+
+/// Something that is no time, such as a number of bytes.
+template <class Figure>
+Implementation figure(Figure figure) {
+    return [=](int) { return std::vector<double>{figure()}; };
+}
+
+/// A row of the table.
+struct Operation {
+    /// Who does it, and how; ours is first.
+    struct Entry {
+        std::string who;
+        Implementation run;
+    };
+
+    Operation& ours(Implementation run) { return peer("ours", std::move(run)); }
+    Operation& peer(std::string who, Implementation run);
+    /// What ours may cost, as a multiple of the best peer or of the one that is named.
+    Operation& atMost(double multiple, std::string peerName = "");
+    /// One of the rows that `--quick` measures.
+    Operation& quick();
+
+    std::string name;
+    std::vector<Entry> entries = {};
+    double target = 0.0;
+    std::string against = {};
+    bool isQuick = false;
 };
 
-/// States a target. Operations without one are measured for the record.
-void target(std::string operation, double atMost, std::string against = "the best");
+/// The row of this name, which is made where there is none.
+Operation& operation(std::string const& name);
+
+/// Something that is checked before anything is measured: that peers and library agree.
+void agreement(std::function<void()> check);
 
 /// Stops the program where peers and library do not agree on a result.
-inline void agree(bool same, char const* what) {
-    if (same) return;
-    std::cerr << "no agreement: " << what << "\n";
-    std::exit(1);
-}
+void agree(bool same, char const* what);
 
-/// Puts the operation in its place in the table: that of its first mention.
-void announce(std::string const& operation);
+/// The bytes of the heap that are in use.
+double heapBytes();
 
-/// Registers `work`, which is timed, on what `prepare` makes, which is not. `work` returns what it
-/// made, so that its destruction is not timed either.
-template <class Prepare, class Work>
-void measure(std::string const& operation, std::string const& who, Prepare prepare, Work work) {
-    announce(operation);
-    benchmark::RegisterBenchmark((operation + "|" + who).c_str(),
-                                 [=](benchmark::State& state) {
-                                     for (auto _ : state) {
-                                         auto input = prepare();
-                                         auto const start = std::chrono::steady_clock::now();
-                                         auto result = work(input);
-                                         benchmark::DoNotOptimize(result);
-                                         benchmark::ClobberMemory();
-                                         auto const end = std::chrono::steady_clock::now();
-                                         state.SetIterationTime(
-                                             std::chrono::duration<double>(end - start).count());
-                                     }
-                                 })
-        ->UseManualTime()
-        ->Unit(benchmark::kMicrosecond);
-}
-
-/// The same for work whose input stays as it is, prepared once.
-template <class Input, class Work>
-void measureOn(std::string const& operation, std::string const& who, Input const& input,
-               Work work) {
-    measure(
-        operation, who, [&input] { return &input; }, [work](Input const* in) { return work(*in); });
-}
-
-/// Whether the operation is one of those that were asked for.
-bool isWanted(std::string const& operation);
-
-/// Microseconds that the operation ("read", "parse", "write" or "dump") takes on the document in
-/// that file. For a process that does nothing else.
-double documentOperation(std::string const& operation, std::string const& file);
-
-/// A figure that is no time, such as bytes, shown beside the others.
-void record(std::string operation, std::string who, double figure);
-
-// One for each subject: checks that everyone agrees, then registers what is measured.
+// One for each subject.
 void values();
 void texts();
 void data();

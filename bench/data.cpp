@@ -12,9 +12,9 @@
 #include <QJsonObject>
 #include <QJsonValue>
 
-#include <malloc.h>
-
+#include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 using namespace tarn::engine;
@@ -50,37 +50,38 @@ struct QtJson {
     static Node list(List&& l) { return l; }
 };
 
-double heapBytes(double before) {
-    auto const info = mallinfo2();
-    return static_cast<double>(info.uordblks + info.hblkhd) - before;
-}
-
 template <class Library, class Make>
 void forDocument(std::string const& kind, std::string const& who, Make make) {
     using Node = typename Library::Node;
-    bench::measure(
-        "build " + kind, who, [] { return 0; }, [make](int) { return make(); });
-    static std::map<std::string, Node> nodes;
-    double const before = heapBytes(0);
-    Node const& node = nodes.emplace(kind, make()).first->second;
-    bench::record("heap bytes of " + kind, who, heapBytes(before));
-    bench::measureOn("copy " + kind, who, node, [](Node const& n) {
-        Node copy = n;
-        return copy;
-    });
-    static std::map<std::string, Node> twins;
-    Node const& twin = twins.emplace(kind, make()).first->second;
-    bench::measureOn("== of " + kind, who, node, [&twin](Node const& n) {
-        bool const equal = n == twin;
-        bench::agree(equal, "equality of documents");
-        return equal;
-    });
-    bench::measure(
-        "destroy " + kind, who, [make] { return std::make_unique<Node>(make()); },
-        [](std::unique_ptr<Node>& n) {
-            n.reset();
-            return 0;
-        });
+    using Pair = std::pair<Node, Node>;
+    bench::operation("build " + kind).peer(who, bench::doing(make));
+    bench::operation("heap bytes of " + kind).peer(who, bench::figure([make] {
+                                                       double const before = bench::heapBytes();
+                                                       Node const node = make();
+                                                       return bench::heapBytes() - before;
+                                                   }));
+    bench::operation("copy " + kind).peer(who, bench::on(make, [](Node const& node) {
+                                              return Node(node);
+                                          }));
+    // Each copy gets the blocks that the one before has left.
+    bench::operation("copy and destroy " + kind).peer(who, bench::on(make, [](Node const& node) {
+                                                          Node copy = node;
+                                                          benchmark::DoNotOptimize(copy);
+                                                          return 0;
+                                                      }));
+    bench::operation("== of " + kind)
+        .peer(who, bench::on([make] { return std::make_unique<Pair>(make(), make()); },
+                             [](std::unique_ptr<Pair> const& both) {
+                                 bool const equal = both->first == both->second;
+                                 bench::agree(equal, "equality of documents");
+                                 return equal;
+                             }));
+    bench::operation("destroy " + kind)
+        .peer(who, bench::onEach([make] { return std::make_unique<Node>(make()); },
+                                 [](std::unique_ptr<Node>& node) {
+                                     node.reset();
+                                     return 0;
+                                 }));
 }
 
 template <class Library>
@@ -114,12 +115,12 @@ void rapid() {
         }
         return document;
     };
-    bench::measure(
-        "build objects", "RapidJSON", [] { return 0; }, [make](int) { return make(); });
-    bench::measure("destroy objects", "RapidJSON", make, [](std::unique_ptr<Document>& d) {
-        d.reset();
-        return 0;
-    });
+    bench::operation("build objects").peer("RapidJSON", bench::doing(make));
+    bench::operation("destroy objects")
+        .peer("RapidJSON", bench::onEach(make, [](std::unique_ptr<Document>& document) {
+                  document.reset();
+                  return 0;
+              }));
 }
 
 template <class Library>
@@ -142,18 +143,25 @@ void bench::data() {
     forDocument<Boosted>("a catalogue", "Boost.JSON", Boosted::catalogue);
 #endif
     rapid();
-    static auto const ours = objects<Ours>();
-    static auto const theirs = objects<Nlohmann>();
-    agree(readObjects<Ours>(ours) == readObjects<Nlohmann>(theirs), "readings of documents");
-    measureOn("read objects, three levels down", "ours", ours, readObjects<Ours>);
-    measureOn("read objects, three levels down", "nlohmann", theirs, readObjects<Nlohmann>);
-    target("read objects, three levels down", 0.9, "nlohmann");
+    agreement([] {
+        agree(readObjects<Ours>(objects<Ours>()) == readObjects<Nlohmann>(objects<Nlohmann>()),
+              "readings of documents");
+    });
+    operation("read objects, three levels down")
+        .ours(on(objects<Ours>, readObjects<Ours>))
+        .peer("nlohmann", on(objects<Nlohmann>, readObjects<Nlohmann>))
+        .atMost(0.9)
+        .quick();
     for (std::string const kind : {"objects", "lists of numbers", "a catalogue"}) {
         bool const flat = kind == "lists of numbers";
-        target("build " + kind, 1.0, "nlohmann");
-        target("copy " + kind, 0.9, "nlohmann");
-        target("== of " + kind, flat ? 1.5 : 1.0, "nlohmann");
-        target("destroy " + kind, 0.6, "nlohmann");
-        target("heap bytes of " + kind, flat ? 1.5 : 1.05, "nlohmann");
+        operation("build " + kind).atMost(1.0, "nlohmann");
+        operation("copy " + kind).atMost(0.9, "nlohmann");
+        operation("== of " + kind).atMost(1.0, "nlohmann");
+        operation("destroy " + kind).atMost(0.6, "nlohmann");
+        operation("heap bytes of " + kind).atMost(flat ? 1.5 : 1.05, "nlohmann");
     }
+    operation("copy and destroy a catalogue").atMost(0.85, "nlohmann").quick();
+    operation("copy and destroy objects").atMost(0.7, "nlohmann").quick();
+    operation("copy and destroy lists of numbers").atMost(0.6, "nlohmann");
+    operation("build objects").quick();
 }

@@ -74,8 +74,8 @@ std::vector<double> const& progress() {
 }
 
 template <class Curves, class Ease>
-void over(std::string const& operation, std::string const& who, Curves const& curves, Ease ease) {
-    bench::measureOn(operation, who, progress(), [&curves, ease](std::vector<double> const& list) {
+bench::Implementation over(Curves const& curves, Ease ease) {
+    return bench::on(progress, [&curves, ease](std::vector<double> const& list) {
         double sum = 0.0;
         for (EF const f : curves) {
             for (double const t : list) sum += ease(f, t);
@@ -97,11 +97,13 @@ Small dispatched(EF f, Small const& from, Small const& to, double t) {
 }  // namespace
 
 void bench::easing() {
-    for (EF const f : kAll) {
-        for (double const t : progress()) {
-            agree(ease(f, 3.0, 7.0, t) == inlined(f, 3.0, 7.0, t), "easing");
+    agreement([] {
+        for (EF const f : kAll) {
+            for (double const t : progress()) {
+                agree(ease(f, 3.0, 7.0, t) == inlined(f, 3.0, 7.0, t), "easing");
+            }
         }
-    }
+    });
     static QEasingCurve const curves[] = {
         QEasingCurve::Linear,     QEasingCurve::InQuad,  QEasingCurve::OutQuad,
         QEasingCurve::InOutQuad,  QEasingCurve::InCubic, QEasingCurve::OutCubic,
@@ -113,29 +115,35 @@ void bench::easing() {
     auto const qt = [](EF f, double t) {
         return 3.0 + 4.0 * curves[static_cast<int>(f)].valueForProgress(t);
     };
-    std::string const all = "ease 13,000 doubles, all curves";
-    over(all, "ours", kAll, ours);
-    over(all, "inlined formulas", kAll, limit);
-    over(all, "QEasingCurve", kAll, qt);
-    target(all, 1.15, "inlined formulas");
-    std::string const cubics = "ease 3,000 doubles, cubics";
-    over(cubics, "ours", kCubics, ours);
-    over(cubics, "inlined formulas", kCubics, limit);
-    over(cubics, "QEasingCurve", kCubics, qt);
-    target(cubics, 1.2, "inlined formulas");
-    std::string const vectors = "ease 13,000 FloatVec4";
+    std::string const formulas = "inlined formulas";
+    operation("ease 13,000 doubles, all curves")
+        .ours(over(kAll, ours))
+        .peer(formulas, over(kAll, limit))
+        .peer("QEasingCurve", over(kAll, qt))
+        .atMost(1.15, formulas)
+        .quick();
+    operation("ease 3,000 doubles, cubics")
+        .ours(over(kCubics, ours))
+        .peer(formulas, over(kCubics, limit))
+        .peer("QEasingCurve", over(kCubics, qt))
+        .atMost(1.2, formulas);
     FloatVec4 const a{1, 2, 3, 4};
     FloatVec4 const b{5, 7, 9, 11};
-    over(vectors, "ours", kAll, [=](EF f, double t) { return ease(f, a, b, t).w; });
-    over(vectors, "inlined formulas", kAll, [=](EF f, double t) { return inlined(f, a, b, t).w; });
-    target(vectors, 1.5, "inlined formulas");
-    std::string const dispatcher = "ease 13,000 values of doubles";
+    operation("ease 13,000 FloatVec4")
+        .ours(over(kAll, [=](EF f, double t) { return ease(f, a, b, t).w; }))
+        .peer(formulas, over(kAll, [=](EF f, double t) { return inlined(f, a, b, t).w; }))
+        .atMost(1.3)
+        .quick();
     static Value const from = 3.0;
     static Value const to = 7.0;
     static Small const smallFrom = 3.0;
     static Small const smallTo = 7.0;
-    over(dispatcher, "ours", kAll, [](EF f, double t) { return double(ease(f, from, to, t)); });
-    over(dispatcher, "std::variant and a switch", kAll,
-         [](EF f, double t) { return std::get<double>(dispatched(f, smallFrom, smallTo, t)); });
-    target(dispatcher, 2.0, "std::variant and a switch");
+    operation("ease 13,000 values of doubles")
+        .ours(over(kAll, [](EF f, double t) { return double(ease(f, from, to, t)); }))
+        .peer("std::variant and a switch",
+              over(kAll,
+                   [](EF f, double t) {
+                       return std::get<double>(dispatched(f, smallFrom, smallTo, t));
+                   }))
+        .atMost(2.0);
 }

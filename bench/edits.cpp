@@ -5,9 +5,6 @@
 #include <Engine/Base/patch_edit.h>
 #include <Engine/Base/patch_index.h>
 
-#include <malloc.h>
-
-#include <map>
 #include <memory>
 #include <ostream>
 #include <streambuf>
@@ -22,11 +19,6 @@ namespace {
 constexpr std::size_t kPatches = 100000;
 constexpr std::size_t kMany = 1000000;
 constexpr std::size_t kGroup = 100;
-
-double heapBytes() {
-    struct mallinfo2 const info = mallinfo2();
-    return static_cast<double>(info.uordblks + info.hblkhd);
-}
 
 // The root with another default value of the input of the patch `id`, or of the next one where that
 // is a group.
@@ -57,14 +49,6 @@ struct Document {
     bool isSecond = false;
 };
 
-// Made when it is first asked for: the large ones take a while.
-Document& document(std::size_t patches, std::size_t groupSize) {
-    static std::map<std::pair<std::size_t, std::size_t>, std::unique_ptr<Document>> made;
-    std::unique_ptr<Document>& found = made[{patches, groupSize}];
-    if (found == nullptr) found = std::make_unique<Document>(patches, groupSize);
-    return *found;
-}
-
 struct NullBuffer : std::streambuf {
     std::streamsize xsputn(char const*, std::streamsize n) override { return n; }
     int overflow(int c) override { return c; }
@@ -88,55 +72,56 @@ auto text(Document& d) {
 }
 
 template <class Work>
-void measure(std::string const& operation, std::string const& who, std::size_t patches,
-             std::size_t groupSize, Work work) {
-    bench::measure(
-        operation, who, [=] { return &document(patches, groupSize); },
-        [work](Document* d) { return work(*d); });
+bench::Implementation onDocument(std::size_t patches, std::size_t groupSize, Work work) {
+    return bench::on([=] { return std::make_unique<Document>(patches, groupSize); },
+                     [work](std::unique_ptr<Document> const& document) { return work(*document); });
 }
 
 // Beside building the index, which is what an edit cost before.
 template <class Work>
 void besideAnIndex(std::string const& name, std::size_t groupSize, double atMost, Work work) {
-    std::string const operation =
-        name + ", 100,000 patches " + (groupSize == kPatches ? "in one list" : "in groups");
-    measure(operation, "ours", kPatches, groupSize, work);
-    measure(operation, "building an index", kPatches, groupSize, build);
-    bench::target(operation, atMost, "building an index");
+    bench::operation(name + ", 100,000 patches " +
+                     (groupSize == kPatches ? "in one list" : "in groups"))
+        .ours(onDocument(kPatches, groupSize, work))
+        .peer("building an index", onDocument(kPatches, groupSize, build))
+        .atMost(atMost);
 }
 
 // A document of ten times the size, beside ten times the work on the smaller one.
 template <class Work>
 void ofMany(std::string const& name, Work work) {
-    std::string const operation = name + ", 1,000,000 patches in groups";
-    measure(operation, "ours", kMany, kGroup, work);
-    measure(operation, "ten times 100,000", kPatches, kGroup, [work](Document& d) {
-        for (int i = 0; i < 9; ++i) benchmark::DoNotOptimize(work(d));
-        return work(d);
-    });
-    bench::target(operation, 1.5, "ten times 100,000");
+    bench::operation(name + ", 1,000,000 patches in groups")
+        .ours(onDocument(kMany, kGroup, work))
+        .peer("ten times 100,000", onDocument(kPatches, kGroup,
+                                              [work](Document& d) {
+                                                  for (int i = 0; i < 9; ++i) {
+                                                      benchmark::DoNotOptimize(work(d));
+                                                  }
+                                                  return work(d);
+                                              }))
+        .atMost(1.5);
 }
 
 void memory() {
     for (std::size_t const patches : {kPatches, kMany}) {
-        std::string const operation =
-            "bytes a patch, " + std::to_string(patches) + " patches with two ports";
-        if (!bench::isWanted(operation)) continue;
-        double const before = heapBytes();
-        Patch const root = bench::documentOf(patches, kGroup);
-        bench::record(operation, "ours", (heapBytes() - before) / static_cast<double>(patches));
+        bench::operation("bytes a patch, " + std::to_string(patches) + " patches with two ports")
+            .ours(bench::figure([patches] {
+                double const before = bench::heapBytes();
+                Patch const root = bench::documentOf(patches, kGroup);
+                return (bench::heapBytes() - before) / static_cast<double>(patches);
+            }));
     }
-    std::string const step = "bytes of an undo step, 100,000 patches in groups";
-    if (!bench::isWanted(step)) return;
-    PatchIndex index(bench::documentOf(kPatches, kGroup));
-    std::vector<Patch> history;
-    history.reserve(1001);
-    double const before = heapBytes();
-    for (unsigned long long i = 0; i < 1000; ++i) {
-        history.push_back(index.root());
-        index.update(edited(index, i * 97 + 7, 0.5));
-    }
-    bench::record(step, "ours", (heapBytes() - before) / 1000);
+    bench::operation("bytes of an undo step, 100,000 patches in groups").ours(bench::figure([] {
+        PatchIndex index(bench::documentOf(kPatches, kGroup));
+        std::vector<Patch> history;
+        history.reserve(1001);
+        double const before = bench::heapBytes();
+        for (unsigned long long i = 0; i < 1000; ++i) {
+            history.push_back(index.root());
+            index.update(edited(index, i * 97 + 7, 0.5));
+        }
+        return (bench::heapBytes() - before) / 1000;
+    }));
 }
 
 }  // namespace

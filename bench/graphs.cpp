@@ -3,11 +3,12 @@
 #include <Engine/Base/patch.h>
 #include <Engine/Base/patch_index.h>
 
-#include <malloc.h>
-
+#include <memory>
 #include <ostream>
 #include <streambuf>
 #include <string>
+#include <unordered_map>
+#include <utility>
 #include <vector>
 
 using namespace tarn::engine;
@@ -131,117 +132,200 @@ void flatText(Flat const& flat, std::ostream& stream) {
     }
 }
 
-void forSize(std::size_t size) {
-    static std::vector<std::unique_ptr<Patch>> trees;
-    static std::vector<std::unique_ptr<Flat>> flats;
-    auto const keepTree = [](Patch patch) -> Patch const& {
-        trees.push_back(std::make_unique<Patch>(std::move(patch)));
-        return *trees.back();
-    };
-    Patch const& root = keepTree(tree(size));
-    Patch const& twin = keepTree(tree(size));
-    auto const keepFlat = [](Patch const& patch) -> Flat const& {
-        flats.push_back(std::make_unique<Flat>());
-        flatten(patch, 0, *flats.back());
-        return *flats.back();
-    };
-    Flat const& flat = keepFlat(root);
-    Flat const& flatTwin = keepFlat(root);
-    bench::agree(flat.patches.size() == size, "the size of a tree");
-    std::string const of = ", " + std::to_string(size) + " patches";
+Flat flatOf(Patch const& root) {
+    Flat flat;
+    flatten(root, 0, flat);
+    return flat;
+}
 
-    bench::measureOn("== unshared" + of, "ours", root,
-                     [&twin](Patch const& p) { return p == twin; });
-    bench::measureOn("== unshared" + of, "flat arrays", flat,
-                     [&flatTwin](Flat const& f) { return flatEqual(f, flatTwin); });
-    bench::target("== unshared" + of, 12.0);
+// An index as one would write it, with the same answers.
+struct Maps {
+    using Id = unsigned long long;
+    std::unordered_map<Id, std::pair<Patch const*, Patch const*>> patches;
+    std::unordered_map<Id, std::pair<Port const*, Patch const*>> inputs;
+    std::unordered_map<Id, std::pair<Port const*, Patch const*>> outputs;
+    std::unordered_map<Id, Connection const*> toPort;
+    std::unordered_map<Id, std::vector<Connection const*>> fromPort;
+    std::unordered_map<Id, std::vector<Connection const*>> toPatch;
+    std::unordered_map<Id, std::vector<Connection const*>> fromPatch;
 
-    bench::measureOn("convert for evaluation" + of, "ours", root,
-                     [](Patch const& p) { return EvalPatch(p); });
-    bench::measureOn("convert for evaluation" + of, "flat arrays", flat,
-                     [](Flat const& f) { return f; });
-    bench::target("convert for evaluation" + of, 13.0);
-
-    bench::measureOn("debug text" + of, "ours", root, [](Patch const& p) {
-        NullBuffer buffer;
-        std::ostream stream(&buffer);
-        stream << p;
-        return stream.good();
-    });
-    bench::measureOn("debug text" + of, "flat arrays", flat, [](Flat const& f) {
-        NullBuffer buffer;
-        std::ostream stream(&buffer);
-        flatText(f, stream);
-        return stream.good();
-    });
-    bench::target("debug text" + of, 1.9);
-
-    bench::measureOn("walk to the last patch" + of, "ours", root,
-                     [size](Patch const& p) { return findPatchRecursive(p, size); });
-    bench::measureOn("walk to the last patch" + of, "flat arrays", flat, [size](Flat const& f) {
-        for (auto const& item : f.patches) {
-            if (item.id == size) return &item;
+    void add(Patch const& patch, Patch const* parent) {
+        patches.emplace(patch.id, std::pair(&patch, parent));
+        for (Port const& p : *patch.inputs) inputs.emplace(p.id, std::pair(&p, &patch));
+        for (Port const& p : *patch.outputs) outputs.emplace(p.id, std::pair(&p, &patch));
+        for (Connection const& c : *patch.connections) {
+            toPort.emplace(c.toPortId, &c);
+            fromPort[c.fromPortId].push_back(&c);
+            toPatch[c.toPatchId].push_back(&c);
+            fromPatch[c.fromPatchId].push_back(&c);
         }
-        return static_cast<Flat::Item const*>(nullptr);
-    });
-    bench::target("walk to the last patch" + of, 45.0);
-
-    bench::measureOn(
-        "outgoing connections of a deep port" + of, "ours", root,
-        [size](Patch const& p) { return findOutgoingConnectionsFromPort(p, (size - 1) * 2 + 1); });
-    bench::measureOn("outgoing connections of a deep port" + of, "flat arrays", flat,
-                     [size](Flat const& f) {
-                         std::vector<Connection> found;
-                         for (auto const& c : f.connections) {
-                             if (c.fromPortId == (size - 1) * 2 + 1) found.push_back(c);
-                         }
-                         return found;
-                     });
-    bench::target("outgoing connections of a deep port" + of, 75.0);
-
-    bench::measureOn("build an index" + of, "ours", root,
-                     [](Patch const& p) { return PatchIndex(p); });
-    bench::measureOn("build an index" + of, "a walk that finds nothing", root,
-                     [](Patch const& p) { return findPatchRecursive(p, ~0ULL); });
-    bench::target("build an index" + of, 3.0, "a walk that finds nothing");
-
-    static std::vector<std::unique_ptr<PatchIndex>> indexes;
-    double const before = static_cast<double>(mallinfo2().uordblks + mallinfo2().hblkhd);
-    indexes.push_back(std::make_unique<PatchIndex>(root));
-    double const bytes = static_cast<double>(mallinfo2().uordblks + mallinfo2().hblkhd) - before;
-    bench::record("bytes of an index" + of, "ours", bytes);
-    bench::record("bytes of an index" + of, "64 a patch, 24 a port and a connection",
-                  static_cast<double>(64 * size + 48 * size + 24 * flat.connections.size()));
-    bench::target("bytes of an index" + of, 1.0, "64 a patch, 24 a port and a connection");
-
-    PatchIndex const& index = *indexes.back();
-    // 1,000 identifiers all over the tree: nanoseconds each.
-    std::string const lookups = "1,000 lookups of patches" + of;
-    bench::measureOn(lookups, "ours", index, [size](PatchIndex const& i) {
-        std::size_t sum = 0;
-        for (std::size_t n = 0; n < 1000; ++n) {
-            sum += reinterpret_cast<std::size_t>(i.findPatch(n * 7919 % size + 1));
-        }
-        return sum;
-    });
-    bench::measureOn("1,000 lookups of connections" + of, "ours", index,
-                     [size](PatchIndex const& i) {
-                         std::size_t sum = 0;
-                         for (std::size_t n = 0; n < 1000; ++n) {
-                             sum += i.outgoingConnections((n * 7919 % size + 1) * 2 + 1).size();
-                         }
-                         return sum;
-                     });
-    for (std::string const what : {"patches", "connections"}) {
-        bench::record("1,000 lookups of " + what + of, "100 ns each", 100.0);
-        bench::target("1,000 lookups of " + what + of, 1.0, "100 ns each");
+        for (Patch const& child : *patch.children) add(child, &patch);
     }
+};
+
+Maps mapsOf(Patch const& root) {
+    Maps maps;
+    maps.add(root, nullptr);
+    return maps;
+}
+
+// A graph and the flat form of it are the inputs of what is measured.
+struct Inputs {
+    explicit Inputs(std::size_t patches) : size(patches) {}
+
+    template <class Work>
+    bench::Implementation graph(Work work) const {
+        return bench::on([size = size] { return tree(size); }, work);
+    }
+    template <class Work>
+    bench::Implementation flat(Work work) const {
+        return bench::on([size = size] { return flatOf(tree(size)); }, work);
+    }
+    bench::Operation& operation(std::string const& name) const {
+        return bench::operation(name + ", " + std::to_string(size) + " patches");
+    }
+
+    std::size_t size;
+};
+
+void wholeGraphs(Inputs const& in) {
+    std::size_t const size = in.size;
+    bench::agreement(
+        [size] { bench::agree(flatOf(tree(size)).patches.size() == size, "the size of a tree"); });
+    auto const pair = [size] { return std::pair(tree(size), tree(size)); };
+    auto const flatPair = [pair] {
+        auto const [a, b] = pair();
+        return std::pair(flatOf(a), flatOf(b));
+    };
+    in.operation("== unshared")
+        .ours(bench::on(pair, [](auto const& both) { return both.first == both.second; }))
+        .peer("flat arrays", bench::on(flatPair, [](auto const& both) {
+                  return flatEqual(both.first, both.second);
+              }));
+    in.operation("convert for evaluation")
+        .ours(in.graph([](Patch const& root) { return EvalPatch(root); }))
+        .peer("flat arrays", in.flat([](Flat const& flat) { return flat; }));
+    in.operation("debug text")
+        .ours(in.graph([](Patch const& root) {
+            NullBuffer buffer;
+            std::ostream stream(&buffer);
+            stream << root;
+            return stream.good();
+        }))
+        .peer("flat arrays", in.flat([](Flat const& flat) {
+            NullBuffer buffer;
+            std::ostream stream(&buffer);
+            flatText(flat, stream);
+            return stream.good();
+        }));
+    in.operation("bytes")
+        .ours(bench::figure([size] {
+            double const before = bench::heapBytes();
+            Patch const root = tree(size);
+            return bench::heapBytes() - before;
+        }))
+        .peer("flat arrays", bench::figure([size] {
+                  Patch const root = tree(size);
+                  Flat const flat = flatOf(root);
+                  double const before = bench::heapBytes();
+                  Flat const copy = flat;
+                  return bench::heapBytes() - before;
+              }));
+}
+
+void walks(Inputs const& in) {
+    std::size_t const size = in.size;
+    in.operation("walk to the last patch")
+        .ours(in.graph([size](Patch const& root) { return findPatchRecursive(root, size); }))
+        .peer("flat arrays", in.flat([size](Flat const& flat) {
+            for (auto const& item : flat.patches) {
+                if (item.id == size) return &item;
+            }
+            return static_cast<Flat::Item const*>(nullptr);
+        }));
+    unsigned long long const port = (size - 1) * 2 + 1;
+    in.operation("outgoing connections of a deep port")
+        .ours(in.graph(
+            [port](Patch const& root) { return findOutgoingConnectionsFromPort(root, port); }))
+        .peer("flat arrays", in.flat([port](Flat const& flat) {
+            std::vector<Connection> found;
+            for (auto const& c : flat.connections) {
+                if (c.fromPortId == port) found.push_back(c);
+            }
+            return found;
+        }));
+}
+
+void indexes(Inputs const& in) {
+    std::size_t const size = in.size;
+    std::string const maps = "std::unordered_map";
+    auto const bytes = [size](auto build) {
+        return bench::figure([size, build] {
+            Patch const root = tree(size);
+            double const before = bench::heapBytes();
+            auto const index = build(root);
+            return bench::heapBytes() - before;
+        });
+    };
+    auto const build = [](Patch const& root) { return PatchIndex(root); };
+    in.operation("build an index").ours(in.graph(build)).peer(maps, in.graph(mapsOf)).atMost(0.5);
+    in.operation("bytes of an index").ours(bytes(build)).peer(maps, bytes(mapsOf)).atMost(0.6);
+    // Identifiers all over the tree.
+    auto const lookups = [size](auto const& make, auto const& lookUp) {
+        return bench::on(
+            [size, make] {
+                auto root = std::make_unique<Patch const>(tree(size));
+                auto index = make(*root);
+                return std::pair(std::move(root), std::move(index));
+            },
+            [size, lookUp](auto const& made) {
+                std::size_t sum = 0;
+                for (std::size_t n = 0; n < 1000; ++n) {
+                    sum += lookUp(made.second, n * 7919 % size + 1);
+                }
+                return sum;
+            });
+    };
+    in.operation("1,000 lookups of patches")
+        .ours(lookups(build,
+                      [](PatchIndex const& index, std::size_t id) {
+                          return reinterpret_cast<std::size_t>(index.findPatch(id));
+                      }))
+        .peer(maps, lookups(mapsOf,
+                            [](Maps const& index, std::size_t id) {
+                                return reinterpret_cast<std::size_t>(
+                                    index.patches.find(id)->second.first);
+                            }))
+        .atMost(1.0);
+    in.operation("1,000 lookups of connections")
+        .ours(lookups(build,
+                      [](PatchIndex const& index, std::size_t id) {
+                          return index.outgoingConnections(id * 2 + 1).size();
+                      }))
+        .peer(maps, lookups(mapsOf,
+                            [](Maps const& index, std::size_t id) {
+                                auto const found = index.fromPort.find(id * 2 + 1);
+                                return found == index.fromPort.end() ? 0 : found->second.size();
+                            }))
+        .atMost(1.0);
 }
 
 }  // namespace
 
 void bench::graphs() {
-    forSize(1000);
-    forSize(10000);
-    forSize(100000);
+    for (std::size_t const size : {1000, 10000, 100000}) {
+        Inputs const in(size);
+        wholeGraphs(in);
+        walks(in);
+        indexes(in);
+    }
+    Inputs const middle(10000);
+    middle.operation("== unshared").atMost(14.0).quick();
+    middle.operation("convert for evaluation").atMost(12.0).quick();
+    middle.operation("bytes").atMost(3.0).quick();
+    Inputs const large(100000);
+    large.operation("walk to the last patch").atMost(40.0).quick();
+    large.operation("outgoing connections of a deep port").atMost(60.0).quick();
+    large.operation("build an index").quick();
+    large.operation("1,000 lookups of connections").quick();
 }

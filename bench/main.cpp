@@ -1,18 +1,24 @@
 // Measures the library beside what its users would otherwise pick, and prints one table.
 //
-//     bench [--benchmark_filter=REGEX] [--benchmark_repetitions=N]
+//     bench --quick --compare docs/benchmark.md
 
 #include "bench.h"
+#include "processes.h"
+#include "table.h"
+
+#include <CLI/CLI.hpp>
 
 #include <malloc.h>
 
 #include <algorithm>
 #include <atomic>
 #include <cstdio>
-#include <map>
+#include <cstdlib>
+#include <deque>
+#include <iostream>
+#include <random>
 #include <regex>
 #include <string>
-#include <string_view>
 #include <thread>
 #include <vector>
 
@@ -20,113 +26,99 @@ namespace bench {
 
 namespace {
 
-std::vector<Target>& targets() {
-    static std::vector<Target> list;
+std::deque<Operation>& operations() {
+    static std::deque<Operation> list;
     return list;
 }
 
-std::string& filter() {
-    static std::string pattern;
-    return pattern;
-}
-
-// By operation, then by who did it: the time of each repetition.
-using Times = std::map<std::string, std::vector<double>>;
-
-struct Operation {
-    std::string name;
-    std::vector<std::string> order;
-    Times times;
-};
-
-std::vector<Operation>& operations() {
-    static std::vector<Operation> list;
+std::vector<std::function<void()>>& agreements() {
+    static std::vector<std::function<void()>> list;
     return list;
 }
 
-Operation& operationNamed(std::string const& name) {
-    auto found = std::find_if(operations().begin(), operations().end(),
-                              [&](Operation const& o) { return o.name == name; });
-    if (found != operations().end()) return *found;
-    operations().push_back({name, {}, {}});
-    return operations().back();
+void describeAll() {
+    values();
+    texts();
+    data();
+    paths();
+    easing();
+    graphs();
+    edits();
+    documentFiles();
 }
 
-std::vector<double>& timesOf(std::string const& operation, std::string const& who) {
-    Operation& named = operationNamed(operation);
-    if (named.times.count(who) == 0) named.order.push_back(who);
-    return named.times[who];
+// What a process of its own does: one implementation of one operation.
+int runOne(std::string const& name, std::string const& who, int repetitions) {
+    for (Operation::Entry const& entry : operation(name).entries) {
+        if (entry.who != who) continue;
+        for (double const figure : entry.run(repetitions)) std::printf("%.17g\n", figure);
+        return 0;
+    }
+    return 1;
 }
 
-double median(std::vector<double> values) {
-    std::sort(values.begin(), values.end());
-    return values[values.size() / 2];
-}
-
-double minimum(std::vector<double> const& values) {
-    return *std::min_element(values.begin(), values.end());
-}
-
-class Collector : public benchmark::BenchmarkReporter {
-public:
-    bool ReportContext(Context const&) override { return true; }
-    void ReportRuns(std::vector<Run> const& runs) override {
-        for (Run const& run : runs) {
-            if (run.run_type != Run::RT_Iteration) continue;
-            std::string const& name = run.run_name.function_name;
-            std::size_t const bar = name.find('|');
-            timesOf(name.substr(0, bar), name.substr(bar + 1)).push_back(run.GetAdjustedRealTime());
+// All implementations of an operation, in another order in each round.
+Row measured(Operation const& operation, int rounds, int repetitions) {
+    static std::mt19937 random(1);
+    Row row{operation.name, {}, operation.target, operation.against};
+    for (Operation::Entry const& entry : operation.entries) row.results.push_back({entry.who, {}});
+    std::vector<std::size_t> order(row.results.size());
+    for (std::size_t i = 0; i < order.size(); ++i) order[i] = i;
+    for (int round = 0; round < rounds; ++round) {
+        std::shuffle(order.begin(), order.end(), random);
+        for (std::size_t const i : order) {
+            Result& result = row.results[i];
+            for (double const figure : figuresOfProcess(
+                     {"--run", operation.name, result.who, std::to_string(repetitions)})) {
+                result.figures.push_back(figure);
+            }
         }
-        std::fprintf(stderr, ".");
     }
-};
+    std::fprintf(stderr, ".");
+    return row;
+}
 
-void printOperation(Operation const& operation) {
-    auto const ours = operation.times.find("ours");
-    if (ours == operation.times.end()) return;
-    double best = 0.0;
-    std::string peers;
-    for (std::string const& who : operation.order) {
-        std::vector<double> const& times = operation.times.at(who);
-        if (who == "ours") continue;
-        double const time = median(times);
-        best = best == 0.0 ? time : std::min(best, time);
-        char text[96];
-        std::snprintf(text, sizeof text, "%s%s %.4g", peers.empty() ? "" : ", ", who.c_str(), time);
-        peers += text;
+void requireKnownPeers() {
+    for (Operation const& operation : operations()) {
+        bool isKnown = operation.against.empty();
+        for (auto const& entry : operation.entries) isKnown |= entry.who == operation.against;
+        agree(isKnown, ("the peer of a target: " + operation.name).c_str());
     }
-    double const own = median(ours->second);
-    std::printf("| %s | %.4g (%.4g) | %s | ", operation.name.c_str(), own, minimum(ours->second),
-                peers.c_str());
-    if (best > 0.0) std::printf("%.3g", own / best);
-    std::printf(" | ");
-    char const* separator = "";
-    for (Target const& t : targets()) {
-        if (t.operation != operation.name) continue;
-        bool const named = operation.times.count(t.against) != 0;
-        double const reference = named ? median(operation.times.at(t.against)) : best;
-        double const ratio = own / reference;
-        std::printf("%s%.3g of %s, at most %.4g%s", separator, ratio, t.against.c_str(), t.atMost,
-                    ratio <= t.atMost ? "" : " (missed)");
-        separator = "; ";
-    }
-    std::printf(" |\n");
 }
 
 }  // namespace
 
-void target(std::string operation, double atMost, std::string against) {
-    targets().push_back({std::move(operation), atMost, std::move(against)});
+Operation& Operation::peer(std::string who, Implementation run) {
+    entries.push_back({std::move(who), std::move(run)});
+    return *this;
+}
+Operation& Operation::atMost(double multiple, std::string peerName) {
+    target = multiple;
+    against = std::move(peerName);
+    return *this;
+}
+Operation& Operation::quick() {
+    isQuick = true;
+    return *this;
 }
 
-bool isWanted(std::string const& operation) {
-    return std::regex_search(operation, std::regex(filter()));
+Operation& operation(std::string const& name) {
+    auto const found = std::find_if(operations().begin(), operations().end(),
+                                    [&](Operation const& o) { return o.name == name; });
+    return found != operations().end() ? *found : operations().emplace_back(Operation{name});
 }
 
-void announce(std::string const& operation) { operationNamed(operation); }
+void agreement(std::function<void()> check) { agreements().push_back(std::move(check)); }
 
-void record(std::string operation, std::string who, double figure) {
-    timesOf(operation, who).push_back(figure);
+void agree(bool same, char const* what) {
+    if (same) return;
+    std::cerr << "no agreement: " << what << "\n";
+    std::exit(1);
+}
+
+double heapBytes() {
+    struct mallinfo2 const info = mallinfo2();
+    return static_cast<double>(info.uordblks + info.hblkhd);
 }
 
 }  // namespace bench
@@ -140,49 +132,57 @@ int main(int argc, char** argv) {
     // The C++ library counts references without atomics while a program has one thread.
     std::atomic<bool> done{false};
     std::thread second([&done] {
-        while (!done) std::this_thread::sleep_for(std::chrono::milliseconds(50));
+        while (!done) std::this_thread::sleep_for(std::chrono::milliseconds(5));
     });
-
-    if (argc == 4 && std::string_view(argv[1]) == "--apart") {
-        std::printf("%.1f\n", bench::documentOperation(argv[2], argv[3]));
+    auto const end = [&](int status) {
         done = true;
         second.join();
-        return 0;
+        return status;
+    };
+
+    bench::describeAll();
+    if (argc == 5 && std::string(argv[1]) == "--run") {
+        return end(bench::runOne(argv[2], argv[3], std::atoi(argv[4])));
     }
-    constexpr std::string_view kFilter = "--benchmark_filter=";
-    for (int i = 1; i < argc; ++i) {
-        std::string_view const argument = argv[i];
-        if (argument.substr(0, kFilter.size()) == kFilter) {
-            bench::filter() = argument.substr(kFilter.size());
-        }
+    if (argc == 2 && std::string(argv[1]) == "--agree") {
+        for (auto const& check : bench::agreements()) check();
+        return end(0);
     }
 
-    std::vector<char*> arguments(argv, argv + argc);
-    char interleave[] = "--benchmark_enable_random_interleaving=true";
-    char repetitions[] = "--benchmark_repetitions=9";
-    char shortest[] = "--benchmark_min_time=0.02";
-    arguments.insert(arguments.begin() + 1, {interleave, repetitions, shortest});
-    int count = static_cast<int>(arguments.size());
+    CLI::App app("Measures the library beside its peers and prints a table. Every implementation "
+                 "of an operation is run in a process of its own.");
+    bool quick = false;
+    std::string filter;
+    std::string kept;
+    int rounds = 3;
+    app.add_flag("--quick", quick, "Measure the rows that matter most, once, in two minutes");
+    app.add_option("--filter", filter, "Measure the operations whose names match this")
+        ->type_name("REGEX");
+    app.add_option("--compare", kept,
+                   "Name what got worse by more than a tenth since this table was kept; end with 1 "
+                   "where there is any")
+        ->type_name("TABLE");
+    app.add_option("--rounds", rounds, "How often everyone is asked for three repetitions")
+        ->check(CLI::Range(1, 100))
+        ->capture_default_str();
+    try {
+        app.parse(argc, argv);
+    } catch (CLI::ParseError const& error) {
+        return end(app.exit(error));
+    }
 
-    bench::values();
-    bench::texts();
-    bench::data();
-    bench::paths();
-    bench::easing();
-    bench::graphs();
-    bench::edits();
-    bench::documentFiles();
-
-    benchmark::Initialize(&count, arguments.data());
-    bench::Collector collector;
-    benchmark::RunSpecifiedBenchmarks(&collector);
+    bench::requireKnownPeers();
+    static_cast<void>(bench::figuresOfProcess({"--agree"}));
+    std::vector<bench::Row> rows;
+    for (bench::Operation const& operation : bench::operations()) {
+        bool const wanted = std::regex_search(operation.name, std::regex(filter));
+        if (!wanted || (quick && !operation.isQuick)) continue;
+        rows.push_back(bench::measured(operation, quick ? 1 : rounds, 3));
+    }
     std::fprintf(stderr, "\n");
-
-    std::printf(
-        "Microseconds unless said otherwise: the median of the repetitions (the minimum).\n\n");
-    std::printf("| operation | ours | peers | to the best peer | to the target |\n");
-    std::printf("|---|---|---|---|---|\n");
-    for (auto const& operation : bench::operations()) bench::printOperation(operation);
-    done = true;
-    second.join();
+    std::cout << bench::tableOf(rows);
+    if (kept.empty()) return end(0);
+    std::string const worse = bench::whatIsWorse(rows, kept);
+    std::cout << "\n" << (worse.empty() ? "Nothing is worse by more than a tenth.\n" : worse);
+    return end(worse.empty() ? 0 : 1);
 }

@@ -7,6 +7,7 @@
 #include <cairo.h>
 
 #include <memory>
+#include <utility>
 #include <vector>
 
 using namespace tarn::engine;
@@ -76,108 +77,115 @@ std::unique_ptr<CairoPath> cairoLines() {
     return path;
 }
 
+void checkAgreement() {
+    Path const ours = PathBuilder().roundRect({1, 2}, {30, 40}, 5).build();
+    QPainterPath qt;
+    qt.addRoundedRect(1, 2, 30, 40, 5, 5);
+    CairoPath cairo;
+    roundRect(cairo.context, 1, 2, 30, 40, 5);
+    double x1 = 0, y1 = 0, x2 = 0, y2 = 0;
+    cairo_path_extents(cairo.context, &x1, &y1, &x2, &y2);
+    bench::agree(qt.boundingRect() == QRectF(1, 2, 30, 40) && x1 == 1 && y1 == 2 && x2 == 31 &&
+                     y2 == 42 && ours.elements[1].points[0] == FloatVec2{26, 2},
+                 "rounded rectangles");
+    Path const lines = ourLines();
+    bench::agree(lines.elements.size() == kLines && qtLines().elementCount() == kLines,
+                 "polylines");
+}
+
+std::shared_ptr<CairoPath> newCairoPath() { return std::make_shared<CairoPath>(); }
+
+void shapes() {
+    using Cairo = std::shared_ptr<CairoPath>;
+    bench::operation("1,000 rounded rectangles, a path each")
+        .ours(bench::doing([] {
+            std::vector<Path> list;
+            for (int i = 0; i < kShapes; ++i) {
+                PathBuilder builder;
+                builder.roundRect({double(i), 2}, {30, 40}, 5);
+                list.push_back(std::move(builder).build());
+            }
+            return list;
+        }))
+        .peer("QPainterPath", bench::doing([] {
+                  std::vector<QPainterPath> list;
+                  for (int i = 0; i < kShapes; ++i) {
+                      QPainterPath path;
+                      path.addRoundedRect(i, 2, 30, 40, 5, 5);
+                      list.push_back(path);
+                  }
+                  return list;
+              }))
+        .peer("cairo", bench::onEach(newCairoPath,
+                                     [](Cairo& cairo) {
+                                         for (int i = 0; i < kShapes; ++i) {
+                                             roundRect(cairo->context, i, 2, 30, 40, 5);
+                                             cairo->keep();
+                                         }
+                                         return cairo;
+                                     }))
+        .atMost(0.8);
+    bench::operation("1,000 rounded rectangles in one path")
+        .ours(bench::doing([] {
+            PathBuilder builder;
+            for (int i = 0; i < kShapes; ++i) builder.roundRect({double(i), 2}, {30, 40}, 5);
+            return std::move(builder).build();
+        }))
+        .peer("QPainterPath", bench::doing([] {
+                  QPainterPath path;
+                  for (int i = 0; i < kShapes; ++i) path.addRoundedRect(i, 2, 30, 40, 5, 5);
+                  return path;
+              }))
+        .peer("cairo", bench::onEach(newCairoPath,
+                                     [](Cairo& cairo) {
+                                         for (int i = 0; i < kShapes; ++i)
+                                             roundRect(cairo->context, i, 2, 30, 40, 5);
+                                         return cairo;
+                                     }))
+        .atMost(0.8);
+}
+
+void polylines() {
+    bench::operation("a polyline of 100,000")
+        .ours(bench::doing(ourLines))
+        .peer("QPainterPath", bench::doing(qtLines))
+        .peer("cairo", bench::doing(cairoLines))
+        .atMost(0.8, "cairo")
+        .quick();
+    bench::operation("copy a polyline of 100,000")
+        .ours(bench::on(ourLines, [](Path const& path) { return path; }))
+        .peer("QPainterPath detached", bench::on(qtLines,
+                                                 [](QPainterPath const& path) {
+                                                     QPainterPath result = path;
+                                                     result.setElementPositionAt(0, 0, 0);
+                                                     return result;
+                                                 }))
+        .atMost(3.0)
+        .quick();
+    auto const equal = [](auto const& both) { return both.first == both.second; };
+    bench::operation("== of polylines of 100,000")
+        .ours(bench::on([] { return std::pair(ourLines(), ourLines()); }, equal))
+        .peer("QPainterPath", bench::on([] { return std::pair(qtLines(), qtLines()); }, equal))
+        .atMost(1.5);
+    bench::operation("destroy a polyline of 100,000")
+        .ours(bench::onEach([] { return std::make_unique<Path>(ourLines()); },
+                            [](std::unique_ptr<Path>& path) {
+                                path.reset();
+                                return 0;
+                            }))
+        .peer("a tenth of QPainterPath's build", bench::doing([] {
+                  QPainterPath path;
+                  path.moveTo(0, 0);
+                  for (int i = 1; i < kLines / 10; ++i) path.lineTo(i, i * 0.5);
+                  return path;
+              }))
+        .atMost(1.0);
+}
+
 }  // namespace
 
 void bench::paths() {
-    auto const nothing = [] { return 0; };
-    {
-        Path const ours = PathBuilder().roundRect({1, 2}, {30, 40}, 5).build();
-        QPainterPath qt;
-        qt.addRoundedRect(1, 2, 30, 40, 5, 5);
-        CairoPath cairo;
-        roundRect(cairo.context, 1, 2, 30, 40, 5);
-        double x1 = 0, y1 = 0, x2 = 0, y2 = 0;
-        cairo_path_extents(cairo.context, &x1, &y1, &x2, &y2);
-        agree(qt.boundingRect() == QRectF(1, 2, 30, 40) && x1 == 1 && y1 == 2 && x2 == 31 &&
-                  y2 == 42 && ours.elements[1].points[0] == FloatVec2{26, 2},
-              "rounded rectangles");
-        Path const lines = ourLines();
-        agree(lines.elements.size() == kLines && qtLines().elementCount() == kLines, "polylines");
-    }
-
-    std::string const own = "1,000 rounded rectangles, a path each";
-    measure(own, "ours", nothing, [](int) {
-        std::vector<Path> list;
-        for (int i = 0; i < kShapes; ++i) {
-            PathBuilder builder;
-            builder.roundRect({double(i), 2}, {30, 40}, 5);
-            list.push_back(std::move(builder).build());
-        }
-        return list;
-    });
-    measure(own, "QPainterPath", nothing, [](int) {
-        std::vector<QPainterPath> list;
-        for (int i = 0; i < kShapes; ++i) {
-            QPainterPath path;
-            path.addRoundedRect(i, 2, 30, 40, 5, 5);
-            list.push_back(path);
-        }
-        return list;
-    });
-    measure(
-        own, "cairo", [] { return std::make_shared<CairoPath>(); },
-        [](std::shared_ptr<CairoPath>& cairo) {
-            for (int i = 0; i < kShapes; ++i) {
-                roundRect(cairo->context, i, 2, 30, 40, 5);
-                cairo->keep();
-            }
-            return cairo;
-        });
-    target(own, 0.8);
-
-    std::string const one = "1,000 rounded rectangles in one path";
-    measure(one, "ours", nothing, [](int) {
-        PathBuilder builder;
-        for (int i = 0; i < kShapes; ++i) builder.roundRect({double(i), 2}, {30, 40}, 5);
-        return std::move(builder).build();
-    });
-    measure(one, "QPainterPath", nothing, [](int) {
-        QPainterPath path;
-        for (int i = 0; i < kShapes; ++i) path.addRoundedRect(i, 2, 30, 40, 5, 5);
-        return path;
-    });
-    measure(
-        one, "cairo", [] { return std::make_shared<CairoPath>(); },
-        [](std::shared_ptr<CairoPath>& cairo) {
-            for (int i = 0; i < kShapes; ++i) roundRect(cairo->context, i, 2, 30, 40, 5);
-            return cairo;
-        });
-    target(one, 0.8);
-
-    std::string const lines = "a polyline of 100,000";
-    measure(lines, "ours", nothing, [](int) { return ourLines(); });
-    measure(lines, "QPainterPath", nothing, [](int) { return qtLines(); });
-    measure(lines, "cairo", nothing, [](int) { return cairoLines(); });
-    target(lines, 0.5);
-
-    static Path const ours = ourLines();
-    static Path const twin = ourLines();
-    static QPainterPath const qt = qtLines();
-    static QPainterPath const qtTwin = qtLines();
-    std::string const copy = "copy a polyline of 100,000";
-    measureOn(copy, "ours", ours, [](Path const& p) { return p; });
-    measureOn(copy, "QPainterPath detached", qt, [](QPainterPath const& p) {
-        QPainterPath result = p;
-        result.setElementPositionAt(0, 0, 0);
-        return result;
-    });
-    target(copy, 3.0, "QPainterPath detached");
-    std::string const equal = "== of polylines of 100,000";
-    measureOn(equal, "ours", ours, [](Path const& p) { return p == twin; });
-    measureOn(equal, "QPainterPath", qt, [](QPainterPath const& p) { return p == qtTwin; });
-    target(equal, 1.5, "QPainterPath");
-    std::string const destroy = "destroy a polyline of 100,000";
-    measure(
-        destroy, "ours", [] { return std::make_unique<Path>(ours); },
-        [](std::unique_ptr<Path>& p) {
-            p.reset();
-            return 0;
-        });
-    measure(destroy, "a tenth of QPainterPath's build", nothing, [](int) {
-        QPainterPath path;
-        path.moveTo(0, 0);
-        for (int i = 1; i < kLines / 10; ++i) path.lineTo(i, i * 0.5);
-        return path;
-    });
-    target(destroy, 1.0, "a tenth of QPainterPath's build");
+    agreement(checkAgreement);
+    shapes();
+    polylines();
 }

@@ -10,6 +10,7 @@
 
 #include <memory>
 #include <new>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -105,36 +106,27 @@ struct Room {
 };
 
 template <class T, class Make>
-void construct(std::string const& operation, std::string const& who, Make make) {
-    bench::measure(
-        operation, who, [] { return std::make_shared<Room<T>>(); },
-        [make](std::shared_ptr<Room<T>>& room) {
-            for (std::size_t i = 0; i < kCount; ++i) {
-                new (room->memory + i) T(make(static_cast<double>(i)));
-            }
-            room->made = kCount;
-            return room;
-        });
-}
-
-template <class T>
-std::vector<T> const& kept(std::vector<T> (*make)()) {
-    static std::map<void*, std::vector<T>> loops;
-    return loops.try_emplace(reinterpret_cast<void*>(make), make()).first->second;
+bench::Implementation construct(Make make) {
+    return bench::onEach([] { return std::make_shared<Room<T>>(); },
+                         [make](std::shared_ptr<Room<T>>& room) {
+                             for (std::size_t i = 0; i < kCount; ++i) {
+                                 new (room->memory + i) T(make(static_cast<double>(i)));
+                             }
+                             room->made = kCount;
+                             return room;
+                         });
 }
 
 template <class T>
 void copiesAndDestruction(std::string const& who) {
-    bench::measureOn("copy 10,000 mixed values", who, kept<T>(mixed<T>),
-                     [](std::vector<T> const& loop) { return loop; });
-    bench::measureOn("copy 10,000 numbers", who, kept<T>(numbers<T>),
-                     [](std::vector<T> const& loop) { return loop; });
-    bench::measure(
-        "destroy 10,000 mixed values", who, [] { return mixed<T>(); },
-        [](std::vector<T>& loop) {
-            std::vector<T>().swap(loop);
-            return loop.size();
-        });
+    auto const copy = [](std::vector<T> const& loop) { return loop; };
+    bench::operation("copy 10,000 mixed values").peer(who, bench::on(mixed<T>, copy));
+    bench::operation("copy 10,000 numbers").peer(who, bench::on(numbers<T>, copy));
+    bench::operation("destroy 10,000 mixed values")
+        .peer(who, bench::onEach(mixed<T>, [](std::vector<T>& loop) {
+                  std::vector<T>().swap(loop);
+                  return loop.size();
+              }));
 }
 
 struct BoostDouble : boost::static_visitor<double> {
@@ -175,19 +167,20 @@ std::vector<T> mixedWithoutTexts() {
 
 template <class T>
 void readings(std::string const& who) {
-    bench::measureOn("type() of 10,000 mixed values", who, kept<T>(mixed<T>),
-                     [](std::vector<T> const& loop) {
-                         int sum = 0;
-                         for (T const& v : loop) sum += kindOf(v);
-                         return sum;
-                     });
+    bench::operation("type() of 10,000 mixed values")
+        .peer(who, bench::on(mixed<T>, [](std::vector<T> const& loop) {
+                  int sum = 0;
+                  for (T const& v : loop) sum += kindOf(v);
+                  return sum;
+              }));
     auto const sum = [](std::vector<T> const& loop) {
         double total = 0.0;
         for (T const& v : loop) total += asDouble(v);
         return total;
     };
-    bench::measureOn("double(v) of 10,000 numbers", who, kept<T>(numbers<T>), sum);
-    bench::measureOn("double(v) of 10,000 mixed values", who, kept<T>(mixedWithoutTexts<T>), sum);
+    bench::operation("double(v) of 10,000 numbers").peer(who, bench::on(numbers<T>, sum));
+    bench::operation("double(v) of 10,000 mixed values")
+        .peer(who, bench::on(mixedWithoutTexts<T>, sum));
 }
 
 bool sameContent(Value const& a, Value const& b) { return a == b; }
@@ -219,19 +212,22 @@ bool sameContent(QVariant const& a, QVariant const& b) { return a == b; }
 
 template <class T>
 void equality(std::string const& who) {
-    static std::vector<T> const shared = kept<T>(mixed<T>);
-    static std::vector<T> const unshared = mixed<T>();
-    auto const against = [](std::vector<T> const& other) {
-        return [&other](std::vector<T> const& loop) {
-            bool equal = true;
-            for (std::size_t i = 0; i < loop.size(); ++i) equal &= sameContent(loop[i], other[i]);
-            bench::agree(equal, "equality of mixed values");
-            return equal;
-        };
+    using Pair = std::pair<std::vector<T>, std::vector<T>>;
+    auto const equal = [](Pair const& both) {
+        bool result = true;
+        for (std::size_t i = 0; i < both.first.size(); ++i) {
+            result &= sameContent(both.first[i], both.second[i]);
+        }
+        bench::agree(result, "equality of mixed values");
+        return result;
     };
-    bench::measureOn("== of 10,000 mixed values, shared", who, kept<T>(mixed<T>), against(shared));
-    bench::measureOn("== of 10,000 mixed values, unshared", who, kept<T>(mixed<T>),
-                     against(unshared));
+    auto const shared = [] {
+        std::vector<T> const loop = mixed<T>();
+        return Pair(loop, loop);
+    };
+    auto const unshared = [] { return Pair(mixed<T>(), mixed<T>()); };
+    bench::operation("== of 10,000 mixed values, shared").peer(who, bench::on(shared, equal));
+    bench::operation("== of 10,000 mixed values, unshared").peer(who, bench::on(unshared, equal));
 }
 
 // The clamp as it would be written in place over a std::variant.
@@ -245,68 +241,66 @@ Std const& clamped(Std const& value, Std const* min, Std const* max) {
     return value;
 }
 
+void castTo(std::string const& name, TypeInfo const& info, Std const* min, Std const* max) {
+    auto const ours = [info](Loop const& loop) {
+        std::size_t sum = 0;
+        for (Value const& v : loop) sum += reinterpret_cast<std::size_t>(&castValueToType(v, info));
+        return sum;
+    };
+    auto const theirs = [min, max](std::vector<Std> const& loop) {
+        std::size_t sum = 0;
+        for (Std const& v : loop) sum += reinterpret_cast<std::size_t>(&clamped(v, min, max));
+        return sum;
+    };
+    bench::operation(name)
+        .ours(bench::on(numbers<Value>, ours))
+        .peer("std::variant", bench::on(numbers<Std>, theirs));
+}
+
 void casting() {
     static TypeInfo const bounded{Type::Float, 0, Value(1000.0), Value(4000.0), {}};
-    static TypeInfo const unbounded{Type::Float, 0, {}, {}, {}};
-    static TypeInfo const other{Type::Vec2, 0, Value(1000.0), Value(4000.0), {}};
     static Std const low(1000.0);
     static Std const high(4000.0);
-    auto const ours = [](TypeInfo const& info) {
-        return [&info](Loop const& loop) {
-            std::size_t sum = 0;
-            for (Value const& v : loop) {
-                sum += reinterpret_cast<std::size_t>(&castValueToType(v, info));
-            }
-            return sum;
-        };
-    };
-    auto const theirs = [](Std const* min, Std const* max) {
-        return [min, max](std::vector<Std> const& loop) {
-            std::size_t sum = 0;
-            for (Std const& v : loop) sum += reinterpret_cast<std::size_t>(&clamped(v, min, max));
-            return sum;
-        };
-    };
-    Loop const& loop = kept<Value>(numbers<Value>);
-    std::vector<Std> const& peer = kept<Std>(numbers<Std>);
-    for (std::size_t i = 0; i < kCount; ++i) {
-        bench::agree(double(castValueToType(loop[i], bounded)) ==
-                         asDouble(clamped(peer[i], &low, &high)),
-                     "clamping");
-    }
-    bench::measureOn("cast 10,000 to a float port with bounds", "ours", loop, ours(bounded));
-    bench::measureOn("cast 10,000 to a float port with bounds", "std::variant", peer,
-                     theirs(&low, &high));
-    bench::target("cast 10,000 to a float port with bounds", 1.0);
-    bench::measureOn("cast 10,000 to a float port without", "ours", loop, ours(unbounded));
-    bench::measureOn("cast 10,000 to a float port without", "std::variant", peer,
-                     theirs(nullptr, nullptr));
-    bench::target("cast 10,000 to a float port without", 3.0);
-    bench::measureOn("cast 10,000 to another port", "ours", loop, ours(other));
-    bench::measureOn("cast 10,000 to another port", "std::variant", peer, theirs(nullptr, nullptr));
-    bench::target("cast 10,000 to another port", 3.0);
-    bench::measureOn("indexLoopCasting of 30,000", "ours", loop, [](Loop const& l) {
+    bench::agreement([] {
+        Loop const loop = numbers<Value>();
+        std::vector<Std> const peer = numbers<Std>();
+        for (std::size_t i = 0; i < kCount; ++i) {
+            bench::agree(double(castValueToType(loop[i], bounded)) ==
+                             asDouble(clamped(peer[i], &low, &high)),
+                         "clamping");
+        }
+    });
+    castTo("cast 10,000 to a float port with bounds", bounded, &low, &high);
+    castTo("cast 10,000 to a float port without", {Type::Float, 0, {}, {}, {}}, nullptr, nullptr);
+    castTo("cast 10,000 to another port", {Type::Vec2, 0, Value(1000.0), Value(4000.0), {}},
+           nullptr, nullptr);
+    auto const ours = [](Loop const& loop) {
         std::size_t sum = 0;
         for (unsigned long long i = 0; i < 3 * kCount; ++i) {
-            sum += reinterpret_cast<std::size_t>(&indexLoopCasting(l, bounded, i));
+            sum += reinterpret_cast<std::size_t>(&indexLoopCasting(loop, bounded, i));
         }
         return sum;
-    });
-    bench::measureOn(
-        "indexLoopCasting of 30,000", "std::variant", peer, [](std::vector<Std> const& l) {
-            std::size_t sum = 0;
-            for (std::size_t i = 0; i < 3 * kCount; ++i) {
-                sum += reinterpret_cast<std::size_t>(&clamped(l[i % l.size()], &low, &high));
-            }
-            return sum;
-        });
-    bench::target("indexLoopCasting of 30,000", 1.5);
+    };
+    auto const theirs = [](std::vector<Std> const& loop) {
+        std::size_t sum = 0;
+        for (std::size_t i = 0; i < 3 * kCount; ++i) {
+            sum += reinterpret_cast<std::size_t>(&clamped(loop[i % loop.size()], &low, &high));
+        }
+        return sum;
+    };
+    bench::operation("indexLoopCasting of 30,000")
+        .ours(bench::on(numbers<Value>, ours))
+        .peer("std::variant", bench::on(numbers<Std>, theirs));
 }
 
 template <class T>
 void everything(std::string const& who) {
-    construct<T>("construct 10,000 from doubles", who, [](double d) { return T(d); });
-    construct<T>("construct 10,000 from texts", who, [](double) { return fromText<T>(); });
+    bench::operation("construct 10,000 from doubles").peer(who, construct<T>([](double d) {
+                                                               return T(d);
+                                                           }));
+    bench::operation("construct 10,000 from strings").peer(who, construct<T>([](double) {
+                                                               return fromText<T>();
+                                                           }));
     copiesAndDestruction<T>(who);
     readings<T>(who);
     equality<T>(who);
@@ -315,26 +309,33 @@ void everything(std::string const& who) {
 }  // namespace
 
 void bench::values() {
-    Loop const& loop = kept<Value>(mixedWithoutTexts<Value>);
-    std::vector<Boost> const& other = kept<Boost>(mixedWithoutTexts<Boost>);
-    std::vector<Std> const& third = kept<Std>(mixedWithoutTexts<Std>);
-    for (std::size_t i = 0; i < kCount; ++i) {
-        agree(asDouble(loop[i]) == asDouble(other[i]) && asDouble(loop[i]) == asDouble(third[i]),
-              "values read as numbers");
-    }
+    agreement([] {
+        Loop const ours = mixedWithoutTexts<Value>();
+        std::vector<Boost> const second = mixedWithoutTexts<Boost>();
+        std::vector<Std> const third = mixedWithoutTexts<Std>();
+        for (std::size_t i = 0; i < kCount; ++i) {
+            agree(asDouble(ours[i]) == asDouble(second[i]) &&
+                      asDouble(ours[i]) == asDouble(third[i]),
+                  "values read as numbers");
+        }
+    });
     everything<Value>("ours");
     everything<Boost>("boost::variant");
     everything<Std>("std::variant");
     everything<QVariant>("QVariant");
-    target("construct 10,000 from doubles", 1.2);
-    target("construct 10,000 from texts", 1.1);
-    target("copy 10,000 mixed values", 1.15);
-    target("copy 10,000 numbers", 1.15);
-    target("destroy 10,000 mixed values", 1.2);
-    target("type() of 10,000 mixed values", 1.3);
-    target("double(v) of 10,000 numbers", 1.3);
-    target("double(v) of 10,000 mixed values", 1.1);
-    target("== of 10,000 mixed values, shared", 1.0);
-    target("== of 10,000 mixed values, unshared", 1.1);
     casting();
+    operation("construct 10,000 from doubles").atMost(1.2);
+    operation("construct 10,000 from strings").atMost(1.1);
+    operation("copy 10,000 mixed values").atMost(1.15);
+    operation("copy 10,000 numbers").atMost(1.15);
+    operation("destroy 10,000 mixed values").atMost(1.2);
+    operation("type() of 10,000 mixed values").atMost(1.05, "std::variant").quick();
+    operation("double(v) of 10,000 numbers").atMost(1.02).quick();
+    operation("double(v) of 10,000 mixed values").atMost(1.0).quick();
+    operation("== of 10,000 mixed values, shared").atMost(1.05, "std::variant").quick();
+    operation("== of 10,000 mixed values, unshared").atMost(1.0, "std::variant").quick();
+    operation("cast 10,000 to a float port with bounds").atMost(1.0).quick();
+    operation("cast 10,000 to a float port without").atMost(3.0);
+    operation("cast 10,000 to another port").atMost(3.0);
+    operation("indexLoopCasting of 30,000").atMost(1.5);
 }
