@@ -11,6 +11,7 @@
 
 #include <gtest/gtest.h>
 
+#include <climits>
 #include <memory>
 #include <string>
 #include <vector>
@@ -42,6 +43,12 @@ struct Inputs {
     EvalPatchIndex evaluatedIndex{evaluated};
 };
 
+std::string withRoom(std::size_t bytes) {
+    std::string text;
+    text.reserve(bytes);
+    return text;
+}
+
 // Results are kept until the count is read: what they hold was allocated too.
 struct Kept {
     Value value;
@@ -51,6 +58,7 @@ struct Kept {
     Patch patch;
     std::vector<Value> values;
     std::string text;
+    std::string roomy = withRoom(1000);
     double number = 0.0;
 };
 
@@ -148,6 +156,20 @@ std::vector<Row> const kRows{
                      double(indexLoopCasting(nullLoop(), in.bounded, 17));
      }},
     {"text of a number", 0, [](Inputs const& in, Kept& k) { k.text = to_string(in.number); }},
+    {"text of numbers, appended where there is room", 0,
+     [](Inputs const&, Kept& k) {
+         for (Value const& value : {Value(1234.56), Value(-1e300), Value(LLONG_MIN), Value(true),
+                                    Value(FloatVec4()), Value::Image(ULLONG_MAX)}) {
+             appendText(k.roomy, value);
+         }
+     }},
+    {"lists of no ports, connections and patches", 0,
+     [](Inputs const&, Kept& k) {
+         k.patch.inputs = arrayOf<Port>({});
+         k.patch.connections = arrayOf(std::vector<Connection>());
+         k.patch.children = arrayOf<Patch>({});
+     }},
+    {"list of ports", 2, [](Inputs const&, Kept& k) { k.patch.inputs = arrayOf({Port{1}}); }},
     {"text of a text", 1, [](Inputs const& in, Kept& k) { k.text = to_string(in.text); }},
     {"number as a number again", 0,
      [](Inputs const& in, Kept& k) { k.value = in.number.asType(Type::Vec4); }},
@@ -219,6 +241,18 @@ std::vector<Row> const kRows{
              k.number += ease(EasingFunction(i), 0.0, 1.0, 0.3) +
                          sum(ease(EasingFunction(i), FloatVec4(), FloatVec4{1, 1, 1, 1}, 0.3));
          }
+     }},
+    {"ease of many numbers", 0,
+     [](Inputs const&, Kept& k) {
+         double progress[40] = {};
+         easeEach(EasingFunction::QuadraticIn, 0.0, 1.0, progress, 40, progress);
+         k.number += progress[0];
+     }},
+    {"cast of a range of indices", 0,
+     [](Inputs const& in, Kept& k) {
+         Value const* results[40];
+         indexLoopCasting(in.loop, in.bounded, 7, 40, results);
+         k.number += double(*results[0]);
      }},
     {"ease of values", 0,
      [](Inputs const& in, Kept& k) {

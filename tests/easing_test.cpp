@@ -10,7 +10,10 @@
 #include <array>
 #include <climits>
 #include <cmath>
+#include <cstring>
 #include <sstream>
+#include <string>
+#include <vector>
 
 using namespace tarn::engine;
 
@@ -311,6 +314,49 @@ TEST(Ease, OfVectorsIsThatOfTheirComponents) {
             expectSame(easeExponentialInOut(FloatVec2{a.x, a.y}, FloatVec2{b.x, b.y}, t).y, two.y);
         }
         if (HasFailure()) return;
+    }
+}
+
+template <class T>
+void expectEachIsTheSingleOne(T const& from, T const& to) {
+    tests::Random random(16);
+    std::vector<double> progress{0.0, -0.0, 0.5, 1.0, -1.0, 1.5, NAN, INFINITY, -INFINITY, 5e-324};
+    while (progress.size() < 150)
+        progress.push_back(static_cast<double>(random.below(30001)) / 10000.0 - 1.0);
+    for (int f = -1; f <= kCurves; ++f) {
+        // Around the size of the blocks that are computed at once.
+        for (std::size_t const count : {0, 1, 31, 32, 33, 64, 65, 150}) {
+            SCOPED_TRACE("curve " + std::to_string(f) + ", " + std::to_string(count));
+            std::vector<T> results(count + 1, from);
+            easeEach(EF(f), from, to, progress.data(), count, results.data());
+            for (std::size_t i = 0; i < count; ++i) {
+                T const single = ease(EF(f), from, to, progress[i]);
+                ASSERT_EQ(std::memcmp(&results[i], &single, sizeof(T)), 0) << progress[i];
+            }
+            // Nothing behind them is written.
+            ASSERT_EQ(std::memcmp(&results[count], &from, sizeof(T)), 0);
+        }
+    }
+}
+
+TEST(EaseEach, GivesTheBitsOfSingleCalls) {
+    expectEachIsTheSingleOne(3.0, 7.25);
+    expectEachIsTheSingleOne(1e300, -1e300);
+    expectEachIsTheSingleOne<long long>(-7, 1000000);
+    expectEachIsTheSingleOne(LLONG_MIN, LLONG_MAX);
+    expectEachIsTheSingleOne(FloatVec2{1, -2}, FloatVec2{0.1, 0.3});
+    expectEachIsTheSingleOne(FloatVec3{1, -2, 3}, FloatVec3{0.1, 0.3, -0.7});
+    expectEachIsTheSingleOne(FloatVec4{1, -2, 3, -4}, FloatVec4{0.1, 0.3, -0.7, 1e9});
+}
+
+TEST(EaseEach, MayReplaceTheProgress) {
+    for (int f = 0; f < kCurves; ++f) {
+        std::vector<double> progress;
+        for (int i = 0; i < 100; ++i) progress.push_back(i * 0.01);
+        std::vector<double> expected;
+        for (double const t : progress) expected.push_back(ease(EF(f), 3.0, 7.0, t));
+        easeEach(EF(f), 3.0, 7.0, progress.data(), progress.size(), progress.data());
+        EXPECT_EQ(progress, expected);
     }
 }
 

@@ -1147,6 +1147,41 @@ TEST(NumberText, IsShortenedForReading) {
     }
 }
 
+TEST(NumberText, IsAppendedAsToStringGivesIt) {
+    Value const nullText = std::shared_ptr<Path const>();
+    std::string text = "before ";
+    std::string expected = text;
+    for (Value const& value : {Value(),
+                               Value(1234.56),
+                               Value(-0.0),
+                               Value(-0.001),
+                               Value(1e300),
+                               Value(double(NAN)),
+                               Value(-double(INFINITY)),
+                               Value(0LL),
+                               Value(LLONG_MIN),
+                               Value(LLONG_MAX),
+                               Value(true),
+                               Value(false),
+                               Value(FloatVec2{1, 2.5}),
+                               Value(FloatVec3{1, 2.5, -3}),
+                               Value(FloatVec4{1, 2.5, -3, 1e6}),
+                               Value(FloatMat4()),
+                               Value::Image(ULLONG_MAX),
+                               Value::Model(0),
+                               Value("a string"),
+                               Value(""),
+                               Value(Path()),
+                               nullText,
+                               Value(PathBuilder().circle({0, 0}, 1).build()),
+                               Value(Unstructured("a string of data")),
+                               Value(Unstructured(1))}) {
+        appendText(text, value);
+        expected += to_string(value);
+        ASSERT_EQ(text, expected);
+    }
+}
+
 TEST(NumberText, IsCutAfter127Characters) {
     struct Row {
         char const* what;
@@ -1487,6 +1522,26 @@ TEST(IndexLoopCasting, WrapsAroundAndClamps) {
     EXPECT_EQ(&indexLoopCasting(loop, bounded, 3), &bounded.min.value());
     EXPECT_EQ(&indexLoopCasting(loop, bounded, 4), &loop[1]);
     EXPECT_EQ(&indexLoopCasting(loop, bounded, 5), &bounded.max.value());
+}
+
+TEST(IndexLoopCasting, OfARangeIsThatOfEachIndex) {
+    TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), {}};
+    TypeInfo const plain;
+    for (Loop const& loop : {Loop(), Loop{0.5}, Loop{0.5, 1.5, 2.5}, Loop(100, 0.5)}) {
+        for (unsigned long long const first : {0ULL, 1ULL, 250ULL, ULLONG_MAX - 3, ULLONG_MAX}) {
+            for (std::size_t const count : {0, 1, 2, 7, 300}) {
+                for (TypeInfo const* const info : {&bounded, &plain}) {
+                    SCOPED_TRACE(std::to_string(loop.size()) + " from " + std::to_string(first));
+                    std::vector<Value const*> results(count + 1, nullptr);
+                    indexLoopCasting(loop, *info, first, count, results.data());
+                    for (std::size_t i = 0; i < count; ++i) {
+                        ASSERT_EQ(results[i], &indexLoopCasting(loop, *info, first + i)) << i;
+                    }
+                    ASSERT_EQ(results[count], nullptr);
+                }
+            }
+        }
+    }
 }
 
 TEST(IndexLoopCasting, ReadsAnEmptyLoopAsZero) {

@@ -2,9 +2,11 @@
 
 #include <Engine/Base/detail/truncate.h>
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <ostream>
+#include <type_traits>
 
 namespace tarn::engine {
 
@@ -41,20 +43,20 @@ long long difference(long long b, long long a) {
 // What a curve gives for each component: `formula(a, delta)`, with `a` the start and `delta` the
 // way to the end. Whatever depends on progress alone is computed before, once for all components.
 template <class Formula>
-double eachComponent(double from, double to, Formula formula) {
+double eachComponent(double from, double to, Formula const& formula) {
     return formula(from, to - from);
 }
 template <class Formula>
-FloatVec2 eachComponent(FloatVec2 from, FloatVec2 to, Formula formula) {
+FloatVec2 eachComponent(FloatVec2 const& from, FloatVec2 const& to, Formula const& formula) {
     return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y)};
 }
 template <class Formula>
-FloatVec3 eachComponent(FloatVec3 from, FloatVec3 to, Formula formula) {
+FloatVec3 eachComponent(FloatVec3 const& from, FloatVec3 const& to, Formula const& formula) {
     return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y),
             formula(from.z, to.z - from.z)};
 }
 template <class Formula>
-FloatVec4 eachComponent(FloatVec4 from, FloatVec4 to, Formula formula) {
+FloatVec4 eachComponent(FloatVec4 const& from, FloatVec4 const& to, Formula const& formula) {
     return {formula(from.x, to.x - from.x), formula(from.y, to.y - from.y),
             formula(from.z, to.z - from.z), formula(from.w, to.w - from.w)};
 }
@@ -65,7 +67,7 @@ long long eachComponent(long long from, long long to, Formula formula) {
 }
 
 template <class T>
-T exponentialInOut(T from, T to, double t) {
+T exponentialInOut(T const& from, T const& to, double t) {
     T const middle =
         eachComponent(from, to, [](double a, double delta) { return delta * 0.5 + a; });
     double const u = 2.0 * t;
@@ -82,8 +84,11 @@ T exponentialInOut(T from, T to, double t) {
         middle, to, [=](double a, double delta) { return factor * delta * kExponentialScale + a; });
 }
 
+template <EasingFunction function>
+using Curve = std::integral_constant<EasingFunction, function>;
+
 template <class T>
-T easeAlong(EasingFunction function, T from, T to, double t) {
+T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
     double const u = 2.0 * t;
     switch (function) {
         case EasingFunction::Linear:
@@ -95,15 +100,14 @@ T easeAlong(EasingFunction function, T from, T to, double t) {
             return eachComponent(
                 from, to, [=](double a, double delta) { return a - (t - 2.0) * (delta * t); });
         case EasingFunction::QuadraticInOut: {
-            if (u < 1.0) {
-                double const factor = u * u;
-                return eachComponent(
-                    from, to, [=](double a, double delta) { return a + factor * (delta * 0.5); });
-            }
+            // Both halves are computed, so that many of them can be at once.
             double const v = u - 1.0;
-            double const factor = (v - 2.0) * v - 1.0;
+            double const rising = u * u;
+            double const falling = (v - 2.0) * v - 1.0;
+            double const factor = u < 1.0 ? rising : falling;
+            double const half = u < 1.0 ? 0.5 : -0.5;
             return eachComponent(
-                from, to, [=](double a, double delta) { return a + factor * (delta * -0.5); });
+                from, to, [=](double a, double delta) { return a + factor * (delta * half); });
         }
         case EasingFunction::CubicIn: {
             double const factor = cube(t);
@@ -153,6 +157,49 @@ T easeAlong(EasingFunction function, T from, T to, double t) {
     return from;  // An enumerator out of range: stay at the start.
 }
 
+// One curve, known when this is compiled.
+template <EasingFunction function, class T>
+TARN_ENGINE_BASE_FLATTEN void easeEachAlong(T const& from, T const& to, double const* progress,
+                                            std::size_t count, T* results) {
+    std::size_t i = 0;
+    if constexpr (std::is_same_v<T, double>) {
+        // Blocks of a size that is known, in memory of their own, are computed several at once.
+        constexpr std::size_t kBlock = 32;
+        for (; count - i >= kBlock; i += kBlock) {
+            double block[kBlock];
+            std::copy(progress + i, progress + i + kBlock, block);
+            for (double& t : block) t = easeAlong(function, from, to, t);
+            std::copy(block, block + kBlock, results + i);
+        }
+    }
+    for (; i < count; ++i) results[i] = easeAlong(function, from, to, progress[i]);
+}
+
+template <class T>
+void easeEachAlong(EasingFunction function, T const& from, T const& to, double const* progress,
+                   std::size_t count, T* results) {
+    using EF = EasingFunction;
+    auto const along = [&](auto curve) {
+        easeEachAlong<decltype(curve)::value>(from, to, progress, count, results);
+    };
+    switch (function) {
+        case EF::Linear: return along(Curve<EF::Linear>());
+        case EF::QuadraticIn: return along(Curve<EF::QuadraticIn>());
+        case EF::QuadraticOut: return along(Curve<EF::QuadraticOut>());
+        case EF::QuadraticInOut: return along(Curve<EF::QuadraticInOut>());
+        case EF::CubicIn: return along(Curve<EF::CubicIn>());
+        case EF::CubicOut: return along(Curve<EF::CubicOut>());
+        case EF::CubicInOut: return along(Curve<EF::CubicInOut>());
+        case EF::ExponentialIn: return along(Curve<EF::ExponentialIn>());
+        case EF::ExponentialOut: return along(Curve<EF::ExponentialOut>());
+        case EF::ExponentialInOut: return along(Curve<EF::ExponentialInOut>());
+        case EF::SinusoidalIn: return along(Curve<EF::SinusoidalIn>());
+        case EF::SinusoidalOut: return along(Curve<EF::SinusoidalOut>());
+        case EF::SinusoidalInOut: return along(Curve<EF::SinusoidalInOut>());
+    }
+    std::fill(results, results + count, from);  // An enumerator out of range.
+}
+
 }  // namespace
 
 std::vector<std::string> easingFunctionNames() {
@@ -173,26 +220,30 @@ std::ostream& operator<<(std::ostream& stream, EasingFunction function) {
 }
 
 template <>
-double ease(EasingFunction function, double from, double to, double t) {
+TARN_ENGINE_BASE_FLATTEN double ease(EasingFunction function, double from, double to, double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-FloatVec2 ease(EasingFunction function, FloatVec2 from, FloatVec2 to, double t) {
+TARN_ENGINE_BASE_FLATTEN FloatVec2 ease(EasingFunction function, FloatVec2 from, FloatVec2 to,
+                                        double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-FloatVec3 ease(EasingFunction function, FloatVec3 from, FloatVec3 to, double t) {
+TARN_ENGINE_BASE_FLATTEN FloatVec3 ease(EasingFunction function, FloatVec3 from, FloatVec3 to,
+                                        double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 to, double t) {
+TARN_ENGINE_BASE_FLATTEN FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 to,
+                                        double t) {
     return easeAlong(function, from, to, t);
 }
 
 // Where the other forms negate the difference, this one takes it the other way round: that is
 // not the same where it wraps around.
 template <>
-long long ease(EasingFunction function, long long from, long long to, double t) {
+TARN_ENGINE_BASE_FLATTEN long long ease(EasingFunction function, long long from, long long to,
+                                        double t) {
     double const a = static_cast<double>(from);
     double const delta = static_cast<double>(difference(to, from));
     double const back = static_cast<double>(difference(from, to));
@@ -211,6 +262,32 @@ long long ease(EasingFunction function, long long from, long long to, double t) 
         return detail::truncate<long long>(a + (std::cos(t * kPi) - 1.0) * (back * 0.5));
     }
     return easeAlong(function, from, to, t);
+}
+
+template <>
+void easeEach(EasingFunction function, double from, double to, double const* progress,
+              std::size_t count, double* results) {
+    easeEachAlong(function, from, to, progress, count, results);
+}
+template <>
+void easeEach(EasingFunction function, long long from, long long to, double const* progress,
+              std::size_t count, long long* results) {
+    for (std::size_t i = 0; i < count; ++i) results[i] = ease(function, from, to, progress[i]);
+}
+template <>
+void easeEach(EasingFunction function, FloatVec2 from, FloatVec2 to, double const* progress,
+              std::size_t count, FloatVec2* results) {
+    easeEachAlong(function, from, to, progress, count, results);
+}
+template <>
+void easeEach(EasingFunction function, FloatVec3 from, FloatVec3 to, double const* progress,
+              std::size_t count, FloatVec3* results) {
+    easeEachAlong(function, from, to, progress, count, results);
+}
+template <>
+void easeEach(EasingFunction function, FloatVec4 from, FloatVec4 to, double const* progress,
+              std::size_t count, FloatVec4* results) {
+    easeEachAlong(function, from, to, progress, count, results);
 }
 
 template <>

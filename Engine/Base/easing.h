@@ -9,6 +9,7 @@
 #include <Engine/Base/optional.h>
 #include <Engine/Base/value.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <iosfwd>
 #include <string>
@@ -65,6 +66,29 @@ template <>
 TARN_ENGINE_BASE_EXPORT FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double);
 template <>
 TARN_ENGINE_BASE_EXPORT FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
+
+/// The points of one curve at many places: `results[i]` becomes `ease(function, from, to,
+/// progress[i])`, bit for bit, for each `i` below `count`. `results` may be `progress`; otherwise
+/// the two do not overlap. Allocates nothing. Numbers along the linear and the quadratic curves
+/// take a fraction of the time of single calls; for all others the call itself is saved.
+template <class T>
+void easeEach(EasingFunction function, T from, T to, double const* progress, std::size_t count,
+              T* results) = delete;
+template <>
+TARN_ENGINE_BASE_EXPORT void easeEach<double>(EasingFunction, double, double, double const*,
+                                              std::size_t, double*);
+template <>
+TARN_ENGINE_BASE_EXPORT void easeEach<long long>(EasingFunction, long long, long long,
+                                                 double const*, std::size_t, long long*);
+template <>
+TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec2>(EasingFunction, FloatVec2, FloatVec2,
+                                                 double const*, std::size_t, FloatVec2*);
+template <>
+TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec3>(EasingFunction, FloatVec3, FloatVec3,
+                                                 double const*, std::size_t, FloatVec3*);
+template <>
+TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec4>(EasingFunction, FloatVec4, FloatVec4,
+                                                 double const*, std::size_t, FloatVec4*);
 
 /// Two ends of different types: make them one, or one of them a `Value`. (The first parameter keeps
 /// `ease<double>(...)` out.)

@@ -1,4 +1,5 @@
-// Engine/Base/export.h: the mark of what the library shows to its callers.
+// Engine/Base/export.h: the marks of functions: what the library shows to its callers, and how it
+// is compiled.
 //
 //     TARN_ENGINE_BASE_EXPORT std::string typeToString(Type type);
 
@@ -33,6 +34,18 @@
 #else
 #define TARN_ENGINE_BASE_EXPORT
 #define TARN_ENGINE_BASE_EXPORT_INLINE
+#endif
+
+/// `TARN_ENGINE_BASE_FLATTEN` has everything that a function calls compiled into it. What reads a
+/// union in several steps is a switch over its alternatives in each of them, until the compiler
+/// sees all of the steps at once. `TARN_ENGINE_BASE_LIKELY` is a condition that mostly holds. Both
+/// are nothing to compilers that have no such mark.
+#if defined(__GNUC__)
+#define TARN_ENGINE_BASE_FLATTEN __attribute__((flatten))
+#define TARN_ENGINE_BASE_LIKELY(condition) __builtin_expect(!!(condition), 1)
+#else
+#define TARN_ENGINE_BASE_FLATTEN
+#define TARN_ENGINE_BASE_LIKELY(condition) (condition)
 #endif
 
 #endif

@@ -37,16 +37,6 @@ using Array = std::shared_ptr<std::vector<T> const>;
 template <class T>
 using MutableArray = std::shared_ptr<std::vector<T>>;
 
-/// A list of these elements. One allocation, and what the elements take.
-template <class T>
-Array<T> arrayOf(std::vector<T> elements) {
-    return std::make_shared<std::vector<T> const>(std::move(elements));
-}
-template <class T>
-Array<T> arrayOf(std::initializer_list<T> elements) {
-    return std::make_shared<std::vector<T> const>(elements);
-}
-
 struct Port;
 struct Connection;
 struct Patch;
@@ -59,6 +49,23 @@ TARN_ENGINE_BASE_EXPORT Array<Port> emptyPorts() noexcept;
 TARN_ENGINE_BASE_EXPORT Array<Connection> emptyConnections() noexcept;
 TARN_ENGINE_BASE_EXPORT Array<Patch> emptyPatches() noexcept;
 
+template <class T>
+Array<T> emptyArray() {
+    return std::make_shared<std::vector<T> const>();
+}
+template <>
+inline Array<Port> emptyArray() {
+    return emptyPorts();
+}
+template <>
+inline Array<Connection> emptyArray() {
+    return emptyConnections();
+}
+template <>
+inline Array<Patch> emptyArray() {
+    return emptyPatches();
+}
+
 [[noreturn]] TARN_ENGINE_BASE_EXPORT void listIsNull(char const* condition) noexcept;
 
 // What a list has. A null list is an assertion failure with the condition, which names it.
@@ -69,6 +76,18 @@ typename Pointer::element_type& elementsOf(Pointer const& list, char const* cond
 }
 
 }  // namespace detail
+
+/// A list of these elements. One allocation, and what the elements take. Empty lists of ports,
+/// connections and patches are the ones that new records share: they take none.
+template <class T>
+Array<T> arrayOf(std::vector<T> elements) {
+    if (elements.empty()) return detail::emptyArray<T>();
+    return std::make_shared<std::vector<T> const>(std::move(elements));
+}
+template <class T>
+Array<T> arrayOf(std::initializer_list<T> elements) {
+    return arrayOf(std::vector<T>(elements));
+}
 
 /// An input or output of a patch.
 struct Port {

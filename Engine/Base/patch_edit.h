@@ -47,7 +47,8 @@ public:
     /// The patch (the port) as it will be, to be changed in place; null for one that is not there
     /// or is removed. Valid until `commit`, whatever else is changed. The `id` stays, whatever is
     /// written there. Another list that is assigned to the patch takes the place of the former one
-    /// and of all changes made to that; the edit knows nothing of what is in it.
+    /// and of all changes made to that; the edit knows nothing of what is in it. (All empty lists
+    /// of new records and of `arrayOf` are one: assigning it where it was is no change.)
     TARN_ENGINE_BASE_EXPORT Patch* patch(unsigned long long id);
     TARN_ENGINE_BASE_EXPORT Port* inputPort(unsigned long long portId);
     TARN_ENGINE_BASE_EXPORT Port* outputPort(unsigned long long portId);

@@ -10,6 +10,7 @@
 #include <boost/variant/get.hpp>
 #include <boost/variant/static_visitor.hpp>
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <cfenv>
@@ -18,6 +19,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <initializer_list>
 #include <iostream>
 #include <locale>
 #include <string_view>
@@ -233,6 +235,13 @@ std::string const& negativeZero() {
     return text.value;
 }
 
+// Whether numbers are rounded to the nearest: in any other mode the two sums differ. The C library
+// takes ten times as long to say so, as it asks each unit of the processor.
+bool roundsToNearest() {
+    double const volatile tiny = 0x1p-60;
+    return 1.0 + tiny == 1.0 - tiny;
+}
+
 // Where numbers have no fraction and one decimal still fits into 64 bits.
 constexpr double kTwo52 = 4503599627370496.0;
 
@@ -253,6 +262,8 @@ std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     std::uint64_t const half = std::uint64_t(1) << (shift < 62 ? shift - 1 : 61);
     [[maybe_unused]] bool const negative = bits >> 63 != 0;
     if (rest == 0) return whole;
+    std::uint64_t const nearest = whole + (rest > half || (rest == half && whole % 2 != 0) ? 1 : 0);
+    if (roundsToNearest()) return nearest;
     switch (std::fegetround()) {
 #if defined(FE_UPWARD)
         case FE_UPWARD: return negative ? whole : whole + 1;
@@ -263,7 +274,7 @@ std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
 #if defined(FE_TOWARDZERO)
         case FE_TOWARDZERO: return whole;
 #endif
-        default: return whole + (rest > half || (rest == half && whole % 2 != 0) ? 1 : 0);
+        default: return nearest;
     }
 }
 
@@ -289,82 +300,104 @@ public:
         } while (multiple != 0);
         if (negative) *--begin = '-';
     }
-    operator std::string() const {
-        return std::string(static_cast<char const*>(begin), std::end(buffer));
+    // Until this is destroyed.
+    std::string_view text() const {
+        return {begin, static_cast<std::size_t>(std::end(buffer) - begin)};
     }
 
 private:
-    char buffer[48] = {};  // A sign, 16 digits, a point of a few bytes, two decimals.
+    char buffer[48] = {};  // A sign, 20 digits, a point of a few bytes, two decimals.
     char* begin = buffer + sizeof buffer;
 };
 
-// As the C library formats with "%.1f" from 1000.0 on and with "%.2f" below, without the zeros
-// that end it. What is no finite number is "nan" or "inf" behind its sign, on every platform.
-std::string numberText(double d) {
-    char const point = std::use_facet<std::numpunct<char>>(std::cout.getloc()).decimal_point();
+// That of `std::cout`'s locale. Most often it is the classic one, which is quickly seen.
+char decimalPoint() {
+    std::locale const locale = std::cout.getloc();
+    if (locale == std::locale::classic()) return '.';
+    return std::use_facet<std::numpunct<char>>(locale).decimal_point();
+}
+
+// Without the zeros that end it, and without a point with nothing behind it.
+std::string_view trimmed(std::string_view text, char point) {
+    if (std::size_t const position = text.find(point); position != std::string_view::npos) {
+        while (text.size() > position + 1 && text.back() == '0') text.remove_suffix(1);
+        if (text.size() == position + 1) text.remove_suffix(1);
+    }
+    return text == negativeZero() ? "0" : text;
+}
+
+// Appends the number as the C library formats it with "%.1f" from 1000.0 on and with "%.2f" below,
+// trimmed. What is no finite number is "nan" or "inf" behind its sign, on every platform.
+void appendNumber(std::string& text, double d) {
+    char const point = decimalPoint();
     bool const isNegative = std::signbit(d);
-    std::string text;
     if (std::abs(d) < kTwo52) {
         detail::RadixPoint const radix;
         bool const isUsual = point == '.' && radix.text[0] == '.' && radix.text[1] == '\0';
         int const decimals = std::abs(d) >= 1000.0 ? 1 : 2;
         std::uint64_t const multiple = roundedMultiple(d, decimals == 1 ? 10 : 100);
-        if (isUsual) return Digits(multiple, decimals, ".", true, isNegative && multiple != 0);
-        text = Digits(multiple, decimals, radix.text, false, isNegative);
+        bool const hasSign = isNegative && (multiple != 0 || !isUsual);
+        Digits const digits(multiple, decimals, radix.text, isUsual, hasSign);
+        text += isUsual ? digits.text() : trimmed(digits.text(), point);
     } else if (std::isfinite(d)) {
         char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
         std::snprintf(buffer, sizeof buffer, "%.1f", d);
-        text = buffer;
+        text += trimmed(buffer, point);
     } else {
-        text = std::string(isNegative ? "-" : "") + (std::isnan(d) ? "nan" : "inf");
+        char const* const name = std::isnan(d) ? "-nan" : "-inf";
+        text += trimmed(isNegative ? name : name + 1, point);
     }
-    if (std::size_t const position = text.find(point); position != std::string::npos) {
-        while (text.size() > position + 1 && text.back() == '0') text.pop_back();
-        if (text.size() == position + 1) text.pop_back();
-    }
-    return text == negativeZero() ? "0" : text;
 }
 
-struct ToStringVisitor : boost::static_visitor<std::string> {
-    std::string operator()(long long i) const { return std::to_string(i); }
+struct AppendText : boost::static_visitor<void> {
+    explicit AppendText(std::string& appendedTo) : text(appendedTo) {}
 
-    std::string operator()(double d) const { return numberText(d); }
-    std::string operator()(FloatVec2 const& v) const { return number(v.x) + ", " + number(v.y); }
-    std::string operator()(FloatVec3 const& v) const {
-        return number(v.x) + ", " + number(v.y) + ", " + number(v.z);
+    void operator()(long long i) const {
+        std::uint64_t const bits = static_cast<std::uint64_t>(i);
+        integer(i < 0 ? 0 - bits : bits, i < 0);
     }
-    std::string operator()(FloatVec4 const& v) const {
-        return number(v.x) + ", " + number(v.y) + ", " + number(v.z) + ", " + number(v.w);
-    }
-    std::string operator()(std::shared_ptr<FloatMat4 const> const& m) const {
-        std::string text;
-        if (!m) return text;
-        for (std::size_t i = 0; i < std::size(m->elements); ++i) {
-            text += number(m->elements[i]) + " ";
-            if (i % 4 == 3) text += "\n";
+    void operator()(double d) const { appendNumber(text, d); }
+    void operator()(FloatVec2 const& v) const { list({v.x, v.y}); }
+    void operator()(FloatVec3 const& v) const { list({v.x, v.y, v.z}); }
+    void operator()(FloatVec4 const& v) const { list({v.x, v.y, v.z, v.w}); }
+    void operator()(std::shared_ptr<FloatMat4 const> const& m) const {
+        for (std::size_t i = 0; m && i < std::size(m->elements); ++i) {
+            appendNumber(text, m->elements[i]);
+            text += i % 4 == 3 ? " \n" : " ";
         }
-        return text;
     }
-    std::string operator()(bool b) const { return b ? "1" : "0"; }
+    void operator()(bool b) const { text += b ? '1' : '0'; }
     template <Type resource>
-    std::string operator()(Value::ResourceID<resource> resourceId) const {
-        return std::to_string(resourceId.id);
+    void operator()(Value::ResourceID<resource> resourceId) const {
+        integer(resourceId.id, false);
     }
-    std::string operator()(std::shared_ptr<Path const> const& p) const {
-        return hasElements(p) ? "Path" : "Empty Path";
+    void operator()(std::shared_ptr<Path const> const& p) const {
+        text += hasElements(p) ? "Path" : "Empty Path";
     }
-    std::string operator()(std::shared_ptr<Unstructured const> const& u) const {
-        std::string const* const text = u ? u->ifString() : nullptr;
-        return text ? *text : "unstructured";
+    void operator()(std::shared_ptr<Unstructured const> const& u) const {
+        std::string const* const held = u ? u->ifString() : nullptr;
+        text += held ? std::string_view(*held) : "unstructured";
     }
-    std::string operator()(std::shared_ptr<std::string const> const& s) const {
-        return s ? *s : std::string();
+    void operator()(std::shared_ptr<std::string const> const& s) const {
+        if (s) text += *s;
     }
     template <class T>
-    std::string operator()(T const&) const = delete;
+    void operator()(T const&) const = delete;
 
 private:
-    std::string number(double d) const { return (*this)(d); }
+    void integer(std::uint64_t magnitude, bool isNegative) const {
+        text += Digits(magnitude, 0, "", true, isNegative).text();
+    }
+    void list(std::initializer_list<double> numbers) const {
+        char const* separator = "";
+        for (double const number : numbers) {
+            text += separator;
+            appendNumber(text, number);
+            separator = ", ";
+        }
+    }
+
+    std::string& text;
 };
 
 // Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
@@ -377,24 +410,12 @@ bool payloadsEqual(T const& a, T const& b) {
     return a == b;
 }
 
-// Compares with another union, which holds the same alternative.
-template <class Storage>
-struct EqualsContent : boost::static_visitor<bool> {
-    explicit EqualsContent(Storage const& other) : right(other) {}
-
-    template <class T>
-    bool operator()(T const& left) const {
-        return left == *boost::get<T>(&right);
-    }
-    template <class T>
-    bool operator()(std::shared_ptr<T const> const& left) const {
-        T const* const a = left.get();
-        T const* const b = boost::get<std::shared_ptr<T const>>(&right)->get();
-        return a == b || (a != nullptr && b != nullptr && payloadsEqual(*a, *b));
-    }
-
-    Storage const& right;
-};
+template <class T>
+bool payloadsEqual(std::shared_ptr<T const> const& left, std::shared_ptr<T const> const& right) {
+    T const* const a = left.get();
+    T const* const b = right.get();
+    return a == b || (a != nullptr && b != nullptr && payloadsEqual(*a, *b));
+}
 
 std::uint64_t combine(std::uint64_t seed, std::uint64_t word) {
     seed ^= word + 0x9e3779b97f4a7c15 + (seed << 6) + (seed >> 2);
@@ -641,12 +662,40 @@ Value Value::asType(Type type) const {
     assertionFailed("0", __func__, kModule, __LINE__);
 }
 
-bool Value::contentEquals(Value const& other) const {
-    return boost::apply_visitor(EqualsContent<Storage>(other.storage), storage);
+TARN_ENGINE_BASE_FLATTEN bool Value::contentEquals(Value const& other) const {
+    int const alternative = storage.which();
+    if (other.storage.which() != alternative) return false;
+    auto const same = [&](auto const* left) {
+        return payloadsEqual(*left, *boost::get<std::decay_t<decltype(*left)>>(&other.storage));
+    };
+    switch (kTypes[alternative]) {
+        case Type::Int: return same(boost::get<long long>(&storage));
+        case Type::Float: return same(boost::get<double>(&storage));
+        case Type::Vec2: return same(boost::get<FloatVec2>(&storage));
+        case Type::Vec3: return same(boost::get<FloatVec3>(&storage));
+        case Type::Vec4: return same(boost::get<FloatVec4>(&storage));
+        case Type::Mat4: return same(boost::get<std::shared_ptr<FloatMat4 const>>(&storage));
+        case Type::Boolean: return same(boost::get<bool>(&storage));
+        case Type::Image: return same(boost::get<ImageID>(&storage));
+        case Type::Video: return same(boost::get<VideoID>(&storage));
+        case Type::Sound: return same(boost::get<SoundID>(&storage));
+        case Type::Model: return same(boost::get<ModelID>(&storage));
+        case Type::Path: return same(boost::get<std::shared_ptr<Path const>>(&storage));
+        case Type::Unstructured:
+            return same(boost::get<std::shared_ptr<Unstructured const>>(&storage));
+        case Type::String: break;
+    }
+    return same(boost::get<std::shared_ptr<std::string const>>(&storage));
+}
+
+void appendText(std::string& text, Value const& value) {
+    boost::apply_visitor(AppendText(text), value.storage);
 }
 
 std::string to_string(Value const& value) {
-    return boost::apply_visitor(ToStringVisitor(), value.storage);
+    std::string text;
+    appendText(text, value);
+    return text;
 }
 
 bool TypeInfo::operator==(TypeInfo const& other) const {
@@ -683,6 +732,23 @@ std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural) {
 Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
     Value const& named = value;
     return castValueToType(named, typeInfo);
+}
+
+void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long first,
+                      std::size_t count, Value const** results) noexcept {
+    for (std::size_t done = 0; done < count;) {
+        // Up to the end of the loop, or to where the index wraps around.
+        std::size_t const start =
+            loop.empty() ? 0 : static_cast<std::size_t>((first + done) % loop.size());
+        std::size_t length = std::min(count - done, std::max<std::size_t>(loop.size(), 1) - start);
+        unsigned long long const untilWrap = 0 - (first + done);
+        if (untilWrap != 0 && untilWrap < length) length = static_cast<std::size_t>(untilWrap);
+        for (std::size_t i = 0; i < length; ++i) {
+            results[done + i] = loop.empty() ? &detail::castNullValue(typeInfo)
+                                             : &castValueToType(loop[start + i], typeInfo);
+        }
+        done += length;
+    }
 }
 
 Value const& detail::castNullValue(TypeInfo const& typeInfo) noexcept {

@@ -299,9 +299,11 @@ public:
     /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
     /// integer towards zero, kept in range, and 0 for a NaN.
     TARN_ENGINE_BASE_EXPORT operator long long() const noexcept;
-    TARN_ENGINE_BASE_EXPORT_INLINE operator double() const noexcept {
-        double const* number = boost::get<double>(&storage);
-        return number != nullptr ? *number : readDouble();
+    TARN_ENGINE_BASE_EXPORT_INLINE TARN_ENGINE_BASE_FLATTEN operator double() const noexcept {
+        if (TARN_ENGINE_BASE_LIKELY(storage.which() == kFloat)) {
+            return *boost::get<double>(&storage);
+        }
+        return readDouble();
     }
     TARN_ENGINE_BASE_EXPORT operator bool() const noexcept;
     /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
@@ -367,11 +369,12 @@ public:
 
     /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
     /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
-    TARN_ENGINE_BASE_EXPORT_INLINE bool operator==(Value const& other) const {
+    TARN_ENGINE_BASE_EXPORT_INLINE TARN_ENGINE_BASE_FLATTEN bool
+    operator==(Value const& other) const {
         if (storage.which() != other.storage.which()) return false;
-        double const* number = boost::get<double>(&storage);
-        return number != nullptr ? detail::equalNumbers(*number, double(other))
-                                 : contentEquals(other);
+        if (storage.which() != kFloat) return contentEquals(other);
+        return detail::equalNumbers(*boost::get<double>(&storage),
+                                    *boost::get<double>(&other.storage));
     }
     TARN_ENGINE_BASE_EXPORT_INLINE bool operator!=(Value const& other) const {
         return !(*this == other);
@@ -379,6 +382,7 @@ public:
 
 private:
     friend std::string to_string(Value const& value);
+    friend void appendText(std::string& text, Value const& value);
     friend struct std::hash<Value>;
 
     using Storage =
@@ -391,6 +395,10 @@ private:
                                       Type::Vec4,         Type::Mat4,  Type::Boolean, Type::Image,
                                       Type::Video,        Type::Sound, Type::Model,   Type::Path,
                                       Type::Unstructured, Type::String};
+
+    // Most values are numbers: they are looked for first.
+    static constexpr int kFloat = 1;
+    static_assert(kTypes[kFloat] == Type::Float);
 
     TARN_ENGINE_BASE_EXPORT double readDouble() const noexcept;
     // For values of the same alternative.
@@ -419,6 +427,11 @@ namespace tarn::engine {
 /// path "Path" or "Empty Path", data "unstructured" unless it is a string. The decimal point that
 /// is trimmed is that of `std::cout`'s locale at the call; nobody may change that locale meanwhile.
 TARN_ENGINE_BASE_EXPORT std::string to_string(Value const& value);
+
+/// Appends `to_string(value)` to `text`. Numbers and vectors of them need no string of their own:
+/// where `text` has room, nothing is allocated. A failing allocation leaves `text` as it was, or
+/// with the first components of a vector or a matrix.
+TARN_ENGINE_BASE_EXPORT void appendText(std::string& text, Value const& value);
 
 namespace detail {
 
@@ -504,6 +517,13 @@ TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typ
 TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
 indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long index) noexcept;
 
+/// The same for a range of indices: `results[i]` becomes the address of `indexLoopCasting(loop,
+/// typeInfo, first + i)`, for each `i` below `count`; the sum wraps around at 2^64. One division
+/// for all of them.
+TARN_ENGINE_BASE_EXPORT void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                                              unsigned long long first, std::size_t count,
+                                              Value const** results) noexcept;
+
 /// The empty loop that everyone shares; lives to program exit.
 TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();
 
@@ -519,6 +539,9 @@ TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo 
 // Implementation
 
 namespace detail {
+
+// `value`, or the bound of the port that it lies beyond.
+Value const& clamped(Value const& value, TypeInfo const& typeInfo) noexcept;
 
 // What an empty loop counts as, cast to the port.
 TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo) noexcept;
@@ -556,12 +579,17 @@ decltype(auto) Value::visit(Visitor&& visitor) const {
     return show(ifString() ? *ifString() : detail::neutralString());
 }
 
-inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) noexcept {
-    if (typeInfo.type != Type::Float || (!typeInfo.min && !typeInfo.max)) return value;
+TARN_ENGINE_BASE_FLATTEN inline Value const& detail::clamped(Value const& value,
+                                                             TypeInfo const& typeInfo) noexcept {
     double const number = value;
     if (typeInfo.min && detail::lessNumber(number, double(*typeInfo.min))) return *typeInfo.min;
     if (typeInfo.max && detail::lessNumber(double(*typeInfo.max), number)) return *typeInfo.max;
     return value;
+}
+
+inline Value const& castValueToType(Value const& value, TypeInfo const& typeInfo) noexcept {
+    if (typeInfo.type != Type::Float || (!typeInfo.min && !typeInfo.max)) return value;
+    return detail::clamped(value, typeInfo);
 }
 
 inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,

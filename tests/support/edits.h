@@ -23,6 +23,8 @@ struct Model {
     std::vector<Port> outputs;
     std::vector<Connection> connections;
     std::list<Model> children;
+    // Whether it was there before the edits.
+    bool isOriginal = false;
     // What has been touched since it was made.
     bool hasOtherInputs = false;
     bool hasOtherOutputs = false;
