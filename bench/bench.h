@@ -79,6 +79,8 @@ struct Operation {
 
     Operation& ours(Implementation run) { return peer("ours", std::move(run)); }
     Operation& peer(std::string who, Implementation run);
+    /// Whom ours is compared with, where that is not the best peer.
+    Operation& against(std::string peerName);
     /// What ours may cost, as a multiple of the best peer or of the one that is named.
     Operation& atMost(double multiple, std::string peerName = "");
     /// One of the rows that `--quick` measures.
@@ -87,7 +89,7 @@ struct Operation {
     std::string name;
     std::vector<Entry> entries = {};
     double target = 0.0;
-    std::string against = {};
+    std::string comparedWith = {};
     bool isQuick = false;
 };
 

@@ -99,7 +99,7 @@ void ofMany(std::string const& name, Work work) {
                                                   }
                                                   return work(d);
                                               }))
-        .atMost(1.5);
+        .atMost(2.0);
 }
 
 void memory() {

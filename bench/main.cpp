@@ -60,7 +60,7 @@ int runOne(std::string const& name, std::string const& who, int repetitions) {
 // All implementations of an operation, in another order in each round.
 Row measured(Operation const& operation, int rounds, int repetitions) {
     static std::mt19937 random(1);
-    Row row{operation.name, {}, operation.target, operation.against};
+    Row row{operation.name, {}, operation.target, operation.comparedWith};
     for (Operation::Entry const& entry : operation.entries) row.results.push_back({entry.who, {}});
     std::vector<std::size_t> order(row.results.size());
     for (std::size_t i = 0; i < order.size(); ++i) order[i] = i;
@@ -80,9 +80,9 @@ Row measured(Operation const& operation, int rounds, int repetitions) {
 
 void requireKnownPeers() {
     for (Operation const& operation : operations()) {
-        bool isKnown = operation.against.empty();
-        for (auto const& entry : operation.entries) isKnown |= entry.who == operation.against;
-        agree(isKnown, ("the peer of a target: " + operation.name).c_str());
+        bool isKnown = operation.comparedWith.empty();
+        for (auto const& entry : operation.entries) isKnown |= entry.who == operation.comparedWith;
+        agree(isKnown, ("the peer to compare with: " + operation.name).c_str());
     }
 }
 
@@ -94,7 +94,10 @@ Operation& Operation::peer(std::string who, Implementation run) {
 }
 Operation& Operation::atMost(double multiple, std::string peerName) {
     target = multiple;
-    against = std::move(peerName);
+    return against(std::move(peerName));
+}
+Operation& Operation::against(std::string peerName) {
+    comparedWith = std::move(peerName);
     return *this;
 }
 Operation& Operation::quick() {

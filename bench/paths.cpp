@@ -150,7 +150,7 @@ void polylines() {
         .ours(bench::doing(ourLines))
         .peer("QPainterPath", bench::doing(qtLines))
         .peer("cairo", bench::doing(cairoLines))
-        .atMost(0.8, "cairo")
+        .atMost(1.2)
         .quick();
     bench::operation("copy a polyline of 100,000")
         .ours(bench::on(ourLines, [](Path const& path) { return path; }))
@@ -160,13 +160,13 @@ void polylines() {
                                                      result.setElementPositionAt(0, 0, 0);
                                                      return result;
                                                  }))
-        .atMost(3.0)
+        .atMost(4.0)
         .quick();
     auto const equal = [](auto const& both) { return both.first == both.second; };
     bench::operation("== of polylines of 100,000")
         .ours(bench::on([] { return std::pair(ourLines(), ourLines()); }, equal))
         .peer("QPainterPath", bench::on([] { return std::pair(qtLines(), qtLines()); }, equal))
-        .atMost(1.5);
+        .atMost(1.7);
     bench::operation("destroy a polyline of 100,000")
         .ours(bench::onEach([] { return std::make_unique<Path>(ourLines()); },
                             [](std::unique_ptr<Path>& path) {

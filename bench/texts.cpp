@@ -79,4 +79,18 @@ void bench::texts() {
         .peer("QString::number", all(withQt))
         .atMost(0.75, "std::to_chars")
         .quick();
+    auto const append = [](std::vector<double> const& list) {
+        std::string text;
+        for (double const d : list) appendText(text, d);
+        return text;
+    };
+    auto const join = [](std::vector<double> const& list) {
+        std::string text;
+        for (double const d : list) text += to_string(Value(d));
+        return text;
+    };
+    operation("appendText of 10,000 numbers")
+        .ours(on(numbers, append))
+        .peer("to_string", on(numbers, join))
+        .atMost(1.0);
 }
