@@ -21,6 +21,7 @@
 #include <cstring>
 #include <initializer_list>
 #include <iostream>
+#include <limits>
 #include <locale>
 #include <string_view>
 #include <utility>
@@ -738,11 +739,12 @@ void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long 
                       std::size_t count, Value const** results) noexcept {
     for (std::size_t done = 0; done < count;) {
         // Up to the end of the loop, or to where the index wraps around.
-        std::size_t const start =
-            loop.empty() ? 0 : static_cast<std::size_t>((first + done) % loop.size());
-        std::size_t length = std::min(count - done, std::max<std::size_t>(loop.size(), 1) - start);
-        unsigned long long const untilWrap = 0 - (first + done);
-        if (untilWrap != 0 && untilWrap < length) length = static_cast<std::size_t>(untilWrap);
+        unsigned long long const index = first + done;
+        unsigned long long const left = std::numeric_limits<unsigned long long>::max() - index;
+        std::size_t const size = std::max<std::size_t>(loop.size(), 1);
+        std::size_t const start = static_cast<std::size_t>(index % size);
+        std::size_t length = std::min(count - done, size - start);
+        if (left < length) length = static_cast<std::size_t>(left) + 1;
         for (std::size_t i = 0; i < length; ++i) {
             results[done + i] = loop.empty() ? &detail::castNullValue(typeInfo)
                                              : &castValueToType(loop[start + i], typeInfo);
