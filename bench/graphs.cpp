@@ -308,7 +308,7 @@ void indexes(Inputs const& in) {
 }  // namespace
 
 void bench::graphs() {
-    for (std::size_t const size : {1000, 10000, 100000}) {
+    for (std::size_t const size : {1000u, 10000u, 100000u}) {
         Inputs const in(size);
         wholeGraphs(in);
         walks(in);

@@ -325,7 +325,7 @@ void expectEachIsTheSingleOne(T const& from, T const& to) {
         progress.push_back(static_cast<double>(random.below(30001)) / 10000.0 - 1.0);
     for (int f = -1; f <= kCurves; ++f) {
         // Around the size of the blocks that are computed at once.
-        for (std::size_t const count : {0, 1, 31, 32, 33, 64, 65, 150}) {
+        for (std::size_t const count : {0u, 1u, 31u, 32u, 33u, 64u, 65u, 150u}) {
             SCOPED_TRACE("curve " + std::to_string(f) + ", " + std::to_string(count));
             std::vector<T> results(count + 1, from);
             easeEach(EF(f), from, to, progress.data(), count, results.data());

@@ -1529,7 +1529,7 @@ TEST(IndexLoopCasting, OfARangeIsThatOfEachIndex) {
     TypeInfo const plain;
     for (Loop const& loop : {Loop(), Loop{0.5}, Loop{0.5, 1.5, 2.5}, Loop(100, 0.5)}) {
         for (unsigned long long const first : {0ULL, 1ULL, 250ULL, ULLONG_MAX - 3, ULLONG_MAX}) {
-            for (std::size_t const count : {0, 1, 2, 7, 300}) {
+            for (std::size_t const count : {0u, 1u, 2u, 7u, 300u}) {
                 for (TypeInfo const* const info : {&bounded, &plain}) {
                     SCOPED_TRACE(std::to_string(loop.size()) + " from " + std::to_string(first));
                     std::vector<Value const*> results(count + 1, nullptr);
