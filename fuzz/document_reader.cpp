@@ -5,6 +5,7 @@
 
 #include "animation/document.h"
 #include "animation/labels.h"
+#include "document_road/console.h"
 
 #include <sstream>
 
