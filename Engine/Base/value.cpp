@@ -237,7 +237,7 @@ std::string const& negativeZero() {
 }
 
 // Whether numbers are rounded to the nearest: in any other mode the two sums differ. The C library
-// takes ten times as long to say so, as it asks each unit of the processor.
+// asks the control word of the processor, which took a tenth of the time of a number's string.
 bool roundsToNearest() {
     double const volatile tiny = 0x1p-60;
     return 1.0 + tiny == 1.0 - tiny;

@@ -519,7 +519,7 @@ indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long 
 
 /// The same for a range of indices: `results[i]` becomes the address of `indexLoopCasting(loop,
 /// typeInfo, first + i)`, for each `i` below `count`; the sum wraps around at 2^64. One division
-/// for all of them.
+/// each time that the loop begins again.
 TARN_ENGINE_BASE_EXPORT void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
                                               unsigned long long first, std::size_t count,
                                               Value const** results) noexcept;
