@@ -1,4 +1,4 @@
-# Finds what the tests and the examples need. A part that is asked for (ON) fails without it; a part that
+# Finds what the tests, the examples and the Python module need. A part that is asked for (ON) fails without it; a part that
 # is AUTO is then left out, with a line that says for want of what.
 
 # tarn_find_part(PART PACKAGES ... PROGRAMS ...): afterwards TARN_ENGINE_BASE_BUILD_<PART> is true or OFF.
@@ -41,6 +41,12 @@ endfunction()
 
 tarn_find_part(DOCUMENT PACKAGES "nlohmann_json 3.11")
 tarn_find_part(EXAMPLES PACKAGES "nlohmann_json 3.11" "CLI11 2.1")
+
+if(TARN_ENGINE_BASE_BUILD_PYTHON)
+    set(PYBIND11_FINDPYTHON ON)
+    find_package(Python 3.9 REQUIRED COMPONENTS Interpreter Development.Module NumPy)
+    find_package(pybind11 2.10 REQUIRED)
+endif()
 
 # Debian's GoogleTest is compiled for this machine and g++'s library; for others it has the sources.
 set(TARN_TESTS_GTEST_SOURCE "" CACHE PATH "The sources of GoogleTest, or nothing for the installed one")

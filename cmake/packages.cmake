@@ -1,5 +1,5 @@
-# Debian packages, by `cpack -G DEB`: the library, what is needed to build with it, and its debug
-# symbols.
+# Debian packages, by `cpack -G DEB`: the libraries, what is needed to build with them, their debug symbols, and the
+# Python module.
 
 set(CPACK_PACKAGE_NAME tarn-engine-base)
 set(CPACK_PACKAGE_VENDOR "Tarn")
@@ -8,6 +8,9 @@ set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(components runtime development)
 if(TARN_ENGINE_BASE_BUILD_DOCUMENT)
     list(APPEND components document)
+endif()
+if(TARN_ENGINE_BASE_BUILD_PYTHON)
+    list(APPEND components python)
 endif()
 set(CPACK_COMPONENTS_ALL ${components})
 set(CPACK_COMPONENTS_GROUPING ONE_PER_GROUP)
@@ -19,6 +22,7 @@ set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "values and graphs of a node-based animati
 set(runtime_package "libtarn-engine-base${PROJECT_VERSION_MAJOR}")
 set(document_package "libtarn-engine-document${PROJECT_VERSION_MAJOR}")
 set(development_package libtarn-engine-base-dev)
+set(python_package python3-tarn-engine-base)
 set(about "The tagged value and its conversions, free-form data, the records of the patch
 graph and the queries over them, vector paths, easing curves, layers and
 naming tables.")
@@ -46,6 +50,17 @@ set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
 set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION
     "${about}\nThis package has the headers, CMake and pkg-config files, and debuggers' views.")
 
+# For the one version of Python that the module is compiled for.
+math(EXPR next_minor "${Python_VERSION_MINOR} + 1")
+set(python_version "${Python_VERSION_MAJOR}.${Python_VERSION_MINOR}")
+set(CPACK_DEBIAN_PYTHON_PACKAGE_NAME "${python_package}")
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SECTION python)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "${document_package} (= ${PROJECT_VERSION}-1), python3 (>= ${python_version}~), \
+python3 (<< ${Python_VERSION_MAJOR}.${next_minor}), python3-numpy")
+set(CPACK_DEBIAN_PYTHON_DEBUGINFO_PACKAGE ON)
+set(CPACK_COMPONENT_PYTHON_DESCRIPTION "${about}\nThis package has the Python module tarn_engine_base.")
+
 # Which package a program needs that was linked with the library, and that its cache has to know it.
 set(control "${CMAKE_CURRENT_BINARY_DIR}/debian-control")
 file(WRITE "${control}/base/shlibs"
@@ -53,10 +68,22 @@ file(WRITE "${control}/base/shlibs"
 file(WRITE "${control}/document/shlibs"
     "libtarn_engine_document ${PROJECT_VERSION_MAJOR} ${document_package} (>= ${PROJECT_VERSION})\n")
 file(WRITE "${control}/triggers" "activate-noawait ldconfig\n")
+# The files that Python writes beside a package are made when it is installed, and go with it.
+foreach(script postinst:py3compile prerm:py3clean)
+    string(REPLACE ":" ";" script "${script}")
+    list(GET script 0 name)
+    list(GET script 1 command)
+    file(WRITE "${control}/python/${name}" "#!/bin/sh
+set -e
+if command -v ${command} > /dev/null; then ${command} -p ${python_package}; fi
+")
+endforeach()
+set(CPACK_DEBIAN_PYTHON_PACKAGE_CONTROL_EXTRA "${control}/python/postinst;${control}/python/prerm")
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_EXTRA "${control}/base/shlibs;${control}/triggers")
 set(CPACK_DEBIAN_DOCUMENT_PACKAGE_CONTROL_EXTRA "${control}/document/shlibs;${control}/triggers")
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 set(CPACK_DEBIAN_DOCUMENT_PACKAGE_CONTROL_STRICT_PERMISSION ON)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 
 # Each package has its licence and its changelog, as Debian wants them.
 string(TIMESTAMP date "%a, %d %b %Y %H:%M:%S +0000" UTC)

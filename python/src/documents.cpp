@@ -1,0 +1,165 @@
+// Reading and writing documents.
+
+#include "casters.h"
+#include "conversions.h"
+#include "module.h"
+
+#include <Engine/Document/document.h>
+
+#include <pybind11/stl.h>
+
+#include <sstream>
+#include <string>
+#include <utility>
+
+using namespace tarn::engine;
+
+namespace tarn_python {
+
+namespace {
+
+py::handle& errorClass() {
+    static py::handle found;
+    return found;
+}
+
+[[noreturn]] void raiseDocumentError(DocumentError const& error) {
+    std::ostringstream line;
+    line << error;
+    py::object const raised = errorClass()(fromString(line.str()));
+    raised.attr("message") = fromString(error.message);
+    raised.attr("pointer") = fromString(error.pointer);
+    raised.attr("line") = error.line;
+    raised.attr("column") = error.column;
+    PyErr_SetObject(errorClass().ptr(), raised.ptr());
+    throw py::error_already_set();
+}
+
+std::string fileName(py::object const& file) {
+    return toString(py::module_::import("os").attr("fspath")(file));
+}
+
+struct Document {
+    Patch root;
+    DocumentInfo info;
+};
+
+template <class Read>
+Document documentFrom(Read read) {
+    DocumentError error;
+    DocumentInfo info;
+    Optional<Patch> root;
+    {
+        py::gil_scoped_release const released;
+        root = read(&error, &info);
+    }
+    if (!root) raiseDocumentError(error);
+    return {*std::move(root), std::move(info)};
+}
+
+Document fromText(py::object const& text) {
+    std::string const bytes = toString(text);
+    return documentFrom(
+        [&](DocumentError* error, DocumentInfo* info) { return readDocument(bytes, error, info); });
+}
+
+Document fromFile(py::object const& file) {
+    std::string const name = fileName(file);
+    return documentFrom(
+        [&](DocumentError* error, DocumentInfo* info) { return loadDocument(name, error, info); });
+}
+
+py::tuple pairOf(Document document) {
+    return py::make_tuple(std::move(document.root), std::move(document.info));
+}
+
+void defineError(py::module_& module) {
+    py::dict members;
+    members["__module__"] = "tarn_engine_base";
+    members["__doc__"] =
+        "A document that cannot be read: `message`, where it is (`pointer`, a JSON pointer), "
+        "`line` and `column`, from 1.";
+    py::object const type =
+        py::reinterpret_borrow<py::object>(reinterpret_cast<PyObject*>(&PyType_Type));
+    py::object made =
+        type("DocumentError", py::make_tuple(py::reinterpret_borrow<py::object>(PyExc_ValueError)),
+             members);
+    module.attr("DocumentError") = made;
+    errorClass() = made.release();
+}
+
+void defineInfo(py::module_& module) {
+    defineEnumeration<DocumentInfo::Form>(
+        module, "DocumentForm", "The forms that are read.",
+        {{"OWN", DocumentInfo::Form::Own}, {"NODE_GRAPH", DocumentInfo::Form::NodeGraph}});
+    py::class_<DocumentInfo>(module, "DocumentInfo",
+                             "What a document has beside its graph, and what reading it changed.")
+        .def_readonly("form", &DocumentInfo::form, "A DocumentForm.")
+        .def_readonly("frames_per_second", &DocumentInfo::framesPerSecond, "Above 0.")
+        .def_readonly("renumbered_nodes", &DocumentInfo::renumberedNodes,
+                      "How many nodes of a node graph got another identifier than theirs.")
+        .def_readonly("omitted_links", &DocumentInfo::omittedLinks,
+                      "How many links of a node graph lead to or from nothing and were left out.")
+        .def_readonly("unused_definitions", &DocumentInfo::unusedDefinitions,
+                      "How many shared definitions of a node graph no node uses.")
+        .def_readonly("notes", &DocumentInfo::notes,
+                      "The first hundred of those links, a line each.")
+        .def("summary", &DocumentInfo::summary, "The counts in one line; empty where all are 0.");
+    requireInit<DocumentInfo>();
+}
+
+}  // namespace
+
+void defineDocuments(py::module_& module) {
+    defineError(module);
+    defineInfo(module);
+    module.def(
+        "read_document", [](py::object const& text) { return fromText(text).root; },
+        py::arg("text"),
+        "The graph of a document of our own form, or of a browser-based node editor's export, in a "
+        "str or bytes. Raises DocumentError.");
+    module.def(
+        "read_document_with_info", [](py::object const& text) { return pairOf(fromText(text)); },
+        py::arg("text"), "The graph, and a DocumentInfo.");
+    module.def(
+        "load_document", [](py::object const& file) { return fromFile(file).root; },
+        py::arg("file"), "The graph of a file. Raises DocumentError.");
+    module.def(
+        "load_document_with_info", [](py::object const& file) { return pairOf(fromFile(file)); },
+        py::arg("file"), "The graph of a file, and a DocumentInfo.");
+    module.def(
+        "write_document",
+        [](Patch const& root, double framesPerSecond) {
+            return fromString(writeDocument(root, framesPerSecond));
+        },
+        py::arg("root"), py::arg("frames_per_second") = 60.0,
+        "The document of our own form; equal graphs give equal strings.");
+    module.def(
+        "save_document",
+        [](py::object const& file, Patch const& root, double framesPerSecond) {
+            std::string const name = fileName(file);
+            DocumentError error;
+            bool saved = false;
+            {
+                py::gil_scoped_release const released;
+                saved = saveDocument(name, root, framesPerSecond, &error);
+            }
+            if (saved) return;
+            PyErr_SetString(PyExc_OSError, (name + ": " + error.message).c_str());
+            throw py::error_already_set();
+        },
+        py::arg("file"), py::arg("root"), py::arg("frames_per_second") = 60.0,
+        "Replaces the file in one step: whoever reads it finds the old content or the new one. "
+        "Raises OSError where that fails, and leaves the file as it was.");
+    module.def("kind_to_string", &kindToString, py::arg("builtin"),
+               "The name of a built-in kind, or an empty string.");
+    module.def(
+        "string_to_kind",
+        [](std::string const& name) -> py::object {
+            Optional<unsigned long long> const kind = stringToKind(name);
+            return kind ? py::cast(*kind) : py::object(py::none());
+        },
+        py::arg("name"), "The number of the built-in kind of that name, or None.");
+}
+
+}  // namespace tarn_python

@@ -1,0 +1,277 @@
+// Edits of a graph, and what differs between two graphs.
+
+#include "conversions.h"
+#include "module.h"
+#include "records.h"
+
+#include <Engine/Base/patch_changes.h>
+#include <Engine/Base/patch_edit.h>
+
+#include <pybind11/stl.h>
+
+#include <cstddef>
+#include <memory>
+#include <optional>
+#include <string>
+#include <unordered_map>
+#include <utility>
+#include <vector>
+
+using namespace tarn::engine;
+
+namespace tarn_python {
+
+namespace {
+
+using Id = unsigned long long;
+using Position = std::optional<std::size_t>;
+
+// An edit that knows how deep the graph will be: only so many levels are ever made.
+struct Edit {
+    PatchEdit edit;
+    PatchIndex before;
+    // Of patches that the edit added or moved.
+    std::unordered_map<Id, Id> parents = {};
+    // Of everything that was added or moved, together.
+    std::size_t levels = 0;
+
+    explicit Edit(PatchIndex const& index) : edit(index), before(index) {}
+
+    std::size_t levelOf(Id id) const {
+        std::size_t level = 1;
+        for (;;) {
+            auto const found = parents.find(id);
+            Patch const* const parent = found == parents.end() ? before.parentOf(id) : nullptr;
+            if (found != parents.end()) {
+                id = found->second;
+            } else if (parent != nullptr) {
+                id = parent->id;
+            } else {
+                return level;
+            }
+            ++level;
+        }
+    }
+
+    bool addPatch(Id parent, Patch const& patch, Position position) {
+        requireLevels(levelOf(parent) + levelsOf(patch));
+        if (!edit.addPatch(parent, patch, position.value_or(PatchEdit::kEnd))) return false;
+        parents[patch.id] = parent;
+        std::vector<Patch const*> pending{&patch};
+        while (!pending.empty()) {
+            Patch const& added = *pending.back();
+            pending.pop_back();
+            for (Patch const& child : *added.children) {
+                parents[child.id] = added.id;
+                pending.push_back(&child);
+            }
+        }
+        levels += levelsOf(patch);
+        return true;
+    }
+
+    bool movePatch(Id id, Id parent, Position position) {
+        Patch const* const moved = before.findPatch(id);
+        std::size_t const inside = levels + (moved != nullptr ? levelsOf(*moved) : 0);
+        requireLevels(levelOf(parent) + inside);
+        if (!edit.movePatch(id, parent, position.value_or(PatchEdit::kEnd))) return false;
+        parents[id] = parent;
+        levels = inside;
+        return true;
+    }
+
+    void assignChildren(Id id, std::vector<Patch> children) {
+        Patch changed = *edit.patch(id);
+        changed.children = arrayOf(std::move(children));
+        std::size_t const inside = levelsOf(changed);
+        requireLevels(levelOf(id) - 1 + inside);
+        edit.patch(id)->children = std::move(changed.children);
+        levels += inside;
+    }
+};
+
+using SharedEdit = std::shared_ptr<Edit>;
+
+// Looked up at each use: nothing refers into an edit that is done.
+struct PatchInEdit {
+    SharedEdit edit;
+    Id id;
+
+    Patch& get() const {
+        Patch* const patch = edit->edit.patch(id);
+        if (patch == nullptr) {
+            throw py::value_error("patch " + std::to_string(id) +
+                                  " was removed, or the edit is committed");
+        }
+        return *patch;
+    }
+};
+
+struct PortInEdit {
+    SharedEdit edit;
+    Id id;
+    bool isInput;
+
+    Port& get() const {
+        Port* const port = isInput ? edit->edit.inputPort(id) : edit->edit.outputPort(id);
+        if (port == nullptr) {
+            throw py::value_error("port " + std::to_string(id) +
+                                  " was removed, or the edit is committed");
+        }
+        return *port;
+    }
+};
+
+template <bool isInput>
+py::object portIn(SharedEdit const& edit, Id id) {
+    Port const* const port = isInput ? edit->edit.inputPort(id) : edit->edit.outputPort(id);
+    return port != nullptr ? py::cast(PortInEdit{edit, id, isInput}) : py::object(py::none());
+}
+
+void defineParts(py::module_& module) {
+    py::class_<PatchInEdit> patch(module, "PatchInEdit",
+                                  "A patch as it will be after an edit. Raises ValueError once the "
+                                  "patch is removed or the edit committed.");
+    patch.def_property_readonly(
+        "id", [](PatchInEdit const& p) { return p.get().id; }, "The identifier, which stays.");
+    definePatchFields(
+        patch, [](PatchInEdit& p) -> Patch& { return p.get(); },
+        [](PatchInEdit& p, std::vector<Patch> children) {
+            p.get();
+            p.edit->assignChildren(p.id, std::move(children));
+        });
+    py::class_<PortInEdit> port(module, "PortInEdit",
+                                "A port as it will be after an edit. Raises ValueError once the "
+                                "port is removed or the edit committed.");
+    port.def_property_readonly(
+        "id", [](PortInEdit const& p) { return p.get().id; }, "The identifier, which stays.");
+    definePortFields(port, [](PortInEdit& p) -> Port& { return p.get(); });
+    requireInit<PatchInEdit>();
+    requireInit<PortInEdit>();
+}
+
+void defineEdit(py::module_& module) {
+    py::class_<Edit, SharedEdit>(module, "PatchEdit",
+                                 "Changes to a graph, made at once by `commit`. Functions that "
+                                 "cannot do what is asked for give False or None and change "
+                                 "nothing. Afterwards the edit is done: it gives None and False.")
+        .def(py::init<PatchIndex const&>(), py::arg("index"))
+        .def(
+            "patch",
+            [](SharedEdit const& e, Id id) -> py::object {
+                if (e->edit.patch(id) == nullptr) return py::none();
+                return py::cast(PatchInEdit{e, id});
+            },
+            py::arg("id"), "The patch as it will be, to be changed in place, or None.")
+        .def("input_port", &portIn<true>, py::arg("port_id"),
+             "The input as it will be, to be changed in place, or None.")
+        .def("output_port", &portIn<false>, py::arg("port_id"),
+             "The output as it will be, to be changed in place, or None.")
+        .def(
+            "add_input_port",
+            [](Edit& e, Id id, Port const& port, Position position) {
+                return e.edit.addInputPort(id, port, position.value_or(PatchEdit::kEnd));
+            },
+            py::arg("patch_id"), py::arg("port"), py::arg("position") = Position(),
+            "Adds an input to the patch, ahead of the one at `position`, or at the end. False "
+            "where its identifier is 0 or taken.")
+        .def(
+            "add_output_port",
+            [](Edit& e, Id id, Port const& port, Position position) {
+                return e.edit.addOutputPort(id, port, position.value_or(PatchEdit::kEnd));
+            },
+            py::arg("patch_id"), py::arg("port"), py::arg("position") = Position(),
+            "Adds an output to the patch, as `add_input_port` does an input.")
+        .def(
+            "remove_input_port", [](Edit& e, Id id) { return e.edit.removeInputPort(id); },
+            py::arg("port_id"), "Removes the input and the connections that lead to it.")
+        .def(
+            "remove_output_port", [](Edit& e, Id id) { return e.edit.removeOutputPort(id); },
+            py::arg("port_id"), "Removes the output and the connections that start at it.")
+        .def("add_patch", &Edit::addPatch, py::arg("parent_id"), py::arg("patch"),
+             py::arg("position") = Position(),
+             "Adds a patch with all that is inside, ahead of the child at `position`, or at the "
+             "end. False where an identifier in it is 0, repeated or taken; ValueError beyond "
+             "10,000 levels.")
+        .def(
+            "remove_patch", [](Edit& e, Id id) { return e.edit.removePatch(id); }, py::arg("id"),
+            "Removes the patch with all that is inside, and its connections. The root stays.")
+        .def("move_patch", &Edit::movePatch, py::arg("id"), py::arg("parent_id"),
+             py::arg("position") = Position(),
+             "Moves the patch to the children of another. Connections of a parent that it leaves "
+             "are removed. False for the root and for a parent inside the patch; ValueError where "
+             "10,000 levels may not be enough: then commit what was added and moved before.")
+        .def(
+            "connect", [](Edit& e, Connection const& c) { return e.edit.connect(c); },
+            py::arg("connection"),
+            "False where it is there already, and where its ends are not an output and an input "
+            "of two children of one patch.")
+        .def(
+            "disconnect", [](Edit& e, Connection const& c) { return e.edit.disconnect(c); },
+            py::arg("connection"), "False where there is no such connection.")
+        .def(
+            "fresh_patch_id", [](Edit& e) { return e.edit.freshPatchId(); },
+            "An identifier that no patch has or had; each call gives another.")
+        .def(
+            "fresh_port_id", [](Edit& e) { return e.edit.freshPortId(); },
+            "An identifier that no port has or had; each call gives another.")
+        .def(
+            "commit", [](Edit& e) { return e.edit.commit(); },
+            "The new root; it shares all lists that nothing changed.");
+    requireInit<Edit>();
+}
+
+// A change with the patches themselves instead of pointers into two documents.
+struct Change {
+    PatchChange::Kind kind;
+    Id id;
+    py::object before;
+    py::object after;
+    std::string text;
+};
+
+py::object patchOf(Patch const* patch) {
+    return patch != nullptr ? py::cast(*patch) : py::object(py::none());
+}
+
+void defineChanges(py::module_& module) {
+    using Kind = PatchChange::Kind;
+    defineEnumeration<Kind>(module, "PatchChangeKind", "What happened to a patch.",
+                            {{"ADDED", Kind::Added},
+                             {"REMOVED", Kind::Removed},
+                             {"MOVED", Kind::Moved},
+                             {"CHANGED", Kind::Changed}});
+    py::class_<Change>(module, "PatchChange",
+                       "One change of one patch; `str` says it in a line, with names and values.")
+        .def_readonly("kind", &Change::kind, "A PatchChangeKind.")
+        .def_readonly("id", &Change::id, "The patch.")
+        .def_readonly("before", &Change::before, "The patch, or None for one that was added.")
+        .def_readonly("after", &Change::after, "The patch, or None for one that was removed.")
+        .def("__str__", [](Change const& c) { return fromString(c.text); })
+        .def("__repr__", [](Change const& c) {
+            return "<PatchChange: " + py::cast<std::string>(fromString(c.text)) + ">";
+        });
+    requireInit<Change>();
+    module.def(
+        "patch_changes",
+        [](Patch const& before, Patch const& after) {
+            py::list list;
+            for (PatchChange const& c : patchChanges(before, after)) {
+                list.append(py::cast(
+                    Change{c.kind, c.id, patchOf(c.before), patchOf(c.after), to_string(c)}));
+            }
+            return list;
+        },
+        py::arg("before"), py::arg("after"),
+        "What differs, as a list of changes; empty where the two are equal.");
+}
+
+}  // namespace
+
+void defineEdits(py::module_& module) {
+    defineParts(module);
+    defineEdit(module);
+    defineChanges(module);
+}
+
+}  // namespace tarn_python

@@ -1,0 +1,19 @@
+// python/src/module.h: the parts of the module, each defined in a file of its own.
+
+#ifndef TARN_PYTHON_MODULE_H
+#define TARN_PYTHON_MODULE_H
+
+#include <pybind11/pybind11.h>
+
+namespace tarn_python {
+
+void defineValues(pybind11::module_& module);
+void definePaths(pybind11::module_& module);
+void defineEasing(pybind11::module_& module);
+void defineGraphs(pybind11::module_& module);
+void defineEdits(pybind11::module_& module);
+void defineDocuments(pybind11::module_& module);
+
+}  // namespace tarn_python
+
+#endif
