@@ -147,8 +147,8 @@ private:
 
     bool readCommand(char command) {
         bool const isRelative = command >= 'a';
-        auto const pointAt = [&](auto const& numbers, std::size_t i) {
-            FloatVec2 const p{numbers[i], numbers[i + 1]};
+        auto const point = [&](double x, double y) {
+            FloatVec2 const p{x, y};
             return isRelative ? current() + p : p;
         };
         char const kind = isRelative ? static_cast<char>(command - 'a' + 'A') : command;
@@ -158,14 +158,14 @@ private:
             case 'M': {
                 std::array<double, 2> n;
                 if (!readNumbers(n)) return false;
-                start = pointAt(n, 0);
+                start = point(n[0], n[1]);
                 builder.moveTo(start);
                 return true;
             }
             case 'L': {
                 std::array<double, 2> n;
                 if (!readNumbers(n)) return false;
-                drawing().lineTo(pointAt(n, 0));
+                drawing().lineTo(point(n[0], n[1]));
                 return true;
             }
             case 'H': {
@@ -183,24 +183,25 @@ private:
             case 'C': {
                 std::array<double, 6> n;
                 if (!readNumbers(n)) return false;
-                return cubicTo(pointAt(n, 0), pointAt(n, 2), pointAt(n, 4));
+                return cubicTo(point(n[0], n[1]), point(n[2], n[3]), point(n[4], n[5]));
             }
             case 'S': {
                 std::array<double, 4> n;
                 if (!readNumbers(n)) return false;
                 bool const goesOn = before == 'C' || before == 'S';
-                return cubicTo(goesOn ? reflected() : current(), pointAt(n, 0), pointAt(n, 2));
+                return cubicTo(goesOn ? reflected() : current(), point(n[0], n[1]),
+                               point(n[2], n[3]));
             }
             case 'Q': {
                 std::array<double, 4> n;
                 if (!readNumbers(n)) return false;
-                return quadraticTo(pointAt(n, 0), pointAt(n, 2));
+                return quadraticTo(point(n[0], n[1]), point(n[2], n[3]));
             }
             case 'T': {
                 std::array<double, 2> n;
                 if (!readNumbers(n)) return false;
                 bool const goesOn = before == 'Q' || before == 'T';
-                return quadraticTo(goesOn ? reflected() : current(), pointAt(n, 0));
+                return quadraticTo(goesOn ? reflected() : current(), point(n[0], n[1]));
             }
             case 'A': {
                 std::array<double, 3> shape;
@@ -211,7 +212,7 @@ private:
                     return false;
                 skipSpaceAndComma();
                 if (!readNumbers(n)) return false;
-                arcTo({shape[0], shape[1]}, shape[2], isLarge, isClockwise, pointAt(n, 0));
+                arcTo({shape[0], shape[1]}, shape[2], isLarge, isClockwise, point(n[0], n[1]));
                 return true;
             }
             default:

@@ -4,6 +4,7 @@ import copy
 import gc
 import pickle
 import random
+import threading
 from pathlib import Path as FilePath
 from typing import Any
 
@@ -201,13 +202,26 @@ def test_a_fault_has_its_place(text: str, line: int, column: int, pointer: str) 
 
 
 def test_deep_graphs_need_no_stack_of_python() -> None:
-    patch = Patch(id=10_000)
-    for i in range(9_999, 0, -1):
-        patch = Patch(id=i, children=[patch])
-    assert patch == pickle.loads(pickle.dumps(patch))
-    index = PatchIndex(patch)
-    deepest = index.find_patch(10_000)
-    assert deepest is not None and deepest.id == 10_000
+    def check() -> None:
+        patch = Patch(id=10_000)
+        for i in range(9_999, 0, -1):
+            patch = Patch(id=i, children=[patch])
+        assert patch == pickle.loads(pickle.dumps(patch))
+        assert str(patch).count("[patch:") == 10_000
+        index = PatchIndex(patch)
+        edit = PatchEdit(index)
+        deepest = edit.patch(10_000)
+        assert deepest is not None
+        deepest.name = "deepest"
+        assert len(tarn.patch_changes(patch, edit.commit())) == 1
+        checked.append(True)
+
+    checked: list[bool] = []
+    check()
+    thread = threading.Thread(target=check)
+    thread.start()
+    thread.join()
+    assert checked == [True, True]
 
 
 def test_no_graph_is_deeper_than_a_stack_allows() -> None:
