@@ -382,7 +382,7 @@ py::object payloadOf(Value const& value) {
                 double const* const row = m.elements + 4 * i;
                 rows[i] = py::make_tuple(row[0], row[1], row[2], row[3]);
             }
-            return std::move(rows);
+            return rows;
         }
         py::object operator()(bool b) const { return py::bool_(b); }
         py::object operator()(Value::ImageID) const { return {}; }
