@@ -86,7 +86,7 @@ class Animation:
 
 def main(document: str, picture: str, frame_count: str = "121") -> int:
     root, info = tarn.load_document_with_info(document)
-    frames = np.arange(float(frame_count))
+    frames: Frames = np.arange(float(frame_count), dtype=np.float64)
     animation = Animation(root, frames / info.frames_per_second, frames)
     figure, axes = plt.subplots(figsize=(8, 4))
     for patch in patches(root):
