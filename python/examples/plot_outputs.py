@@ -7,6 +7,7 @@ comes from a kind of patch that is not known here, is left out.
 """
 
 import sys
+from typing import Any
 
 import matplotlib
 
@@ -19,7 +20,7 @@ import numpy.typing as npt  # noqa: E402
 import tarn_engine_base as tarn  # noqa: E402
 from list_ports import patches  # noqa: E402
 
-Frames = npt.NDArray[np.float64]
+Frames = npt.NDArray[np.floating[Any]]
 
 
 class Animation:
@@ -86,7 +87,7 @@ class Animation:
 
 def main(document: str, picture: str, frame_count: str = "121") -> int:
     root, info = tarn.load_document_with_info(document)
-    frames: Frames = np.arange(float(frame_count), dtype=np.float64)
+    frames: Frames = np.arange(float(frame_count))
     animation = Animation(root, frames / info.frames_per_second, frames)
     figure, axes = plt.subplots(figsize=(8, 4))
     for patch in patches(root):
