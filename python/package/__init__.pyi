@@ -1,7 +1,7 @@
 import enum
 import os
 from collections.abc import Iterable, Mapping, Sequence
-from typing import Any, Final, Union, overload
+from typing import Any, ClassVar, Final, Union, overload
 
 import numpy as np
 import numpy.typing as npt
@@ -62,13 +62,14 @@ __all__ = [
 __version__: Final[str]
 
 # `Any` inside of data: a type that contains itself is more than checkers of today follow.
-_Data = Union[None, int, float, str, list[Any], tuple[Any, ...], dict[str, Any], "Unstructured"]
+_Data = Union[None, int, float, str, Sequence[Any], Mapping[str, Any], npt.NDArray[Any], np.generic, "Unstructured"]
 _Number = Union[int, float, np.number[Any]]
 _Vector = Union[Sequence[_Number], npt.NDArray[Any]]
 _ValueLike = Union[
-    "Value", float, int, bool, str, _Vector, Sequence[Sequence[_Number]], "Path", "Unstructured", dict[str, Any]
+    "Value", float, int, bool, str, np.generic, _Vector, Sequence[Sequence[_Number]], "Path", "Unstructured", Mapping[str, Any]
 ]
 _FloatArray = npt.NDArray[np.float64]
+_Progress = Union[float, np.number[Any], "Value"]
 _File = Union[str, bytes, os.PathLike[str]]
 
 class Type(enum.IntEnum):
@@ -149,6 +150,7 @@ class Value:
     def as_type(self, type: Type) -> Value: ...
 
 class TypeInfo:
+    __hash__: ClassVar[None]  # type: ignore[assignment]
     type: Type
     subtype: int
     def __init__(
@@ -187,6 +189,7 @@ def path_instruction_to_string(instruction: PathInstruction) -> str: ...
 def string_to_path_instruction(name: str) -> PathInstruction: ...
 
 class PathElement:
+    __hash__: ClassVar[None]  # type: ignore[assignment]
     def __init__(
         self, instruction: PathInstruction, points: Iterable[_Vector] | npt.NDArray[Any] = ()
     ) -> None: ...
@@ -246,19 +249,20 @@ class EasingFunction(enum.IntEnum):
 def easing_function_names() -> list[str]: ...
 def string_to_easing_function(name: str) -> EasingFunction | None: ...
 @overload
-def ease(function: EasingFunction, start: Value, end: _ValueLike, t: float, /) -> Value: ...
+def ease(function: EasingFunction, start: Value, end: _ValueLike, t: _Progress, /) -> Value: ...
 @overload
-def ease(function: EasingFunction, start: _ValueLike, end: Value, t: float, /) -> Value: ...
+def ease(function: EasingFunction, start: _ValueLike, end: Value, t: _Progress, /) -> Value: ...
 @overload
-def ease(function: EasingFunction, start: float, end: float, t: float, /) -> float: ...
+def ease(function: EasingFunction, start: float, end: float, t: _Progress, /) -> float: ...
 @overload
-def ease(function: EasingFunction, start: _Vector, end: _Vector, t: float, /) -> tuple[float, ...]: ...
+def ease(function: EasingFunction, start: _Vector, end: _Vector, t: _Progress, /) -> tuple[float, ...]: ...
 @overload
 def ease(
     function: EasingFunction, start: float | _Vector, end: float | _Vector, t: npt.NDArray[Any] | Sequence[Any], /
 ) -> _FloatArray: ...
 
 class ModelLayer:
+    __hash__: ClassVar[None]  # type: ignore[assignment]
     def __init__(
         self, id: int = 0, children: Iterable[ModelLayer] = (), additional_layers: Iterable[ModelLayer] = ()
     ) -> None: ...
@@ -292,9 +296,10 @@ class _PortFields:
     @property
     def attributes(self) -> Mapping[str, Any]: ...
     @attributes.setter
-    def attributes(self, attributes: dict[str, Any]) -> None: ...
+    def attributes(self, attributes: Mapping[str, Any]) -> None: ...
 
 class Port(_PortFields):
+    __hash__: ClassVar[None]  # type: ignore[assignment]
     id: int
     def __init__(
         self,
@@ -303,7 +308,7 @@ class Port(_PortFields):
         name: str = "",
         type_info: TypeInfo = ...,
         default_value: _ValueLike = 0.0,
-        attributes: dict[str, Any] = ...,
+        attributes: Mapping[str, Any] = ...,
     ) -> None: ...
 
 class _PatchFields:
@@ -330,9 +335,10 @@ class _PatchFields:
     @property
     def attributes(self) -> Mapping[str, Any]: ...
     @attributes.setter
-    def attributes(self, attributes: dict[str, Any]) -> None: ...
+    def attributes(self, attributes: Mapping[str, Any]) -> None: ...
 
 class Patch(_PatchFields):
+    __hash__: ClassVar[None]  # type: ignore[assignment]
     id: int
     def __init__(
         self,
@@ -343,7 +349,7 @@ class Patch(_PatchFields):
         outputs: Iterable[Port] = (),
         children: Iterable[Patch] = (),
         connections: Iterable[Connection] = (),
-        attributes: dict[str, Any] = ...,
+        attributes: Mapping[str, Any] = ...,
         descriptor: str = "",
         model_layer: ModelLayer = ...,
     ) -> None: ...
@@ -416,6 +422,7 @@ class DocumentError(ValueError):
     pointer: str
     line: int
     column: int
+    file: str
 
 class DocumentForm(enum.IntEnum):
     OWN = 0
@@ -436,8 +443,8 @@ class DocumentInfo:
     def notes(self) -> list[str]: ...
     def summary(self) -> str: ...
 
-def read_document(text: str | bytes) -> Patch: ...
-def read_document_with_info(text: str | bytes) -> tuple[Patch, DocumentInfo]: ...
+def read_document(text: str | bytes | bytearray) -> Patch: ...
+def read_document_with_info(text: str | bytes | bytearray) -> tuple[Patch, DocumentInfo]: ...
 def load_document(file: _File) -> Patch: ...
 def load_document_with_info(file: _File) -> tuple[Patch, DocumentInfo]: ...
 def write_document(root: Patch, frames_per_second: float = 60.0) -> str: ...

@@ -23,20 +23,25 @@ py::handle& errorClass() {
     return found;
 }
 
-[[noreturn]] void raiseDocumentError(DocumentError const& error) {
+// `file` is the name of the document's file, or empty.
+[[noreturn]] void raiseDocumentError(DocumentError const& error, std::string const& file) {
     std::ostringstream line;
+    if (!file.empty()) line << file << ": ";
     line << error;
     py::object const raised = errorClass()(fromString(line.str()));
     raised.attr("message") = fromString(error.message);
     raised.attr("pointer") = fromString(error.pointer);
     raised.attr("line") = error.line;
     raised.attr("column") = error.column;
+    raised.attr("file") = fromString(file);
     PyErr_SetObject(errorClass().ptr(), raised.ptr());
     throw py::error_already_set();
 }
 
 std::string fileName(py::object const& file) {
-    return toString(py::module_::import("os").attr("fspath")(file));
+    std::string name = toString(py::module_::import("os").attr("fspath")(file));
+    if (name.find('\0') != std::string::npos) raise(PyExc_ValueError, "embedded null character");
+    return name;
 }
 
 struct Document {
@@ -44,29 +49,30 @@ struct Document {
     DocumentInfo info;
 };
 
-template <class Read>
-Document documentFrom(Read read) {
+Document read(std::string const& text, std::string const& file) {
     DocumentError error;
     DocumentInfo info;
     Optional<Patch> root;
     {
         py::gil_scoped_release const released;
-        root = read(&error, &info);
+        root = readDocument(text, &error, &info);
     }
-    if (!root) raiseDocumentError(error);
+    if (!root) raiseDocumentError(error, file);
     return {*std::move(root), std::move(info)};
 }
 
 Document fromText(py::object const& text) {
-    std::string const bytes = toString(text);
-    return documentFrom(
-        [&](DocumentError* error, DocumentInfo* info) { return readDocument(bytes, error, info); });
+    if (PyByteArray_Check(text.ptr())) return read(py::bytes(text), "");
+    return read(toString(text), "");
 }
 
+// By Python, which raises what its programs expect where a file is missing or may not be read.
 Document fromFile(py::object const& file) {
     std::string const name = fileName(file);
-    return documentFrom(
-        [&](DocumentError* error, DocumentInfo* info) { return loadDocument(name, error, info); });
+    py::object const opened = py::module_::import("io").attr("open")(file, "rb");
+    py::object const bytes = opened.attr("read")();
+    opened.attr("close")();
+    return read(bytes.cast<std::string>(), name);
 }
 
 py::tuple pairOf(Document document) {
@@ -78,7 +84,7 @@ void defineError(py::module_& module) {
     members["__module__"] = "tarn_engine_base";
     members["__doc__"] =
         "A document that cannot be read: `message`, where it is (`pointer`, a JSON pointer), "
-        "`line` and `column`, from 1.";
+        "`line` and `column`, from 1, and `file`, its name or an empty string.";
     py::object const type =
         py::reinterpret_borrow<py::object>(reinterpret_cast<PyObject*>(&PyType_Type));
     py::object made =
@@ -123,7 +129,8 @@ void defineDocuments(py::module_& module) {
         py::arg("text"), "The graph, and a DocumentInfo.");
     module.def(
         "load_document", [](py::object const& file) { return fromFile(file).root; },
-        py::arg("file"), "The graph of a file. Raises DocumentError.");
+        py::arg("file"),
+        "The graph of a file. Raises DocumentError, or OSError where it cannot be read.");
     module.def(
         "load_document_with_info", [](py::object const& file) { return pairOf(fromFile(file)); },
         py::arg("file"), "The graph of a file, and a DocumentInfo.");
@@ -136,7 +143,7 @@ void defineDocuments(py::module_& module) {
         "The document of our own form; equal graphs give equal strings.");
     module.def(
         "save_document",
-        [](py::object const& file, Patch const& root, double framesPerSecond) {
+        [](py::object const& file, Patch root, double framesPerSecond) {
             std::string const name = fileName(file);
             DocumentError error;
             bool saved = false;
@@ -145,8 +152,7 @@ void defineDocuments(py::module_& module) {
                 saved = saveDocument(name, root, framesPerSecond, &error);
             }
             if (saved) return;
-            PyErr_SetString(PyExc_OSError, (name + ": " + error.message).c_str());
-            throw py::error_already_set();
+            raise(PyExc_OSError, name + ": " + error.message);
         },
         py::arg("file"), py::arg("root"), py::arg("frames_per_second") = 60.0,
         "Replaces the file in one step: whoever reads it finds the old content or the new one. "

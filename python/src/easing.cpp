@@ -6,6 +6,7 @@
 
 #include <pybind11/stl.h>
 
+#include <string>
 #include <vector>
 
 using namespace tarn::engine;
@@ -35,13 +36,14 @@ py::array_t<double> easeArray(EasingFunction function, T from, T to, Progress co
 
 // Nothing if it is a single number.
 Optional<Progress> toProgress(py::object const& t) {
-    if (!py::isinstance<py::array>(t) && !py::isinstance<py::list>(t) &&
-        !py::isinstance<py::tuple>(t)) {
-        return {};
+    if (isNumber(t) || isValue(t)) return {};
+    py::object const asArray = py::module_::import("numpy").attr("asarray");
+    py::object const array = asArray(t);
+    std::string const kind = toString(py::str(array.attr("dtype").attr("kind")));
+    if (kind != "f" && kind != "i" && kind != "u" && kind != "b") {
+        throw py::type_error("the progress is a number or an array of numbers");
     }
-    Progress progress = Progress::ensure(t);
-    if (!progress) throw py::type_error("the progress is a number or an array of numbers");
-    return progress;
+    return Progress(asArray(array, "float64"));
 }
 
 template <class T>
@@ -61,14 +63,14 @@ py::object easeAny(EasingFunction function, py::object const& start, py::object 
     if (isValue(start) || isValue(end)) {
         return py::cast(ease(function, toValue(start), toValue(end), toDouble(t)));
     }
-    bool const isVectors = isVector(start) && isVector(end);
-    if (!isVectors && (isVector(start) || isVector(end))) {
-        throw py::type_error("both ends are numbers, or vectors of one length");
+    Optional<std::vector<double>> const starts = ifVector(start);
+    Optional<std::vector<double>> const ends = ifVector(end);
+    if (!starts && !ends) return easeVector(function, toDouble(start), toDouble(end), t);
+    if (!starts || !ends || starts->size() != ends->size()) {
+        throw py::type_error("both ends are numbers, or vectors of as many components");
     }
-    if (!isVectors) return easeVector(function, toDouble(start), toDouble(end), t);
-    std::vector<double> const a = toNumbers(start);
-    std::vector<double> const b = toNumbers(end);
-    if (a.size() != b.size()) throw py::value_error("both ends have as many components");
+    std::vector<double> const& a = *starts;
+    std::vector<double> const& b = *ends;
     if (a.size() == 2) {
         return easeVector(function, FloatVec2{a[0], a[1]}, FloatVec2{b[0], b[1]}, t);
     }

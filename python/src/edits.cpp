@@ -39,7 +39,8 @@ struct Edit {
 
     std::size_t levelOf(Id id) const {
         std::size_t level = 1;
-        for (;;) {
+        // Where identifiers repeat, the walk may go in a circle: `commit` looks at what was made.
+        while (level < kMostLevels) {
             auto const found = parents.find(id);
             Patch const* const parent = found == parents.end() ? before.parentOf(id) : nullptr;
             if (found != parents.end()) {
@@ -51,6 +52,13 @@ struct Edit {
             }
             ++level;
         }
+        return level;
+    }
+
+    Patch commit() {
+        Patch root = edit.commit();
+        if (levels > 0) requireLevels(levelsOf(root));
+        return root;
     }
 
     bool addPatch(Id parent, Patch const& patch, Position position) {
@@ -215,9 +223,9 @@ void defineEdit(py::module_& module) {
         .def(
             "fresh_port_id", [](Edit& e) { return e.edit.freshPortId(); },
             "An identifier that no port has or had; each call gives another.")
-        .def(
-            "commit", [](Edit& e) { return e.edit.commit(); },
-            "The new root; it shares all lists that nothing changed.");
+        .def("commit", &Edit::commit,
+             "The new root; it shares all lists that nothing changed. Raises ValueError where "
+             "identifiers repeat and patches would nest deeper than 10,000 levels.");
     requireInit<Edit>();
 }
 

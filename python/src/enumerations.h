@@ -14,13 +14,7 @@
 
 namespace tarn_python {
 
-/// The Python class of an enumeration, and its enumerators by their numbers. Live as long as the
-/// process.
-template <class Enumeration>
-pybind11::handle& enumerationClass() {
-    static pybind11::handle found;
-    return found;
-}
+/// The enumerators in Python, by their numbers. Live as long as the process.
 template <class Enumeration>
 std::vector<pybind11::handle>& enumeratorsOf() {
     static std::vector<pybind11::handle> found;
@@ -42,7 +36,6 @@ void defineEnumeration(pybind11::module_& module, char const* name, char const* 
         if (known.size() <= number) known.resize(number + 1);
         known[number] = pybind11::object(made.attr(key)).release();
     }
-    enumerationClass<Enumeration>() = made.release();
 }
 
 /// Converts to and from that class. Enumerators out of range do not exist in Python.
@@ -53,9 +46,13 @@ struct EnumerationCaster {
     using cast_op_type = pybind11::detail::cast_op_type<T>;
 
     bool load(pybind11::handle source, bool) {
-        if (!pybind11::isinstance(source, enumerationClass<Enumeration>())) return false;
-        value = static_cast<Enumeration>(PyLong_AsLong(source.ptr()));
-        return true;
+        auto const& known = enumeratorsOf<Enumeration>();
+        for (std::size_t i = 0; i < known.size(); ++i) {
+            if (!known[i].is(source)) continue;
+            value = static_cast<Enumeration>(i);
+            return true;
+        }
+        return false;
     }
     static pybind11::handle cast(Enumeration enumerator, pybind11::return_value_policy,
                                  pybind11::handle) {

@@ -30,10 +30,15 @@ py::object fromAttributes(Attributes const& attributes) {
 }
 
 Attributes toAttributes(py::handle object) {
+    if (!isMapping(object)) {
+        raise(PyExc_TypeError,
+              "attributes are a mapping of strings to data, not " + nameOfType(object));
+    }
     Attributes attributes;
-    for (auto const& [key, data] : py::reinterpret_borrow<py::dict>(object)) {
-        if (!py::isinstance<py::str>(key))
+    for (auto const& [key, data] : copiedDict(object)) {
+        if (!py::isinstance<py::str>(key)) {
             throw py::type_error("the keys of attributes are strings");
+        }
         attributes.insert_or_assign(toString(key), toData(data));
     }
     return attributes;
@@ -78,7 +83,8 @@ std::size_t levelsOf(Patch const& patch) {
 }
 
 void requireLevels(std::size_t levels) {
-    if (levels > 10000) throw py::value_error("patches and layers nest 10,000 levels at most");
+    if (levels > kMostLevels)
+        throw py::value_error("patches and layers nest 10,000 levels at most");
 }
 
 namespace {
@@ -142,7 +148,12 @@ void defineModelLayer(py::module_& module) {
         .def(
             "__eq__", [](ModelLayer const& a, ModelLayer const& b) { return a == b; },
             py::is_operator())
-        .def("__str__", [](ModelLayer const& l) { return textOf(l); });
+        .def("__str__", [](ModelLayer const& l) { return textOf(l); })
+        .def("__reduce__", [](ModelLayer const& l) {
+            return py::make_tuple(
+                py::type::of<ModelLayer>(),
+                py::make_tuple(l.id, fromList(l.children), fromList(l.additionalLayers)));
+        });
     requireInit<ModelLayer>();
 }
 
@@ -181,7 +192,7 @@ void definePort(py::module_& module) {
     py::class_<Port> port(module, "Port", "An input or output of a patch.");
     port.def(py::init([](unsigned long long id, unsigned long long tag, py::str const& name,
                          TypeInfo const& typeInfo, py::object const& defaultValue,
-                         py::dict const& attributes) {
+                         py::object const& attributes) {
                  return Port{id,
                              tag,
                              toString(name),
@@ -203,10 +214,8 @@ void definePort(py::module_& module) {
                      text += std::string(", ") + field + "=" +
                              py::cast<std::string>(py::repr(self.attr(field)));
                  }
-                 py::dict const attributes(self.attr("attributes"));
-                 if (attributes.size() != 0) {
-                     text += ", attributes=" + py::cast<std::string>(py::repr(attributes));
-                 }
+                 py::object const attributes = self.attr("attributes");
+                 if (py::len(attributes) != 0) text += ", attributes=" + reprOf(attributes);
                  return text + ")";
              })
         .def("__reduce__", [](py::object const& self) {
@@ -228,7 +237,7 @@ void definePatch(py::module_& module) {
         .def(py::init([](unsigned long long id, unsigned long long builtin, py::str const& name,
                          py::object const& inputs, py::object const& outputs,
                          py::object const& children, py::object const& connections,
-                         py::dict const& attributes, py::str const& descriptor,
+                         py::object const& attributes, py::str const& descriptor,
                          ModelLayer const& modelLayer) {
                  Patch made;
                  made.id = id;
@@ -261,7 +270,13 @@ void definePatch(py::module_& module) {
                         std::to_string(p.outputs->size()) + " outputs, " +
                         std::to_string(p.children->size()) + " children>";
              })
-        .def(py::pickle([](Patch const& p) { return py::bytes(writeDocument(p)); }, &readBack));
+        .def(py::pickle([](Patch const& p) { return py::bytes(writeDocument(p)); }, &readBack))
+        .def("__reduce_ex__", [](py::object const& self, py::object const&) {
+            // As the newer protocols do it, for all of them.
+            return py::make_tuple(py::module_::import("copyreg").attr("__newobj__"),
+                                  py::make_tuple(py::type::of<Patch>()),
+                                  self.attr("__getstate__")());
+        });
     definePatchFields(
         patch, [](Patch& p) -> Patch& { return p; },
         [](Patch& p, std::vector<Patch> children) {
@@ -300,7 +315,11 @@ void defineIndex(py::module_& module) {
     py::class_<PatchIndex>(module, "PatchIndex",
                            "Answers about a graph in constant time. It keeps the graph; what it "
                            "gives are records of their own.")
-        .def(py::init<Patch>(), py::arg("root"), py::call_guard<py::gil_scoped_release>())
+        .def(py::init([](Patch root) {
+                 py::gil_scoped_release const released;
+                 return std::make_unique<PatchIndex>(std::move(root));
+             }),
+             py::arg("root"))
         .def_property_readonly(
             "root", [](PatchIndex const& i) { return i.root(); },
             "The patch that the index was made of.")

@@ -29,7 +29,7 @@ struct Element {
 
 PathElement elementFrom(PathInstruction instruction, py::object const& points) {
     PathElement element{instruction, {}};
-    for (py::handle const point : points) element.points.push_back(toVec2(point));
+    for (py::handle const point : copiedTuple(points)) element.points.push_back(toVec2(point));
     return element;
 }
 
@@ -72,7 +72,7 @@ std::string elementRepr(Element const& element) {
     py::object const points = pointsOf(element).attr("tolist")();
     return "PathElement(PathInstruction." +
            py::cast<std::string>(py::cast((*element).instruction).attr("name")) + ", " +
-           py::cast<std::string>(py::repr(points)) + ")";
+           reprOf(points) + ")";
 }
 
 std::shared_ptr<Path> toPath(std::vector<Element> const& elements) {
@@ -101,8 +101,9 @@ void defineElements(py::module_& module) {
         "string_to_path_instruction",
         [](std::string const& name) {
             Optional<I> const instruction = parsePathInstruction(name);
-            if (!instruction)
-                throw py::value_error("there is no path instruction \"" + name + "\"");
+            if (!instruction) {
+                raise(PyExc_ValueError, "there is no path instruction \"" + name + "\"");
+            }
             return *instruction;
         },
         py::arg("name"), "The instruction of that name. Raises ValueError for any other.");
@@ -147,7 +148,7 @@ void definePath(py::module_& module) {
              })
         .def("__repr__",
              [](std::shared_ptr<Path> const& path) {
-                 return "Path(" + py::cast<std::string>(py::repr(py::list(elementsOf(path)))) + ")";
+                 return "Path(" + reprOf(py::list(elementsOf(path))) + ")";
              })
         .def(
             "bounds",

@@ -24,6 +24,7 @@ namespace tarn_python {
 std::size_t levelsOf(tarn::engine::Patch const& patch);
 /// The stack of a thread is enough for so many levels of comparing, copying and writing: ValueError
 /// beyond them.
+constexpr std::size_t kMostLevels = 10000;
 void requireLevels(std::size_t levels);
 
 using Attributes = std::map<std::string, tarn::engine::Unstructured>;
@@ -42,7 +43,7 @@ py::tuple fromList(std::vector<T> const& list) {
 template <class T>
 std::vector<T> toList(py::handle iterable) {
     std::vector<T> list;
-    for (py::handle const element : iterable) {
+    for (py::handle const element : copiedTuple(iterable)) {
         if (!py::isinstance<T>(element)) {
             throw py::type_error("the elements are of the type " +
                                  py::cast<std::string>(py::type::of<T>().attr("__name__")) +
@@ -74,7 +75,7 @@ void definePortFields(Class& cls, Get get) {
             "A Value; what is assigned may be anything that one is made of.")
         .def_property(
             "attributes", [get](Self& s) { return fromAttributes(get(s).attributes); },
-            [get](Self& s, py::dict const& d) { get(s).attributes = toAttributes(d); },
+            [get](Self& s, py::object const& d) { get(s).attributes = toAttributes(d); },
             "A mapping of strings to data that is only read: assign a changed dict.");
 }
 
@@ -124,7 +125,7 @@ void definePatchFields(Class& cls, Get get, Assign assignChildren) {
             "patches would nest deeper than 10,000 levels.")
         .def_property(
             "attributes", [get](Self& s) { return fromAttributes(get(s).attributes); },
-            [get](Self& s, py::dict const& d) { get(s).attributes = toAttributes(d); },
+            [get](Self& s, py::object const& d) { get(s).attributes = toAttributes(d); },
             "A mapping of strings to data that is only read: assign a changed dict.");
 }
 

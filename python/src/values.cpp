@@ -7,7 +7,6 @@
 
 #include <pybind11/stl.h>
 
-#include <cmath>
 #include <memory>
 #include <string>
 #include <vector>
@@ -17,24 +16,6 @@ using namespace tarn::engine;
 namespace tarn_python {
 
 namespace {
-
-std::string reprOf(py::handle object) { return py::cast<std::string>(py::repr(object)); }
-
-// Numbers in a form that is read back: there is no literal for what is not finite.
-std::string numberRepr(double d) {
-    if (std::isfinite(d)) return reprOf(py::float_(d));
-    return "float('" + reprOf(py::float_(d)) + "')";
-}
-
-std::string tupleRepr(py::tuple const& numbers) {
-    std::string text;
-    for (py::handle const number : numbers) {
-        text += (text.empty() ? "(" : ", ") + (py::isinstance<py::tuple>(number)
-                                                   ? tupleRepr(py::cast<py::tuple>(number))
-                                                   : numberRepr(number.cast<double>()));
-    }
-    return text + ")";
-}
 
 std::string makerOf(Type type) {
     switch (type) {
@@ -52,16 +33,7 @@ std::string valueRepr(Value const& value) {
         return "Value." + maker + "(" + std::to_string(static_cast<unsigned long long>(value)) +
                ")";
     }
-    py::object const payload = payloadOf(value);
-    std::string text;
-    if (py::isinstance<py::tuple>(payload)) {
-        text = tupleRepr(payload);
-    } else if (PyFloat_Check(payload.ptr())) {
-        text = numberRepr(payload.cast<double>());
-    } else {
-        text = reprOf(payload);
-    }
-    return "Value(" + text + ")";
+    return "Value(" + reprOf(payloadOf(value)) + ")";
 }
 
 py::object optionalValue(Optional<Value> const& value) {
@@ -138,13 +110,12 @@ void defineData(py::module_& module) {
             "__ne__", [](Unstructured const& a, Unstructured const& b) { return a != b; },
             py::is_operator())
         .def("__hash__", [](Unstructured const& data) { return std::hash<Value>()(Value(data)); })
-        .def("__repr__",
-             [](Unstructured const& data) {
-                 // The numbers of which there is no literal are named by hand.
-                 return "Unstructured(" + reprOf(fromData(data)) + ")";
-             })
-        .def(py::pickle([](Unstructured const& data) { return py::make_tuple(fromData(data)); },
-                        [](py::tuple const& state) { return toData(state[0]); }));
+        .def(
+            "__repr__",
+            [](Unstructured const& data) { return "Unstructured(" + reprOf(fromData(data)) + ")"; })
+        .def("__reduce__", [](Unstructured const& data) {
+            return py::make_tuple(py::type::of<Unstructured>(), py::make_tuple(fromData(data)));
+        });
     requireInit<Unstructured>();
 }
 

@@ -171,8 +171,13 @@ def test_files(tmp_path: FilePath) -> None:
     assert tarn.load_document(str(file)) == graph()
     with pytest.raises(OSError):
         tarn.save_document(tmp_path / "none" / "graph.json", graph())
-    with pytest.raises(tarn.DocumentError, match="no such file"):
+    with pytest.raises(FileNotFoundError):
         tarn.load_document(tmp_path / "missing.json")
+    file.write_text("{}")
+    with pytest.raises(tarn.DocumentError) as caught:
+        tarn.load_document(file)
+    assert caught.value.file == str(file)
+    assert str(caught.value).startswith(f"{file}: ")
 
 
 def test_reads_the_bundled_documents() -> None:
