@@ -170,7 +170,7 @@ long long toInteger(py::handle object) {
 
 // Four rows of four numbers.
 Optional<FloatMat4> ifMatrix(py::handle object) {
-    if (!isSequence(object) || PySequence_Size(object.ptr()) != 4) return {};
+    if (!isSequence(object) || py::len_hint(object) != 4) return {};
     FloatMat4 matrix;
     py::tuple const rows = copiedTuple(object);
     if (rows.size() != 4) return {};

@@ -29,7 +29,8 @@ using Position = std::optional<std::size_t>;
 // An edit that knows how deep the graph will be: only so many levels are ever made.
 struct Edit {
     PatchEdit edit;
-    PatchIndex before;
+    // Empty once the edit is committed: an index that shares its tables is slow to follow an edit.
+    Optional<PatchIndex> before;
     // Of patches that the edit added or moved.
     std::unordered_map<Id, Id> parents = {};
     // Of everything that was added or moved, together.
@@ -38,11 +39,12 @@ struct Edit {
     explicit Edit(PatchIndex const& index) : edit(index), before(index) {}
 
     std::size_t levelOf(Id id) const {
+        if (!before) return 1;
         std::size_t level = 1;
         // Where identifiers repeat, the walk may go in a circle: `commit` looks at what was made.
         while (level < kMostLevels) {
             auto const found = parents.find(id);
-            Patch const* const parent = found == parents.end() ? before.parentOf(id) : nullptr;
+            Patch const* const parent = found == parents.end() ? before->parentOf(id) : nullptr;
             if (found != parents.end()) {
                 id = found->second;
             } else if (parent != nullptr) {
@@ -56,6 +58,7 @@ struct Edit {
     }
 
     Patch commit() {
+        before = Optional<PatchIndex>();
         Patch root = edit.commit();
         if (levels > 0) requireLevels(levelsOf(root));
         return root;
@@ -79,7 +82,7 @@ struct Edit {
     }
 
     bool movePatch(Id id, Id parent, Position position) {
-        Patch const* const moved = before.findPatch(id);
+        Patch const* const moved = before ? before->findPatch(id) : nullptr;
         std::size_t const inside = levels + (moved != nullptr ? levelsOf(*moved) : 0);
         requireLevels(levelOf(parent) + inside);
         if (!edit.movePatch(id, parent, position.value_or(PatchEdit::kEnd))) return false;

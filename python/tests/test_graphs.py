@@ -5,6 +5,7 @@ import gc
 import pickle
 import random
 import threading
+import time
 from pathlib import Path as FilePath
 from typing import Any
 
@@ -141,6 +142,30 @@ def test_edit_and_changes() -> None:
     assert added.after.name == "new"
     assert 'changed patch 3 "ring": name "ring" -> "circle"; input 30 default 0.0 -> 0.5' in [str(change) for change in changes]
     assert tarn.patch_changes(graph(), graph()) == []
+
+
+def test_an_index_follows_an_edit_at_the_cost_of_the_edit() -> None:
+    groups = [Patch(id=1000 * i + 2, children=[Patch(id=1000 * i + j + 3) for j in range(500)]) for i in range(100)]
+    root = Patch(id=1, children=groups)
+    start = time.perf_counter()
+    index = PatchIndex(root)
+    built = time.perf_counter() - start
+    followed = []
+    for i in range(10):
+        edit = PatchEdit(index)
+        patch = edit.patch(5)
+        assert patch is not None
+        patch.name = str(i)
+        after = edit.commit()
+        start = time.perf_counter()
+        index.update(after)
+        followed.append(time.perf_counter() - start)
+    assert min(followed) < built / 4
+    found = index.find_patch(5)
+    assert found is not None and found.name == "9"
+    assert edit.commit() == after
+    assert not edit.add_patch(1, Patch(id=9999999))
+    assert not edit.move_patch(5, 1)
 
 
 def test_a_part_that_is_removed_raises() -> None:
