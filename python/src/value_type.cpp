@@ -112,9 +112,9 @@ PyTypeObject* makeType() {
                            {Py_nb_int, slot(asInteger)},
                            {Py_nb_bool, slot(asBool)},
                            {0, nullptr}};
-    PyType_Spec specification = {"tarn_engine_base.Value", static_cast<int>(sizeof(ValueObject)), 0,
-                                 Py_TPFLAGS_DEFAULT | Py_TPFLAGS_BASETYPE, slots};
-    PyObject* const made = PyType_FromSpec(&specification);
+    PyType_Spec layout = {"tarn_engine_base.Value", static_cast<int>(sizeof(ValueObject)), 0,
+                          Py_TPFLAGS_DEFAULT | Py_TPFLAGS_BASETYPE, slots};
+    PyObject* const made = PyType_FromSpec(&layout);
     if (made == nullptr) throw py::error_already_set();
     auto* const type = reinterpret_cast<PyTypeObject*>(made);
     type->tp_vectorcall = callVector;
