@@ -51,15 +51,17 @@ set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION
     "${about}\nThis package has the headers, CMake and pkg-config files, and debuggers' views.")
 
 # For the one version of Python that the module is compiled for.
-math(EXPR next_minor "${Python_VERSION_MINOR} + 1")
-set(python_version "${Python_VERSION_MAJOR}.${Python_VERSION_MINOR}")
-set(CPACK_DEBIAN_PYTHON_PACKAGE_NAME "${python_package}")
-set(CPACK_DEBIAN_PYTHON_PACKAGE_SECTION python)
-set(CPACK_DEBIAN_PYTHON_PACKAGE_SHLIBDEPS ON)
-set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "${document_package} (= ${PROJECT_VERSION}-1), python3 (>= ${python_version}~), \
+if(TARN_ENGINE_BASE_BUILD_PYTHON)
+    math(EXPR next_minor "${Python_VERSION_MINOR} + 1")
+    set(python_version "${Python_VERSION_MAJOR}.${Python_VERSION_MINOR}")
+    set(CPACK_DEBIAN_PYTHON_PACKAGE_NAME "${python_package}")
+    set(CPACK_DEBIAN_PYTHON_PACKAGE_SECTION python)
+    set(CPACK_DEBIAN_PYTHON_PACKAGE_SHLIBDEPS ON)
+    set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "${document_package} (= ${PROJECT_VERSION}-1), python3 (>= ${python_version}~), \
 python3 (<< ${Python_VERSION_MAJOR}.${next_minor}), python3-numpy")
-set(CPACK_DEBIAN_PYTHON_DEBUGINFO_PACKAGE ON)
-set(CPACK_COMPONENT_PYTHON_DESCRIPTION "${about}\nThis package has the Python module tarn_engine_base.")
+    set(CPACK_DEBIAN_PYTHON_DEBUGINFO_PACKAGE ON)
+    set(CPACK_COMPONENT_PYTHON_DESCRIPTION "${about}\nThis package has the Python module tarn_engine_base.")
+endif()
 
 # Which package a program needs that was linked with the library, and that its cache has to know it.
 set(control "${CMAKE_CURRENT_BINARY_DIR}/debian-control")

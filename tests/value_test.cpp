@@ -1377,5 +1377,3 @@ TEST(Value, InBracesFillsAVectorsFirstNumber) {
     EXPECT_EQ(FloatVec2(Value(0.5)), (FloatVec2{0.5, 0.5}));
     EXPECT_EQ((FloatVec2{Value(0.5)}), (FloatVec2{0.5, 0}));
 }
-
-// In a program of its own under ctest, so that the first use is here.

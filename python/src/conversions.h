@@ -53,8 +53,7 @@ py::object toIndex(py::handle object);
 unsigned long long toUnsigned(py::handle object);
 double toDouble(py::handle object);
 
-/// A subclass of `int` that stands for the unsigned integers of data.
-py::object unsignedClass();
+/// The class `Unsigned`: an `int` that stands for the unsigned integers of data.
 void defineUnsigned(py::module_& module);
 
 /// Data from `None`, numbers, strings, sequences and mappings, of any depth. Throws a Python

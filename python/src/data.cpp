@@ -99,8 +99,6 @@ bool scalarData(py::handle object, Unstructured& data) {
 
 }  // namespace
 
-py::object unsignedClass() { return py::reinterpret_borrow<py::object>(unsignedType()); }
-
 void defineUnsigned(py::module_& module) {
     py::dict members;
     members["__module__"] = "tarn_engine_base";
