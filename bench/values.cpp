@@ -56,7 +56,7 @@ std::vector<T> numbers() {
 
 // Half of them numbers, the rest integers, vectors, truth values, texts and paths.
 template <class T>
-std::vector<T> mixed() {
+std::vector<T> mixedValues() {
     std::vector<T> loop;
     auto const path =
         std::make_shared<Path const>(PathBuilder().roundRect({0, 0}, {1, 1}, 0.2).build());
@@ -76,7 +76,7 @@ std::vector<T> mixed() {
 }
 
 template <>
-std::vector<QVariant> mixed<QVariant>() {
+std::vector<QVariant> mixedValues<QVariant>() {
     std::vector<QVariant> loop;
     for (std::size_t i = 0; i < kCount; ++i) {
         double const d = static_cast<double>(i);
@@ -120,10 +120,10 @@ bench::Implementation construct(Make make) {
 template <class T>
 void copiesAndDestruction(std::string const& who) {
     auto const copy = [](std::vector<T> const& loop) { return loop; };
-    bench::operation("copy 10,000 mixed values").peer(who, bench::on(mixed<T>, copy));
+    bench::operation("copy 10,000 mixed values").peer(who, bench::on(mixedValues<T>, copy));
     bench::operation("copy 10,000 numbers").peer(who, bench::on(numbers<T>, copy));
     bench::operation("destroy 10,000 mixed values")
-        .peer(who, bench::onEach(mixed<T>, [](std::vector<T>& loop) {
+        .peer(who, bench::onEach(mixedValues<T>, [](std::vector<T>& loop) {
                   std::vector<T>().swap(loop);
                   return loop.size();
               }));
@@ -160,7 +160,7 @@ int kindOf(QVariant const& v) { return static_cast<int>(v.type()); }
 // The texts read as numbers cost the C library's parse for everyone: left out of the mixed ones.
 template <class T>
 std::vector<T> mixedWithoutTexts() {
-    std::vector<T> loop = mixed<T>();
+    std::vector<T> loop = mixedValues<T>();
     for (std::size_t i = 9; i < loop.size(); i += 12) loop[i] = T(1.0);
     return loop;
 }
@@ -168,7 +168,7 @@ std::vector<T> mixedWithoutTexts() {
 template <class T>
 void readings(std::string const& who) {
     bench::operation("type() of 10,000 mixed values")
-        .peer(who, bench::on(mixed<T>, [](std::vector<T> const& loop) {
+        .peer(who, bench::on(mixedValues<T>, [](std::vector<T> const& loop) {
                   int sum = 0;
                   for (T const& v : loop) sum += kindOf(v);
                   return sum;
@@ -222,10 +222,10 @@ void equality(std::string const& who) {
         return result;
     };
     auto const shared = [] {
-        std::vector<T> const loop = mixed<T>();
+        std::vector<T> const loop = mixedValues<T>();
         return Pair(loop, loop);
     };
-    auto const unshared = [] { return Pair(mixed<T>(), mixed<T>()); };
+    auto const unshared = [] { return Pair(mixedValues<T>(), mixedValues<T>()); };
     bench::operation("== of 10,000 mixed values, shared").peer(who, bench::on(shared, equal));
     bench::operation("== of 10,000 mixed values, unshared").peer(who, bench::on(unshared, equal));
 }

@@ -3,13 +3,14 @@
 #ifndef TARN_FUZZ_FUZZ_H
 #define TARN_FUZZ_FUZZ_H
 
+#include "support/random.h"
+
 #include <fuzzer/FuzzedDataProvider.h>
 
 #include <cmath>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
 #include <string>
 
 namespace fuzz {
@@ -21,15 +22,9 @@ inline void check(bool holds, char const* what) {
     std::abort();
 }
 
-inline std::uint64_t bits(double d) {
-    std::uint64_t result;
-    std::memcpy(&result, &d, sizeof result);
-    return result;
-}
-
 /// The same number to the last bit; any NaN is as good as another.
 inline bool same(double a, double b) {
-    return bits(a) == bits(b) || (std::isnan(a) && std::isnan(b));
+    return tests::bits(a) == tests::bits(b) || (std::isnan(a) && std::isnan(b));
 }
 
 /// The input, as numbers of any kind, small choices and texts. Beyond its end everything is zero.
@@ -49,12 +44,7 @@ public:
     /// Any double at all, or one of those that occur in documents.
     double anyDouble() {
         switch (below(4)) {
-            case 0: {
-                std::uint64_t const word = provider.ConsumeIntegral<std::uint64_t>();
-                double d;
-                std::memcpy(&d, &word, sizeof d);
-                return d;
-            }
+            case 0: return tests::fromBits(provider.ConsumeIntegral<std::uint64_t>());
             case 1: return provider.ConsumeIntegral<std::int8_t>();
             case 2: return provider.ConsumeIntegral<std::int32_t>() / 200.0;
             default: {

@@ -3,23 +3,14 @@
 
 #include "model.h"
 
+#include "support/locales.h"
+
 #include <Engine/Base/value.h>
 
 #include <clocale>
-#include <iostream>
-#include <locale>
+#include <iterator>
 
 using namespace fuzz;
-
-namespace {
-
-struct Punctuation : std::numpunct<char> {
-    explicit Punctuation(char decimalPoint) : point(decimalPoint) {}
-    char do_decimal_point() const override { return point; }
-    char point;
-};
-
-}  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
     Input input(data, size);
@@ -27,7 +18,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     std::setlocale(LC_NUMERIC, localeNames[input.below(2)]);  // Where it is there.
     char const points[] = {'.', '.', ',', ';'};
     char const point = points[input.below(std::size(points))];
-    std::cout.imbue(std::locale(std::locale::classic(), new Punctuation(point)));
+    tests::CoutDecimalPoint const shown(point);
     do {
         double const d = input.anyDouble();
         std::string const text = numberText(d, point);

@@ -12,8 +12,25 @@ using namespace tarn::engine;
 
 namespace {
 
+using I = PathInstruction;
+
+enum class Operation : unsigned char {
+    MoveTo,
+    LineTo,
+    CurveTo,
+    QuadCurveTo,
+    Close,
+    ArcTo,
+    Ellipse,
+    Circle,
+    RoundRect,
+    HexaRect,
+    Append,
+};
+constexpr std::size_t kOperations = std::size_t(Operation::Append) + 1;
+
 struct Call {
-    std::size_t operation;
+    Operation operation;
     FloatVec2 a, b, c;
     double number;
     bool flag;
@@ -21,13 +38,13 @@ struct Call {
 
 struct Drawing {
     struct Step {
-        int instruction;
+        PathInstruction instruction;
         std::vector<FloatVec2> points;
     };
     std::vector<Step> steps;
     FloatVec2 at;
 
-    void draw(int instruction, std::vector<FloatVec2> points) {
+    void draw(PathInstruction instruction, std::vector<FloatVec2> points) {
         if (!points.empty()) at = points.back();
         steps.push_back({instruction, std::move(points)});
     }
@@ -37,9 +54,9 @@ struct Drawing {
         double const dx = p.x - at.x;
         double const dy = p.y - at.y;
         if (verticalFirst) {
-            draw(2, {{at.x, k * dy + at.y}, {rest * dx + at.x, dy + at.y}, p});
+            draw(I::curveTo, {{at.x, k * dy + at.y}, {rest * dx + at.x, dy + at.y}, p});
         } else {
-            draw(2, {{k * dx + at.x, at.y}, {at.x + dx, rest * dy + at.y}, p});
+            draw(I::curveTo, {{k * dx + at.x, at.y}, {at.x + dx, rest * dy + at.y}, p});
         }
     }
 
@@ -47,46 +64,46 @@ struct Drawing {
         double const x = call.a.x;
         double const y = call.a.y;
         switch (call.operation) {
-            case 0: draw(0, {call.a}); break;
-            case 1: draw(1, {call.a}); break;
-            case 2: draw(2, {call.a, call.b, call.c}); break;
-            case 3: draw(3, {call.a, call.b}); break;
-            case 4: draw(4, {}); break;
-            case 5: arc(call.a, call.flag); break;
-            case 6: ellipse(x, y, call.b.x, call.b.y); break;
-            case 7: ellipse(x, y, call.number, call.number); break;
-            case 8: {
+            case Operation::MoveTo: draw(I::moveTo, {call.a}); break;
+            case Operation::LineTo: draw(I::lineTo, {call.a}); break;
+            case Operation::CurveTo: draw(I::curveTo, {call.a, call.b, call.c}); break;
+            case Operation::QuadCurveTo: draw(I::quadCurveTo, {call.a, call.b}); break;
+            case Operation::Close: draw(I::close, {}); break;
+            case Operation::ArcTo: arc(call.a, call.flag); break;
+            case Operation::Ellipse: ellipse(x, y, call.b.x, call.b.y); break;
+            case Operation::Circle: ellipse(x, y, call.number, call.number); break;
+            case Operation::RoundRect: {
                 double const right = call.b.x + x;
                 double const bottom = call.b.y + y;
                 double const m = call.b.y * 0.5 < call.b.x * 0.5 ? call.b.y * 0.5 : call.b.x * 0.5;
                 double const r = call.number < m ? call.number : m;
-                draw(0, {{r + x, y}});
-                draw(1, {{right - r, y}});
+                draw(I::moveTo, {{r + x, y}});
+                draw(I::lineTo, {{right - r, y}});
                 arc({right, r + y}, false);
-                draw(1, {{right, bottom - r}});
+                draw(I::lineTo, {{right, bottom - r}});
                 arc({right - r, bottom}, true);
-                draw(1, {{r + x, bottom}});
+                draw(I::lineTo, {{r + x, bottom}});
                 arc({x, bottom - r}, false);
-                draw(1, {{x, r + y}});
+                draw(I::lineTo, {{x, r + y}});
                 arc({r + x, y}, true);
-                draw(4, {});
+                draw(I::close, {});
                 break;
             }
-            case 9: {
+            case Operation::HexaRect: {
                 double const right = call.b.x + x;
                 double const bottom = call.b.y + y;
                 double const k = call.number;
-                draw(0, {{x + k, y}});
+                draw(I::moveTo, {{x + k, y}});
                 for (FloatVec2 const& p :
                      {FloatVec2{right - k, y}, FloatVec2{right, y + k},
                       FloatVec2{right, bottom - k}, FloatVec2{right - k, bottom},
                       FloatVec2{x + k, bottom}, FloatVec2{x, bottom - k}, FloatVec2{x, y + k}}) {
-                    draw(1, {p});
+                    draw(I::lineTo, {p});
                 }
-                draw(4, {});
+                draw(I::close, {});
                 break;
             }
-            default: {  // Everything so far, once more.
+            case Operation::Append: {  // Everything so far, once more.
                 std::vector<Step> const again = steps;
                 steps.insert(steps.end(), again.begin(), again.end());
                 break;
@@ -96,28 +113,28 @@ struct Drawing {
 
     void ellipse(double x, double y, double rx, double ry) {
         FloatVec2 const start{x + rx, y + 0.0};
-        draw(0, {start});
+        draw(I::moveTo, {start});
         arc({0.0 + x, y + ry}, true);
         arc({x - rx, y}, false);
         arc({x, y - ry}, true);
         arc(start, false);
-        draw(4, {});
+        draw(I::close, {});
     }
 };
 
 void perform(PathBuilder& builder, Call const& call) {
     switch (call.operation) {
-        case 0: builder.moveTo(call.a); break;
-        case 1: builder.lineTo(call.a); break;
-        case 2: builder.curveTo(call.a, call.b, call.c); break;
-        case 3: builder.quadCurveTo(call.a, call.b); break;
-        case 4: builder.close(); break;
-        case 5: builder.arcTo(call.a, call.flag); break;
-        case 6: builder.ellipse(call.a, call.b); break;
-        case 7: builder.circle(call.a, call.number); break;
-        case 8: builder.roundRect(call.a, call.b, call.number); break;
-        case 9: builder.hexaRect(call.a, call.b, call.number); break;
-        default: builder.append(builder.build()); break;
+        case Operation::MoveTo: builder.moveTo(call.a); break;
+        case Operation::LineTo: builder.lineTo(call.a); break;
+        case Operation::CurveTo: builder.curveTo(call.a, call.b, call.c); break;
+        case Operation::QuadCurveTo: builder.quadCurveTo(call.a, call.b); break;
+        case Operation::Close: builder.close(); break;
+        case Operation::ArcTo: builder.arcTo(call.a, call.flag); break;
+        case Operation::Ellipse: builder.ellipse(call.a, call.b); break;
+        case Operation::Circle: builder.circle(call.a, call.number); break;
+        case Operation::RoundRect: builder.roundRect(call.a, call.b, call.number); break;
+        case Operation::HexaRect: builder.hexaRect(call.a, call.b, call.number); break;
+        case Operation::Append: builder.append(builder.build()); break;
     }
 }
 
@@ -128,7 +145,7 @@ bool drawn(Path const& path, Drawing const& drawing) {
     for (std::size_t i = 0; i < path.elements.size(); ++i) {
         auto const& [instruction, points] = path.elements[i];
         auto const& step = drawing.steps[i];
-        if (static_cast<int>(instruction) != step.instruction) return false;
+        if (instruction != step.instruction) return false;
         if (points.size() != step.points.size()) return false;
         for (std::size_t n = 0; n < points.size(); ++n) {
             if (!same(points[n], step.points[n])) return false;
@@ -156,8 +173,8 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     bool turns = true;
     for (int i = 0; i < 40 && !input.ended() && drawing.steps.size() < 10000; ++i) {
         auto const point = [&] { return FloatVec2{input.anyDouble(), input.anyDouble()}; };
-        Call const call{input.below(11), point(),           point(),
-                        point(),         input.anyDouble(), input.chance()};
+        auto const operation = Operation(input.below(kOperations));
+        Call const call{operation, point(), point(), point(), input.anyDouble(), input.chance()};
         perform(builder, call);
         drawing.perform(call);
         check(same(builder.currentPoint, drawing.at), "the current point");
@@ -165,7 +182,8 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
         Call opposite = call;
         for (FloatVec2* p : {&opposite.a, &opposite.b, &opposite.c}) *p = {-p->x, -p->y};
         opposite.number = -call.number;
-        turns = turns && call.operation != 8 && call.operation != 9;
+        turns = turns && call.operation != Operation::RoundRect &&
+                call.operation != Operation::HexaRect;
         perform(turned, opposite);
     }
     Path const path = builder.build();

@@ -229,7 +229,7 @@ struct Model {
                 return true;
             case Type::Mat4:
                 for (std::size_t i = 0; i < 16; ++i) {
-                    if (bits(matrix[i]) != bits(other.matrix[i])) return false;
+                    if (tests::bits(matrix[i]) != tests::bits(other.matrix[i])) return false;
                 }
                 return true;
             case Type::Boolean: return truth == other.truth;

@@ -4,6 +4,7 @@
 #include <Engine/Base/unstructured.h>
 
 #include "support/allocations.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 

@@ -3,6 +3,7 @@
 #include <Engine/Base/path.h>
 #include <Engine/Base/unstructured.h>
 
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

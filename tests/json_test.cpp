@@ -1,6 +1,7 @@
 #include <Engine/Base/json.h>
 
 #include "support/allocations.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 

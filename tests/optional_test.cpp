@@ -2,6 +2,7 @@
 #include <Engine/Base/value.h>
 
 #include "support/death.h"
+#include "support/print.h"
 
 #include <gtest/gtest.h>
 

@@ -2,6 +2,7 @@
 
 #include "support/allocations.h"
 #include "support/edits.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 

@@ -5,6 +5,7 @@
 #include "support/edits.h"
 #include "support/graph_model.h"
 #include "support/graphs.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 
@@ -452,21 +453,65 @@ TEST(PatchIndex, OutlivesTheCallersRecordAndMoves) {
 
 TEST(PatchIndex, QueriesAllocateNothing) {
     PatchIndex const index(smallGraph());
-    std::size_t found = 0;
-    tests::AllocationCounter counter;
-    for (unsigned long long id = 0; id < 50; ++id) {
-        found += index.findPatch(id) != nullptr;
-        found += index.parentOf(id) != nullptr;
-        found += index.findInputPort(id) != nullptr;
-        found += index.findOutputPort(id) != nullptr;
-        found += index.ownerOfPort(id) != nullptr;
-        found += index.incomingConnection(id) != nullptr;
-        for (Connection const& c : index.outgoingConnections(id)) found += c.toPortId != 0;
-        for (Connection const& c : index.incomingConnectionsToPatch(id)) found += c.toPortId != 0;
-        for (Connection const& c : index.outgoingConnectionsFromPatch(id)) found += c.toPortId != 0;
+    struct Query {
+        char const* name;
+        std::size_t (*ask)(PatchIndex const&, unsigned long long id);
+        std::size_t found;  // In the small graph, of all identifiers together.
+    };
+    for (Query const &query : {
+             Query{"findPatch",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.findPatch(id) ? 1 : 0;
+                   },
+                   4},
+             Query{"parentOf",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.parentOf(id) ? 1 : 0;
+                   },
+                   3},
+             Query{"findInputPort",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.findInputPort(id) ? 1 : 0;
+                   },
+                   4},
+             Query{"findOutputPort",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.findOutputPort(id) ? 1 : 0;
+                   },
+                   4},
+             Query{"ownerOfPort",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.ownerOfPort(id) ? 1 : 0;
+                   },
+                   8},
+             Query{"incomingConnection",
+                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
+                       return i.incomingConnection(id) ? 1 : 0;
+                   },
+                   2},
+             Query{"outgoingConnections",
+                   [](PatchIndex const&i, unsigned long long id) {
+                       return i.outgoingConnections(id).size();
+                   },
+                   3},
+             Query{"incomingConnectionsToPatch",
+                   [](PatchIndex const&i, unsigned long long id) {
+                       return i.incomingConnectionsToPatch(id).size();
+                   },
+                   3},
+             Query{"outgoingConnectionsFromPatch",
+                   [](PatchIndex const&i, unsigned long long id) {
+                       return i.outgoingConnectionsFromPatch(id).size();
+                   },
+                   3},
+         }) {
+        SCOPED_TRACE(query.name);
+        std::size_t found = 0;
+        tests::AllocationCounter counter;
+        for (unsigned long long id = 0; id < 50; ++id) found += query.ask(index, id);
+        EXPECT_EQ(counter.count(), 0u);
+        EXPECT_EQ(found, query.found);
     }
-    EXPECT_EQ(counter.count(), 0u);
-    EXPECT_EQ(found, 4u + 3u + 4u + 4u + 8u + 2u + 3u + 3u + 3u);
 }
 
 TEST(PatchIndex, SurvivesFailingAllocations) {

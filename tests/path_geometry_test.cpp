@@ -1,5 +1,6 @@
 #include <Engine/Base/path_geometry.h>
 
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

@@ -2,6 +2,7 @@
 
 #include "support/allocations.h"
 #include "support/death.h"
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

@@ -5,6 +5,7 @@
 #include <Engine/Base/base.h>
 #include <Engine/Document/document.h>
 
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

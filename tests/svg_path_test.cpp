@@ -1,6 +1,7 @@
 #include <Engine/Base/svg_path.h>
 
 #include "support/locales.h"
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

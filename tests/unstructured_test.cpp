@@ -3,6 +3,7 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 

@@ -1,6 +1,7 @@
 #include <Engine/Base/unstructured.h>
 
 #include "support/locales.h"
+#include "support/print.h"
 #include "support/random.h"
 #include "support/stack.h"
 

@@ -6,32 +6,26 @@
 #include "support/allocations.h"
 #include "support/death.h"
 #include "support/locales.h"
-#include "support/number_text.h"
+#include "support/print.h"
 #include "support/random.h"
+#include "support/types.h"
 
 #include <gtest/gtest.h>
 
 #include <array>
 #include <cerrno>
-#include <cfenv>
 #include <climits>
 #include <cmath>
+#include <cstring>
 #include <functional>
-#include <iomanip>
 #include <set>
 #include <sstream>
 #include <unordered_set>
+#include <vector>
 
 using namespace tarn::engine;
 
 namespace {
-
-constexpr std::array<Type, 14> kAllTypes{Type::Float, Type::Vec2,        Type::Vec3, Type::Vec4,
-                                         Type::Mat4,  Type::Boolean,     Type::Int,  Type::Image,
-                                         Type::Video, Type::Sound,       Type::Path, Type::String,
-                                         Type::Model, Type::Unstructured};
-
-Type outOfRange() { return Type(14); }
 
 FloatMat4 countingMatrix() {
     FloatMat4 matrix;
@@ -140,7 +134,7 @@ TEST(Type, OutOfRangeIsInNoClass) {
 }
 
 TEST(TypeDeathTest, OutOfRangeHasNoName) {
-    EXPECT_ENDS(typeToString(outOfRange()),
+    EXPECT_ENDS(typeToString(tests::kNoType),
                 tests::failedAssertion("0", "typeToString", "Engine/Base/value"));
 }
 
@@ -230,7 +224,7 @@ TEST(Value, MakersAreTheConstructorOfTheirType) {
 
 TEST(ValueDeathTest, AnIdentifierOfNoResourceIsRefused) {
     for (Type type : {Type::Float, Type::Vec2, Type::Vec3, Type::Vec4, Type::Mat4, Type::Boolean,
-                      Type::Int, Type::Path, Type::String, Type::Unstructured, outOfRange()}) {
+                      Type::Int, Type::Path, Type::String, Type::Unstructured, tests::kNoType}) {
         SCOPED_TRACE(int(type));
         EXPECT_ENDS(Value(5, type), tests::failedAssertion("0", "Value", "Engine/Base/value", 161));
     }
@@ -280,48 +274,8 @@ TEST(Value, DefaultsAreNeutral) {
 }
 
 TEST(ValueDeathTest, OutOfRangeHasNoDefault) {
-    EXPECT_ENDS(Value::defaultValue(outOfRange()),
+    EXPECT_ENDS(Value::defaultValue(tests::kNoType),
                 tests::failedAssertion("0", "defaultValue", "Engine/Base/value"));
-}
-
-TEST(Value, AllocatesForPayloadsAloneAndOnce) {
-    struct Row {
-        char const* what;
-        Value (*make)();
-        std::size_t allocations;
-    };
-    for (Row const& row : {
-             Row{"nothing", [] { return Value(); }, 0},
-             Row{"double", [] { return Value(2.5); }, 0},
-             Row{"integer", [] { return Value(5); }, 0},
-             Row{"bool", [] { return Value(true); }, 0},
-             Row{"vector of 2",
-                 [] {
-                     return Value(FloatVec2{1, 2});
-                 },
-                 0},
-             Row{"vector of 3",
-                 [] {
-                     return Value(FloatVec3{1, 2, 3});
-                 },
-                 0},
-             Row{"vector of 4",
-                 [] {
-                     return Value(FloatVec4{1, 2, 3, 4});
-                 },
-                 0},
-             Row{"image", [] { return Value::Image(5); }, 0},
-             Row{"model", [] { return Value::Model(5); }, 0},
-             Row{"matrix", [] { return Value(FloatMat4()); }, 1},
-             Row{"short text", [] { return Value("text"); }, 1},
-             Row{"empty path", [] { return Value(Path()); }, 1},
-             Row{"null data", [] { return Value(Unstructured()); }, 1},
-         }) {
-        SCOPED_TRACE(row.what);
-        tests::AllocationCounter counter;
-        Value const value = row.make();
-        EXPECT_EQ(counter.count(), row.allocations);
-    }
 }
 
 TEST(Value, IsIndependentOfWhatItWasMadeFrom) {
@@ -713,31 +667,6 @@ TEST(Value, GivesItsPayloadToBeShared) {
     EXPECT_NE(null, Value(Unstructured()));
 }
 
-TEST(Value, ReadingsOfScalarsAndVectorsAllocateNothing) {
-    std::vector<Value> const values{1,
-                                    2.5,
-                                    FloatVec2{1, 2},
-                                    FloatVec3{1, 2, 3},
-                                    true,
-                                    "12.5",
-                                    linePath(),
-                                    FloatVec4{1, 2, 3, 4},
-                                    smallMap(),
-                                    countingMatrix(),
-                                    Value::Image(5)};
-    double sum = 0.0;
-    tests::AllocationCounter counter;
-    for (Value const& value : values) {
-        sum += double(value) + double(static_cast<long long>(value)) + (bool(value) ? 1 : 0) +
-               double(static_cast<unsigned long long>(value)) + FloatVec2(value).x +
-               FloatVec3(value).y + FloatVec4(value).z + FloatMat4(value).elements[0];
-        sum += value.ifPath() || value.ifString() || value.ifUnstructured() || value.asFloatMat4();
-        sum += static_cast<double>(value.type());
-    }
-    EXPECT_EQ(counter.count(), 0u);
-    EXPECT_GT(sum, 0.0);
-}
-
 TEST(Value, BecomesAnyType) {
     std::vector<Value> values = everyAlternative();
     for (Value const& value : {nullPath(), nullData(), nullString(), nullMatrix()}) {
@@ -797,7 +726,7 @@ TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
 }
 
 TEST(ValueDeathTest, BecomesNothingOutOfRange) {
-    EXPECT_ENDS(Value().asType(outOfRange()),
+    EXPECT_ENDS(Value().asType(tests::kNoType),
                 tests::failedAssertion("0", "asType", "Engine/Base/value"));
 }
 
@@ -891,476 +820,6 @@ TEST(Value, MovedFromCanBeUsedAgain) {
     EXPECT_EQ(value, Value(5.0));
     value = *&value;
     EXPECT_EQ(value, Value(5.0));
-}
-
-TEST(NumberText, IsShortenedForReading) {
-    struct Row {
-        double number;
-        char const* text;
-    };
-    for (Row const& row : {
-             Row{3.0, "3"},
-             Row{2.5, "2.5"},
-             Row{0.5, "0.5"},
-             Row{1234.56, "1234.6"},
-             Row{999.999, "1000"},
-             Row{100.0, "100"},
-             Row{-0.001, "0"},
-             Row{1000.0, "1000"},
-             Row{999.994, "999.99"},
-             Row{-1234.56, "-1234.6"},
-             Row{-0.0, "0"},
-             Row{-0.004, "0"},
-             Row{-0.006, "-0.01"},
-             Row{0.0, "0"},
-             Row{0.125, "0.12"},
-             Row{0.375, "0.38"},
-             Row{0.005, "0.01"},
-             Row{0.015, "0.01"},
-             Row{999.995, "1000"},
-             Row{1000.05, "1000"},
-             Row{1000.25, "1000.2"},
-             Row{-999.999, "-1000"},
-             Row{20.0, "20"},
-             Row{-1000.0, "-1000"},
-             Row{1e15, "1000000000000000"},
-             Row{5e-324, "0"},
-             Row{-5e-324, "0"},
-             Row{0.1, "0.1"},
-             Row{10.10, "10.1"},
-             Row{100.05, "100.05"},
-         }) {
-        EXPECT_EQ(to_string(Value(row.number)), row.text) << row.number;
-    }
-}
-
-TEST(NumberText, IsAppendedAsToStringGivesIt) {
-    Value const nullText = std::shared_ptr<Path const>();
-    std::string text = "before ";
-    std::string expected = text;
-    for (Value const& value : {Value(),
-                               Value(1234.56),
-                               Value(-0.0),
-                               Value(-0.001),
-                               Value(1e300),
-                               Value(double(NAN)),
-                               Value(-double(INFINITY)),
-                               Value(0LL),
-                               Value(LLONG_MIN),
-                               Value(LLONG_MAX),
-                               Value(true),
-                               Value(false),
-                               Value(FloatVec2{1, 2.5}),
-                               Value(FloatVec3{1, 2.5, -3}),
-                               Value(FloatVec4{1, 2.5, -3, 1e6}),
-                               Value(FloatMat4()),
-                               Value::Image(ULLONG_MAX),
-                               Value::Model(0),
-                               Value("a string"),
-                               Value(""),
-                               Value(Path()),
-                               nullText,
-                               Value(PathBuilder().circle({0, 0}, 1).build()),
-                               Value(Unstructured("a string of data")),
-                               Value(Unstructured(1))}) {
-        appendText(text, value);
-        expected += to_string(value);
-        ASSERT_EQ(text, expected);
-    }
-}
-
-TEST(NumberText, IsCutAfter127Characters) {
-    struct Row {
-        char const* what;
-        double number;
-        std::size_t length;
-    };
-    for (Row const& row : {
-             Row{"125 digits, the point and its zero", 1e125, 125},
-             Row{"126 digits and the point", 1e126, 126},
-             Row{"127 digits", std::ldexp(1.0, 421), 127},
-             Row{"the sign and 125 digits and the point", -1e125, 126},
-             Row{"the sign and 126 digits", -std::ldexp(1.0, 418), 127},
-             Row{"128 digits", 2e127, 127},
-             Row{"301 digits", 1e300, 127},
-             Row{"the largest", -1.7976931348623157e308, 127},
-         }) {
-        SCOPED_TRACE(row.what);
-        std::string const text = to_string(Value(row.number));
-        EXPECT_EQ(text.size(), row.length);
-        EXPECT_EQ(text.find('.'), std::string::npos);
-        EXPECT_EQ(text, tests::modelNumberText(row.number, '.', '.'));
-    }
-}
-
-TEST(NumberText, OfWhatIsNoNumberIsTheSameEverywhere) {
-    EXPECT_EQ(to_string(Value(double(INFINITY))), "inf");
-    EXPECT_EQ(to_string(Value(-double(INFINITY))), "-inf");
-    EXPECT_EQ(to_string(Value(std::copysign(double(NAN), 1.0))), "nan");
-    EXPECT_EQ(to_string(Value(std::copysign(double(NAN), -1.0))), "-nan");
-}
-
-TEST(NumberText, AgreesWithDecimalDigitsWorkedOutByHand) {
-    tests::Random random(128);
-    for (int i = 0; i < 60000; ++i) {
-        double const number = random.anyDouble();
-        ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, '.', '.'))
-            << std::hexfloat << number;
-    }
-}
-
-TEST(NumberText, TakesTheDecimalPointFromCoutAtEachCall) {
-    EXPECT_EQ(to_string(Value(2.5)), "2.5");
-    {
-        tests::CoutDecimalPoint comma(',');
-        EXPECT_EQ(to_string(Value(2.5)), "2.50");
-        EXPECT_EQ(to_string(Value(3.0)), "3.00");
-        EXPECT_EQ(to_string(Value(-0.0)), "-0.00");
-        EXPECT_EQ(to_string(FloatVec2{1, 2}), "1.00, 2.00");
-        tests::CLocaleWithComma cComma;
-        ASSERT_TRUE(cComma.isSet());
-        EXPECT_EQ(to_string(Value(2.5)), "2,5");
-        EXPECT_EQ(to_string(Value(-0.0)), "0");
-        EXPECT_EQ(to_string(Value(1234.0)), "1234");
-    }
-    {
-        tests::CLocaleWithComma cComma;
-        ASSERT_TRUE(cComma.isSet());
-        EXPECT_EQ(to_string(Value(2.5)), "2,50");
-    }
-    EXPECT_EQ(to_string(Value(2.5)), "2.5");
-}
-
-TEST(NumberText, AgreesWithTheModelUnderEveryPairOfDecimalPoints) {
-    tests::Random random(44);
-    for (char cout : {'.', ',', '\'', 'n'}) {
-        tests::CoutDecimalPoint point(cout);
-        for (int i = 0; i < 5000; ++i) {
-            double const number = random.anyDouble();
-            ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, '.', cout))
-                << std::hexfloat << number << " with " << cout;
-        }
-    }
-    tests::CLocaleWithComma comma;
-    ASSERT_TRUE(comma.isSet());
-    for (char cout : {'.', ','}) {
-        tests::CoutDecimalPoint point(cout);
-        for (int i = 0; i < 5000; ++i) {
-            double const number = random.anyDouble();
-            ASSERT_EQ(to_string(Value(number)), tests::modelNumberText(number, ',', cout))
-                << std::hexfloat << number << " with " << cout;
-        }
-    }
-}
-
-TEST(NumberText, FollowsTheRoundingMode) {
-    struct Row {
-        char const* what;
-        int mode;
-        char const* text;
-        char const* negative;
-    };
-    for (Row const& row : {
-             Row{"to the nearest", FE_TONEAREST, "0.12", "-0.12"},
-#if defined(FE_UPWARD)  // Where one can be chosen at all.
-                 Row{"up", FE_UPWARD, "0.13", "-0.12"}, Row{"down", FE_DOWNWARD, "0.12", "-0.13"},
-                 Row{"towards zero", FE_TOWARDZERO, "0.12", "-0.12"},
-#endif
-         }) {
-        SCOPED_TRACE(row.what);
-        ASSERT_EQ(std::fesetround(row.mode), 0);
-        if (std::fegetround() != row.mode) GTEST_SKIP() << "there is one rounding mode alone";
-        std::string const text = to_string(Value(0.125));
-        std::string const negative = to_string(Value(-0.125));
-        std::fesetround(FE_TONEAREST);
-        EXPECT_EQ(text, row.text);
-        EXPECT_EQ(negative, row.negative);
-
-        tests::Random random(29);
-        for (int i = 0; i < 20000; ++i) {
-            double const number = random.anyDouble();
-            std::fesetround(row.mode);
-            std::string const anyText = to_string(Value(number));
-            std::fesetround(FE_TONEAREST);
-            ASSERT_EQ(anyText, tests::modelNumberText(number, '.', '.', row.mode))
-                << std::hexfloat << number;
-        }
-    }
-}
-
-TEST(NumberText, OfManyDigitsIsExact) {
-    struct Row {
-        double number;
-        char const* text;
-    };
-    for (Row const& row : {
-             Row{4503599627370495.5, "4503599627370495.5"},
-             Row{4503599627370496.0, "4503599627370496"},
-             Row{-4503599627370497.0, "-4503599627370497"},
-             Row{2251799813685247.75, "2251799813685247.8"},
-             Row{2251799813685247.25, "2251799813685247.2"},
-             Row{9007199254740993.0, "9007199254740992"},
-             Row{1e22, "10000000000000000000000"},
-         }) {
-        EXPECT_EQ(to_string(Value(row.number)), row.text);
-    }
-}
-
-TEST(NumberText, FollowsNoStreamFlags) {
-    std::ostringstream stream;
-    stream << std::setprecision(10) << std::scientific << Value(2.5) << std::hex << Value(255);
-    EXPECT_EQ(stream.str(), "2.5255");
-}
-
-TEST(TypeInfo, IsAFloatPortWithoutBoundsUnlessGiven) {
-    TypeInfo const info;
-    EXPECT_EQ(info.type, Type::Float);
-    EXPECT_EQ(info.subtype, 0);
-    EXPECT_FALSE(info.min.hasValue() || info.max.hasValue() || info.extra.hasValue());
-    static_assert(std::is_aggregate_v<TypeInfo>);
-    static_assert(std::is_same_v<decltype(info.subtype), unsigned char>);
-    TypeInfo const all{Type::Int, 1, Value(1), std::nullopt, Value("x")};
-    EXPECT_EQ(*reinterpret_cast<unsigned char const*>(&all), 6);
-    EXPECT_EQ(all.min.value(), Value(1));
-    EXPECT_EQ(all.extra.value(), Value("x"));
-}
-
-TEST(TypeInfo, CopiesItsOptionalsAndReleasesTheLastFirst) {
-    std::string released;
-    auto const noted = [&released](char name) {
-        return Value(std::shared_ptr<Path const>(new Path(), [&released, name](Path const* path) {
-            released += name;
-            delete path;
-        }));
-    };
-    {
-        TypeInfo copy;
-        {
-            TypeInfo const info{Type::Path, 0, noted('i'), noted('a'), noted('e')};
-            copy = info;
-            EXPECT_EQ(copy.max.value().ifPath(), info.max.value().ifPath());
-        }
-        EXPECT_EQ(released, "");
-    }
-    EXPECT_EQ(released, "eai");
-}
-
-TEST(TypeInfo, EqualsFieldByField) {
-    TypeInfo const base{Type::Float, 0, Value(0.0), Value(1.0), Value("e")};
-    struct Row {
-        char const* what;
-        TypeInfo other;
-        bool equal;
-    };
-    for (Row const& row : {
-             Row{"same", {Type::Float, 0, Value(0.0), Value(1.0), Value("e")}, true},
-             Row{"type", {Type::Int, 0, Value(0.0), Value(1.0), Value("e")}, false},
-             Row{"subtype", {Type::Float, 1, Value(0.0), Value(1.0), Value("e")}, false},
-             Row{"min", {Type::Float, 0, Value(0.5), Value(1.0), Value("e")}, false},
-             Row{"min of another type", {Type::Float, 0, Value(0), Value(1.0), Value("e")}, false},
-             Row{"no min", {Type::Float, 0, {}, Value(1.0), Value("e")}, false},
-             Row{"max", {Type::Float, 0, Value(0.0), Value(2.0), Value("e")}, false},
-             Row{"no max", {Type::Float, 0, Value(0.0), {}, Value("e")}, false},
-             Row{"extra", {Type::Float, 0, Value(0.0), Value(1.0), Value("f")}, false},
-             Row{"no extra", {Type::Float, 0, Value(0.0), Value(1.0), {}}, false},
-         }) {
-        SCOPED_TRACE(row.what);
-        EXPECT_EQ(base == row.other, row.equal);
-        EXPECT_EQ(row.other == base, row.equal);
-        EXPECT_EQ(base != row.other, !row.equal);
-    }
-    EXPECT_EQ(TypeInfo(), TypeInfo());
-    TypeInfo nan;
-    nan.min = Value(double(NAN));
-    EXPECT_NE(nan, TypeInfo(nan));
-}
-
-TEST(TypeInfo, WritesItsTypeAlone) {
-    for (Type type : kAllTypes) {
-        std::ostringstream stream;
-        EXPECT_EQ(&(stream << TypeInfo{type, 1, Value(0.0), Value(1.0), Value(2)}), &stream);
-        EXPECT_EQ(stream.str(), "[type: " + typeToString(type) + "]");
-    }
-}
-
-TEST(TypeInfo, NamesItsPort) {
-    struct Row {
-        Type type;
-        int subtype;
-        char const* plural;
-        char const* singular;
-    };
-    for (Row const& row : {
-             Row{Type::Float, 0, "Numbers", "Number"},
-             Row{Type::Float, 1, "Numbers", "Number"},
-             Row{Type::Int, 0, "Numbers", "Number"},
-             Row{Type::Vec2, 0, "Positions", "Position"},
-             Row{Type::Vec3, 0, "3D Points", "Point 3D"},
-             Row{Type::Vec4, 0, "Colors", "Color"},
-             Row{Type::Mat4, 0, "Matrices", "Matrix"},
-             Row{Type::Boolean, 1, "Pulses", "Pulse"},
-             Row{Type::Boolean, 0, "Booleans", "Boolean"},
-             Row{Type::Boolean, 2, "Booleans", "Boolean"},
-             Row{Type::Boolean, 255, "Booleans", "Boolean"},
-             Row{Type::Image, 1, "Images", "Image"},
-             Row{Type::Video, 0, "Videos", "Video"},
-             Row{Type::Sound, 0, "Sounds", "Sound"},
-             Row{Type::Path, 0, "Paths", "Path"},
-             Row{Type::String, 0, "Strings", "String"},
-             Row{Type::Model, 0, "Models", "Model"},
-             Row{Type::Unstructured, 1, "Layers", "Layer"},
-             Row{Type::Unstructured, 0, "Unstructured", "Unstructured"},
-             Row{Type::Unstructured, 2, "Unstructured", "Unstructured"},
-         }) {
-        TypeInfo info;
-        info.type = row.type;
-        info.subtype = static_cast<unsigned char>(row.subtype);
-        EXPECT_EQ(portNameForTypeInfo(info, true), row.plural);
-        EXPECT_EQ(portNameForTypeInfo(info, false), row.singular);
-    }
-}
-
-TEST(TypeInfo, NamesItsPortByTheSubtypeOfTwoTypesAlone) {
-    for (Type type : kAllTypes) {
-        bool const marked = type == Type::Boolean || type == Type::Unstructured;
-        for (int subtype = 0; subtype < 256; ++subtype) {
-            TypeInfo info{type, static_cast<unsigned char>(subtype), {}, {}, {}};
-            TypeInfo const plain{type, 0, {}, {}, {}};
-            for (bool plural : {false, true}) {
-                EXPECT_EQ(portNameForTypeInfo(info, plural) == portNameForTypeInfo(plain, plural),
-                          !(marked && subtype == 1))
-                    << typeToString(type) << " " << subtype;
-            }
-        }
-    }
-}
-
-TEST(TypeInfoDeathTest, OutOfRangeNamesNoPort) {
-    TypeInfo info;
-    info.type = outOfRange();
-    EXPECT_ENDS(portNameForTypeInfo(info, false),
-                tests::failedAssertion("0", "portNameForTypeInfo", "Engine/Base/value"));
-}
-
-TEST(CastValueToType, ClampsFloatPortsAndKeepsTheAlternative) {
-    Optional<Value> const none;
-    struct Row {
-        char const* what;
-        Value value;
-        Optional<Value> min;
-        Optional<Value> max;
-        char from;
-    };
-    for (Row const& row : {
-             Row{"no bounds", -3.0, none, none, 'v'},
-             Row{"below", -3.0, Value(0.0), none, '<'},
-             Row{"above", 3.0, none, Value(1.0), '>'},
-             Row{"inside", 0.5, Value(0.0), Value(1.0), 'v'},
-             Row{"at min", 0.0, Value(0.0), Value(1.0), 'v'},
-             Row{"at max", 1.0, Value(0.0), Value(1.0), 'v'},
-             Row{"negative zero at min", -0.0, Value(0.0), none, 'v'},
-             Row{"crossed bounds, below both", 0.0, Value(5.0), Value(2.0), '<'},
-             Row{"crossed bounds, between", 3.0, Value(5.0), Value(2.0), '<'},
-             Row{"crossed bounds, at min", 5.0, Value(5.0), Value(2.0), '>'},
-             Row{"crossed bounds, above both", 6.0, Value(5.0), Value(2.0), '>'},
-             Row{"NaN", NAN, Value(0.0), Value(1.0), 'v'},
-             Row{"NaN bounds", 5.0, Value(double(NAN)), Value(double(NAN)), 'v'},
-             Row{"string above", "7", none, Value(5.0), '>'},
-             Row{"string inside", "3", none, Value(5.0), 'v'},
-             Row{"integer bound", 9.5, none, Value(5), '>'},
-             Row{"string bound", 9.5, none, Value("5"), '>'},
-             Row{"vector by its x", FloatVec2{-1, 9}, Value(0.0), none, '<'},
-             Row{"true by its number", true, none, Value(0.5), '>'},
-         }) {
-        SCOPED_TRACE(row.what);
-        TypeInfo const info{Type::Float, 0, row.min, row.max, {}};
-        Value const* const expected = row.from == '<'   ? &info.min.value()
-                                      : row.from == '>' ? &info.max.value()
-                                                        : &row.value;
-        EXPECT_EQ(&castValueToType(row.value, info), expected);
-        Value argument = row.value;
-        Value const copy = castValueToType(std::move(argument), info);
-        EXPECT_EQ(copy.type(), expected->type());
-        EXPECT_EQ(to_string(copy), to_string(*expected));
-        // Copied, not moved from.
-        EXPECT_EQ(to_string(argument), to_string(row.value));  // NOLINT(bugprone-use-after-move)
-    }
-}
-
-TEST(CastValueToType, CopiesNothingAndLeavesOtherPortsAlone) {
-    Value const value = -3.0;
-    Value const text = "-3";
-    for (Type type : kAllTypes) {
-        TypeInfo const info{type, 0, Value(0.0), Value(1.0), {}};
-        EXPECT_EQ(&castValueToType(value, info), type == Type::Float ? &info.min.value() : &value);
-    }
-    Value argument = text;
-    EXPECT_EQ(castValueToType(std::move(argument), TypeInfo()).ifString(), text.ifString());
-    EXPECT_EQ(argument.ifString(), text.ifString());  // NOLINT(bugprone-use-after-move)
-}
-
-TEST(IndexLoopCasting, WrapsAroundAndClamps) {
-    Loop const loop{10.0, "20", 30};
-    TypeInfo const plain{Type::String, 0, {}, {}, {}};
-    TypeInfo const bounded{Type::Float, 0, Value(15.0), Value(25.0), {}};
-    EXPECT_EQ(&indexLoopCasting(loop, plain, 0), &loop[0]);
-    EXPECT_EQ(&indexLoopCasting(loop, plain, 7), &loop[1]);
-    EXPECT_EQ(&indexLoopCasting(loop, plain, ULLONG_MAX), &loop[ULLONG_MAX % 3]);
-    EXPECT_EQ(&indexLoopCasting(loop, bounded, 3), &bounded.min.value());
-    EXPECT_EQ(&indexLoopCasting(loop, bounded, 4), &loop[1]);
-    EXPECT_EQ(&indexLoopCasting(loop, bounded, 5), &bounded.max.value());
-}
-
-TEST(IndexLoopCasting, OfARangeIsThatOfEachIndex) {
-    TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), {}};
-    TypeInfo const plain;
-    for (Loop const& loop : {Loop(), Loop{0.5}, Loop{0.5, 1.5, 2.5}, Loop(100, 0.5)}) {
-        for (unsigned long long const first : {0ULL, 1ULL, 250ULL, ULLONG_MAX - 3, ULLONG_MAX}) {
-            for (std::size_t const count : {0u, 1u, 2u, 7u, 300u}) {
-                for (TypeInfo const* const info : {&bounded, &plain}) {
-                    SCOPED_TRACE(std::to_string(loop.size()) + " from " + std::to_string(first));
-                    std::vector<Value const*> results(count + 1, nullptr);
-                    indexLoopCasting(loop, *info, first, count, results.data());
-                    for (std::size_t i = 0; i < count; ++i) {
-                        ASSERT_EQ(results[i], &indexLoopCasting(loop, *info, first + i)) << i;
-                    }
-                    ASSERT_EQ(results[count], nullptr);
-                }
-            }
-        }
-    }
-}
-
-TEST(IndexLoopCasting, ReadsAnEmptyLoopAsZero) {
-    TypeInfo const plain;
-    TypeInfo const bounded{Type::Float, 0, Value(1.0), {}, {}};
-    Value const& zero = indexLoopCasting(nullLoop(), plain, 5);
-    EXPECT_EQ(zero, Value(0.0));
-    EXPECT_EQ(&zero, &indexLoopCasting(Loop(), plain, 9));
-    EXPECT_EQ(&indexLoopCasting(nullLoop(), bounded, 5), &bounded.min.value());
-}
-
-TEST(NullLoop, IsOneEmptyLoop) {
-    EXPECT_TRUE(nullLoop().empty());
-    EXPECT_EQ(&nullLoop(), &nullLoop());
-}
-
-// The clamp, written down a second time from its meaning: the lower bound first.
-TEST(CastValueToType, AgreesWithAModelOnRandomNumbers) {
-    tests::Random random(15);
-    for (int i = 0; i < 100000; ++i) {
-        double const value = random.chance() ? random.anyDouble() : double(random.below(4));
-        double const low = random.chance() ? random.anyDouble() : double(random.below(4));
-        double const high = random.chance() ? random.anyDouble() : double(random.below(4));
-        TypeInfo info;
-        if (random.chance()) info.min = Value(low);
-        if (random.chance()) info.max = Value(high);
-        double expected = value;
-        if (info.max && value > high) expected = high;
-        if (info.min && value < low) expected = low;
-        ASSERT_EQ(tests::bits(double(castValueToType(Value(value), info))), tests::bits(expected))
-            << value << " in " << low << ", " << high;
-    }
 }
 
 TEST(Value, SurvivesFailingAllocations) {

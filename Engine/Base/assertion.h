@@ -13,8 +13,8 @@ namespace tarn::engine {
 /// `Assertion failed: (<condition>), function <function>, file <module>, line <line>.`
 /// `module` is the source file from the repository root, without its extension.
 /// Allocates nothing. The arguments are never null.
-[[noreturn]] TARN_ENGINE_BASE_EXPORT void
-assertionFailed(char const* condition, char const* function, char const* module, int line) noexcept;
+[[noreturn]] TARN_API void assertionFailed(char const* condition, char const* function,
+                                           char const* module, int line) noexcept;
 
 }  // namespace tarn::engine
 

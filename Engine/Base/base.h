@@ -8,6 +8,7 @@
 
 #include <Engine/Base/assertion.h>
 #include <Engine/Base/comparison.h>
+#include <Engine/Base/conversion_traits.h>
 #include <Engine/Base/easing.h>
 #include <Engine/Base/export.h>
 #include <Engine/Base/fwd.h>

@@ -10,8 +10,8 @@
 namespace tarn::engine::detail {
 
 // `a == b` and `a < b`, compiled into the library, which knows of NaNs whatever its callers do.
-TARN_ENGINE_BASE_EXPORT bool equalNumbersInLibrary(double a, double b) noexcept;
-TARN_ENGINE_BASE_EXPORT bool lessNumberInLibrary(double a, double b) noexcept;
+TARN_API bool equalNumbersInLibrary(double a, double b) noexcept;
+TARN_API bool lessNumberInLibrary(double a, double b) noexcept;
 
 #if defined(__FINITE_MATH_ONLY__) && __FINITE_MATH_ONLY__
 // The caller's compiler takes every number for finite: a comparison in place could call a NaN equal

@@ -159,8 +159,8 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
 
 // One curve, known when this is compiled.
 template <EasingFunction function, class T>
-TARN_ENGINE_BASE_FLATTEN void easeEachAlong(T const& from, T const& to, double const* progress,
-                                            std::size_t count, T* results) {
+TARN_FLATTEN void easeEachAlong(T const& from, T const& to, double const* progress,
+                                std::size_t count, T* results) {
     std::size_t i = 0;
     if constexpr (std::is_same_v<T, double>) {
         // Blocks of a size that is known, in memory of their own, are computed several at once.
@@ -220,30 +220,26 @@ std::ostream& operator<<(std::ostream& stream, EasingFunction function) {
 }
 
 template <>
-TARN_ENGINE_BASE_FLATTEN double ease(EasingFunction function, double from, double to, double t) {
+TARN_FLATTEN double ease(EasingFunction function, double from, double to, double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-TARN_ENGINE_BASE_FLATTEN FloatVec2 ease(EasingFunction function, FloatVec2 from, FloatVec2 to,
-                                        double t) {
+TARN_FLATTEN FloatVec2 ease(EasingFunction function, FloatVec2 from, FloatVec2 to, double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-TARN_ENGINE_BASE_FLATTEN FloatVec3 ease(EasingFunction function, FloatVec3 from, FloatVec3 to,
-                                        double t) {
+TARN_FLATTEN FloatVec3 ease(EasingFunction function, FloatVec3 from, FloatVec3 to, double t) {
     return easeAlong(function, from, to, t);
 }
 template <>
-TARN_ENGINE_BASE_FLATTEN FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 to,
-                                        double t) {
+TARN_FLATTEN FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 to, double t) {
     return easeAlong(function, from, to, t);
 }
 
 // Where the other forms negate the difference, this one takes it the other way round: that is
 // not the same where it wraps around.
 template <>
-TARN_ENGINE_BASE_FLATTEN long long ease(EasingFunction function, long long from, long long to,
-                                        double t) {
+TARN_FLATTEN long long ease(EasingFunction function, long long from, long long to, double t) {
     double const a = static_cast<double>(from);
     double const delta = static_cast<double>(difference(to, from));
     double const back = static_cast<double>(difference(from, to));

@@ -37,13 +37,13 @@ enum class EasingFunction : std::int32_t {
 
 /// The names that an editor shows, "Linear" to "Sinusoidal In-Out", at their enumerator's
 /// position. A new list at every call.
-TARN_ENGINE_BASE_EXPORT std::vector<std::string> easingFunctionNames();
+TARN_API std::vector<std::string> easingFunctionNames();
 
 /// The curve of that name, byte by byte; empty for any other text.
-TARN_ENGINE_BASE_EXPORT Optional<EasingFunction> stringToEasingFunction(std::string const& name);
+TARN_API Optional<EasingFunction> stringToEasingFunction(std::string const& name);
 
 /// Writes the name that an editor shows; "EasingFunction(77)" for what is no enumerator.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, EasingFunction function);
+TARN_API std::ostream& operator<<(std::ostream& stream, EasingFunction function);
 
 /// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
 /// `FloatVec3` and `FloatVec4`; other types do not compile.
@@ -57,15 +57,15 @@ TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, EasingFun
 template <class T>
 T ease(EasingFunction function, T from, T to, double t) = delete;
 template <>
-TARN_ENGINE_BASE_EXPORT double ease<double>(EasingFunction, double, double, double);
+TARN_API double ease<double>(EasingFunction, double, double, double);
 template <>
-TARN_ENGINE_BASE_EXPORT long long ease<long long>(EasingFunction, long long, long long, double);
+TARN_API long long ease<long long>(EasingFunction, long long, long long, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec2 ease<FloatVec2>(EasingFunction, FloatVec2, FloatVec2, double);
+TARN_API FloatVec2 ease<FloatVec2>(EasingFunction, FloatVec2, FloatVec2, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double);
+TARN_API FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
+TARN_API FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
 
 /// The points of one curve at many places: `results[i]` becomes `ease(function, from, to,
 /// progress[i])`, bit for bit, for each `i` below `count`. `results` may be `progress`; otherwise
@@ -75,20 +75,19 @@ template <class T>
 void easeEach(EasingFunction function, T from, T to, double const* progress, std::size_t count,
               T* results) = delete;
 template <>
-TARN_ENGINE_BASE_EXPORT void easeEach<double>(EasingFunction, double, double, double const*,
-                                              std::size_t, double*);
+TARN_API void easeEach<double>(EasingFunction, double, double, double const*, std::size_t, double*);
 template <>
-TARN_ENGINE_BASE_EXPORT void easeEach<long long>(EasingFunction, long long, long long,
-                                                 double const*, std::size_t, long long*);
+TARN_API void easeEach<long long>(EasingFunction, long long, long long, double const*, std::size_t,
+                                  long long*);
 template <>
-TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec2>(EasingFunction, FloatVec2, FloatVec2,
-                                                 double const*, std::size_t, FloatVec2*);
+TARN_API void easeEach<FloatVec2>(EasingFunction, FloatVec2, FloatVec2, double const*, std::size_t,
+                                  FloatVec2*);
 template <>
-TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec3>(EasingFunction, FloatVec3, FloatVec3,
-                                                 double const*, std::size_t, FloatVec3*);
+TARN_API void easeEach<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double const*, std::size_t,
+                                  FloatVec3*);
 template <>
-TARN_ENGINE_BASE_EXPORT void easeEach<FloatVec4>(EasingFunction, FloatVec4, FloatVec4,
-                                                 double const*, std::size_t, FloatVec4*);
+TARN_API void easeEach<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double const*, std::size_t,
+                                  FloatVec4*);
 
 /// Two ends of different types: make them one, or one of them a `Value`. (The first parameter keeps
 /// `ease<double>(...)` out.)
@@ -101,19 +100,19 @@ void ease(EasingFunction function, From from, To to, double t) = delete;
 template <class T>
 T easeExponentialInOut(T from, T to, double t) = delete;
 template <>
-TARN_ENGINE_BASE_EXPORT double easeExponentialInOut<double>(double, double, double);
+TARN_API double easeExponentialInOut<double>(double, double, double);
 template <>
-TARN_ENGINE_BASE_EXPORT long long easeExponentialInOut<long long>(long long, long long, double);
+TARN_API long long easeExponentialInOut<long long>(long long, long long, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec2 easeExponentialInOut<FloatVec2>(FloatVec2, FloatVec2, double);
+TARN_API FloatVec2 easeExponentialInOut<FloatVec2>(FloatVec2, FloatVec2, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec3 easeExponentialInOut<FloatVec3>(FloatVec3, FloatVec3, double);
+TARN_API FloatVec3 easeExponentialInOut<FloatVec3>(FloatVec3, FloatVec3, double);
 template <>
-TARN_ENGINE_BASE_EXPORT FloatVec4 easeExponentialInOut<FloatVec4>(FloatVec4, FloatVec4, double);
+TARN_API FloatVec4 easeExponentialInOut<FloatVec4>(FloatVec4, FloatVec4, double);
 
 /// The same between values. The type of `to` decides: both ends are read as that type, and so is
 /// the result. Only numbers and vectors are eased; for every other type the result is 0.0.
-TARN_ENGINE_BASE_EXPORT Value ease(EasingFunction function, Value from, Value to, double t);
+TARN_API Value ease(EasingFunction function, Value from, Value to, double t);
 
 }  // namespace tarn::engine
 

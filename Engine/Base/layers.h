@@ -24,8 +24,8 @@ struct ModelLayer {
     std::vector<ModelLayer> additionalLayers = {};
 
     /// The same identifiers in the same trees.
-    TARN_ENGINE_BASE_EXPORT bool operator==(ModelLayer const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(ModelLayer const& other) const;
+    TARN_API bool operator==(ModelLayer const& other) const;
+    TARN_API bool operator!=(ModelLayer const& other) const;
 };
 
 /// One layer as the renderer knows it.
@@ -35,8 +35,8 @@ struct RenderLayer {
     unsigned long long id = 0;
 
     /// Both fields.
-    TARN_ENGINE_BASE_EXPORT bool operator==(RenderLayer const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(RenderLayer const& other) const;
+    TARN_API bool operator==(RenderLayer const& other) const;
+    TARN_API bool operator!=(RenderLayer const& other) const;
 };
 
 /// A layer with those that are drawn ahead of it and those nested in it. 8 MiB of stack are enough
@@ -48,8 +48,8 @@ struct RenderLayerHierarchy {
     std::vector<RenderLayerHierarchy> children = {};
 
     /// The same layers in the same trees.
-    TARN_ENGINE_BASE_EXPORT bool operator==(RenderLayerHierarchy const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(RenderLayerHierarchy const& other) const;
+    TARN_API bool operator==(RenderLayerHierarchy const& other) const;
+    TARN_API bool operator!=(RenderLayerHierarchy const& other) const;
 };
 
 /// How an outline is stroked. The first three fields are the renderer's: carried, copied and
@@ -72,27 +72,26 @@ struct StrokeSettings {
     /// Whether the stroke is drawn at all: its opacity is not 0.0001 or less, its width is not 0.01
     /// or less, and either it is forced or `start` and `end` differ by at least the machine
     /// epsilon. A NaN hides nothing.
-    TARN_ENGINE_BASE_EXPORT bool isVisible() const;
+    TARN_API bool isVisible() const;
 
     /// Field by field, without a tolerance.
-    TARN_ENGINE_BASE_EXPORT bool operator==(StrokeSettings const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(StrokeSettings const& other) const;
+    TARN_API bool operator==(StrokeSettings const& other) const;
+    TARN_API bool operator!=(StrokeSettings const& other) const;
 };
 
 /// The worker behind the hierarchy's text. Each line is a dash, `prefix`, "v" where `marked`, and
 /// the layer; leading layers come first and are marked, children follow with one dash more.
-TARN_ENGINE_BASE_EXPORT void _helper(std::ostream& stream, RenderLayerHierarchy const& hierarchy,
-                                     std::string prefix, bool marked);
+TARN_API void _helper(std::ostream& stream, RenderLayerHierarchy const& hierarchy,
+                      std::string prefix, bool marked);
 
 /// One line for each layer, its `id` after as many dashes as it is deep. Every line is flushed.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, ModelLayer const& layer);
+TARN_API std::ostream& operator<<(std::ostream& stream, ModelLayer const& layer);
 
 /// Writes the `id` alone.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, RenderLayer const& layer);
+TARN_API std::ostream& operator<<(std::ostream& stream, RenderLayer const& layer);
 
 /// The lines of `_helper`, from an empty prefix, unmarked. Every line is flushed.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream,
-                                                 RenderLayerHierarchy const& hierarchy);
+TARN_API std::ostream& operator<<(std::ostream& stream, RenderLayerHierarchy const& hierarchy);
 
 }  // namespace tarn::engine
 

@@ -34,28 +34,28 @@ enum class MediaContainer : unsigned char {
 
 /// Writes the enumerator, such as "JPEG"; "ImageFormat(1)" or "MediaContainer(77)" for what is
 /// none.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, ImageFormat format);
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, MediaContainer container);
+TARN_API std::ostream& operator<<(std::ostream& stream, ImageFormat format);
+TARN_API std::ostream& operator<<(std::ostream& stream, MediaContainer container);
 
 /// The twelve kinds of on-screen keyboard, "Default" first. One list that lives to program exit.
-TARN_ENGINE_BASE_EXPORT std::vector<std::string> const& keyboardTypes();
+TARN_API std::vector<std::string> const& keyboardTypes();
 
 /// "Front-Facing" and "Rear-Facing", in a new list at every call.
-TARN_ENGINE_BASE_EXPORT std::vector<std::string> cameraTypeNames();
+TARN_API std::vector<std::string> cameraTypeNames();
 
 /// The format of files with this extension, in any case, without a dot: "jpg", "jpeg" or "png".
 /// `Unknown` for everything else.
-TARN_ENGINE_BASE_EXPORT ImageFormat imageFormatForExtension(std::string extension);
+TARN_API ImageFormat imageFormatForExtension(std::string extension);
 
 /// The extension in lower case without a dot; empty for everything but the named formats.
-TARN_ENGINE_BASE_EXPORT std::string extensionForImageFormat(ImageFormat format);
+TARN_API std::string extensionForImageFormat(ImageFormat format);
 
 /// The container of files with this extension, in any case, without a dot: "mov", "mp4", "aiff",
 /// "mp3", "wav" or "m4a". `Unknown` for everything else.
-TARN_ENGINE_BASE_EXPORT MediaContainer mediaContainerForExtension(std::string extension);
+TARN_API MediaContainer mediaContainerForExtension(std::string extension);
 
 /// The extension in lower case without a dot; empty for everything but the named containers.
-TARN_ENGINE_BASE_EXPORT std::string extensionForMediaContainer(MediaContainer container);
+TARN_API std::string extensionForMediaContainer(MediaContainer container);
 
 }  // namespace tarn::engine
 

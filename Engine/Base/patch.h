@@ -45,9 +45,9 @@ namespace detail {
 
 // The empty lists that all new records share. They are never counted and never destroyed, so that
 // threads do not contend for them: `use_count()` is 0.
-TARN_ENGINE_BASE_EXPORT Array<Port> emptyPorts() noexcept;
-TARN_ENGINE_BASE_EXPORT Array<Connection> emptyConnections() noexcept;
-TARN_ENGINE_BASE_EXPORT Array<Patch> emptyPatches() noexcept;
+TARN_API Array<Port> emptyPorts() noexcept;
+TARN_API Array<Connection> emptyConnections() noexcept;
+TARN_API Array<Patch> emptyPatches() noexcept;
 
 template <class T>
 Array<T> emptyArray() {
@@ -66,7 +66,7 @@ inline Array<Patch> emptyArray() {
     return emptyPatches();
 }
 
-[[noreturn]] TARN_ENGINE_BASE_EXPORT void listIsNull(char const* condition) noexcept;
+[[noreturn]] TARN_API void listIsNull(char const* condition) noexcept;
 
 // What a list has. A null list is an assertion failure with the condition, which names it.
 template <class Pointer>
@@ -101,8 +101,8 @@ struct Port {
     std::map<std::string, Unstructured> attributes = {};
 
     /// Field by field.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Port const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Port const& other) const;
+    TARN_API bool operator==(Port const& other) const;
+    TARN_API bool operator!=(Port const& other) const;
 };
 
 /// From an output port to an input port. Held by the patch whose children both ends are.
@@ -114,8 +114,8 @@ struct Connection {
     unsigned long long toPortId = 0;
 
     /// All four identifiers.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Connection const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Connection const& other) const;
+    TARN_API bool operator==(Connection const& other) const;
+    TARN_API bool operator!=(Connection const& other) const;
 };
 
 }  // namespace tarn::engine
@@ -125,8 +125,7 @@ struct Connection {
 /// where `std::size_t` has 32 bits, its lower half.
 template <>
 struct std::hash<tarn::engine::Connection> {
-    TARN_ENGINE_BASE_EXPORT std::size_t
-    operator()(tarn::engine::Connection const& connection) const noexcept;
+    TARN_API std::size_t operator()(tarn::engine::Connection const& connection) const noexcept;
 };
 
 namespace tarn::engine {
@@ -151,8 +150,8 @@ struct Patch {
     Array<Patch> children = detail::emptyPatches();
 
     /// Deep and in order. Lists that are one object are equal without a look at them.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Patch const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Patch const& other) const;
+    TARN_API bool operator==(Patch const& other) const;
+    TARN_API bool operator!=(Patch const& other) const;
 };
 static_assert(std::is_nothrow_move_constructible_v<Port>, "lists of ports move when they grow");
 static_assert(std::is_nothrow_move_constructible_v<Patch>, "lists of patches move when they grow");
@@ -171,12 +170,12 @@ struct EvalPort {
     std::string name;
 
     /// Without values, or with the default value of `port` as the one that it has.
-    TARN_ENGINE_BASE_EXPORT EvalPort();
-    TARN_ENGINE_BASE_EXPORT explicit EvalPort(Port const& port);
+    TARN_API EvalPort();
+    TARN_API explicit EvalPort(Port const& port);
 
     /// Field by field, the evaluator's own included.
-    TARN_ENGINE_BASE_EXPORT bool operator==(EvalPort const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPort const& other) const;
+    TARN_API bool operator==(EvalPort const& other) const;
+    TARN_API bool operator!=(EvalPort const& other) const;
 };
 
 /// A patch as the evaluator keeps it. Copies share the lists; two conversions do not. 8 MiB of
@@ -194,20 +193,20 @@ struct EvalPatch {
     bool hasInputCount = false;
     bool hasOutputCount = false;
 
-    TARN_ENGINE_BASE_EXPORT EvalPatch();
+    TARN_API EvalPatch();
     /// Converts the whole subtree. Linear in its size; each list is allocated once.
-    TARN_ENGINE_BASE_EXPORT explicit EvalPatch(Patch const& patch);
+    TARN_API explicit EvalPatch(Patch const& patch);
 
     /// Deep and in order. Lists that are one object are equal without a look at them.
-    TARN_ENGINE_BASE_EXPORT bool operator==(EvalPatch const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(EvalPatch const& other) const;
+    TARN_API bool operator==(EvalPatch const& other) const;
+    TARN_API bool operator!=(EvalPatch const& other) const;
 };
 static_assert(std::is_nothrow_move_constructible_v<EvalPort>, "lists of ports move");
 static_assert(std::is_nothrow_move_constructible_v<EvalPatch>, "lists of patches move");
 
 /// The constructors, to be passed to `map`.
-TARN_ENGINE_BASE_EXPORT EvalPort toEvalPort(Port const& port);
-TARN_ENGINE_BASE_EXPORT EvalPatch toEvalPatch(Patch const& patch);
+TARN_API EvalPort toEvalPort(Port const& port);
+TARN_API EvalPatch toEvalPatch(Patch const& patch);
 
 /// A new list of what `std::invoke(function, element)` gives for each element, in order; allocated
 /// once. Never null: `map(&Port::id, list)` is a list of identifiers.
@@ -215,65 +214,60 @@ template <class Function, class T>
 MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
                                                                           Array<T> const& list);
 
-// Queries. None fails: what is not there is null, an empty optional or an empty set. Pointers refer
-// into the lists of the argument and live as long as those lists. All are linear in what they
-// search and allocate for their sets alone.
+// Queries. None fails: what is not there is null, an empty optional or an empty set. All are linear
+// in what they search and allocate for their sets alone.
 
 /// The patch of this id in the whole subtree, `root` included; null for id 0, even where a patch
 /// carries it. Each level's children are all looked at before the first of them is entered; the
-/// first found in this order wins.
-TARN_ENGINE_BASE_EXPORT Patch const* findPatchRecursive(Patch const& root, unsigned long long id);
-TARN_ENGINE_BASE_EXPORT EvalPatch const* findPatchRecursive(EvalPatch const& root,
-                                                            unsigned long long id);
+/// first found in this order wins. The pointer refers into the lists of `root` (or is `root`
+/// itself), and lives as long as they do.
+TARN_API Patch const* findPatchRecursive(Patch const& root, unsigned long long id);
+TARN_API EvalPatch const* findPatchRecursive(EvalPatch const& root, unsigned long long id);
 
 /// The port of this id among the inputs (outputs) of the patch, then of its children in order; not
-/// of grandchildren.
-TARN_ENGINE_BASE_EXPORT EvalPort const* findInputPort(EvalPatch const& patch,
-                                                      unsigned long long portId);
-TARN_ENGINE_BASE_EXPORT EvalPort const* findOutputPort(EvalPatch const& patch,
-                                                       unsigned long long portId);
+/// of grandchildren. The pointer refers into the list that has the port, and lives as long.
+TARN_API EvalPort const* findInputPort(EvalPatch const& patch, unsigned long long portId);
+TARN_API EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long long portId);
 
 /// The first of the patch's own connections that leads to the port.
-TARN_ENGINE_BASE_EXPORT Optional<Connection>
-findIncomingConnectionToPort(Patch const& patch, unsigned long long portId);
+TARN_API Optional<Connection> findIncomingConnectionToPort(Patch const& patch,
+                                                           unsigned long long portId);
 
 /// Those of the patch's own connections that lead to (start from) the patch `patchId`.
-TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
-findIncomingConnectionsToPatch(Patch const& patch, unsigned long long patchId);
-TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
+TARN_API std::unordered_set<Connection> findIncomingConnectionsToPatch(Patch const& patch,
+                                                                       unsigned long long patchId);
+TARN_API std::unordered_set<Connection>
 findOutgoingConnectionsFromPatch(Patch const& patch, unsigned long long patchId);
 
 /// The connections that start from the port, out of those of the first patch in the subtree with a
 /// child that has the port among its outputs; searched from `root`, depth first. Empty where
 /// that patch has none, and for a port of `root` itself.
-TARN_ENGINE_BASE_EXPORT std::unordered_set<Connection>
-findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
+TARN_API std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,
+                                                                        unsigned long long portId);
 
 /// The worker behind it: empty where no patch of the subtree has such a child.
-TARN_ENGINE_BASE_EXPORT Optional<std::unordered_set<Connection>>
+TARN_API Optional<std::unordered_set<Connection>>
 _findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
 
-/// The first input (output) of the patch with this tag; children are not searched.
-TARN_ENGINE_BASE_EXPORT Port const* inPortForTag(Patch const& patch, unsigned long long tag);
-TARN_ENGINE_BASE_EXPORT EvalPort const* inPortForTag(EvalPatch const& patch,
-                                                     unsigned long long tag);
-TARN_ENGINE_BASE_EXPORT Port const* outPortForTag(Patch const& patch, unsigned long long tag);
-TARN_ENGINE_BASE_EXPORT EvalPort const* outPortForTag(EvalPatch const& patch,
-                                                      unsigned long long tag);
+/// The first input (output) of the patch with this tag; children are not searched. The pointer
+/// refers into the list of the patch, and lives as long.
+TARN_API Port const* inPortForTag(Patch const& patch, unsigned long long tag);
+TARN_API EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long tag);
+TARN_API Port const* outPortForTag(Patch const& patch, unsigned long long tag);
+TARN_API EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag);
 
 // Debug text, for people; nothing reads it back. Numbers follow the stream's flags.
 
 /// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Port const& port);
+TARN_API std::ostream& operator<<(std::ostream& stream, Port const& port);
 
 /// "[connection:12->34]", the ids of the ports, without an end of line.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream,
-                                                 Connection const& connection);
+TARN_API std::ostream& operator<<(std::ostream& stream, Connection const& connection);
 
 /// The patch, its ports, its children's whole texts and its connections. Deliberate: only a
 /// patch without ports closes its bracket, and nesting is not indented. Every line end is
 /// flushed: print to a string stream where the text is long.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Patch const& patch);
+TARN_API std::ostream& operator<<(std::ostream& stream, Patch const& patch);
 
 // Implementation
 

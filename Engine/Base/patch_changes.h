@@ -86,18 +86,17 @@ struct PatchChange {
 /// Lists that are one object are not looked at: to compare a document with its edited copy costs
 /// what the edit copied, else it is linear. (Where patches are added while others are removed, all
 /// that is in the removed ones is looked at.) Nothing recurses.
-TARN_ENGINE_BASE_EXPORT std::vector<PatchChange> patchChanges(Patch const& before,
-                                                              Patch const& after);
+TARN_API std::vector<PatchChange> patchChanges(Patch const& before, Patch const& after);
 
 /// A line for people, without its end: what happened to which patch, with names and values; long
 /// values are cut, and so are more than twenty connections. `changed patch 7 "fade": input 31
 /// "progress" default 0.5 -> 0.75`
-TARN_ENGINE_BASE_EXPORT std::string to_string(PatchChange const& change);
+TARN_API std::string to_string(PatchChange const& change);
 /// All of them, each on a line of its own with its end.
-TARN_ENGINE_BASE_EXPORT std::string to_string(std::vector<PatchChange> const& changes);
+TARN_API std::string to_string(std::vector<PatchChange> const& changes);
 
 /// Writes that line.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, PatchChange const& change);
+TARN_API std::ostream& operator<<(std::ostream& stream, PatchChange const& change);
 
 }  // namespace tarn::engine
 

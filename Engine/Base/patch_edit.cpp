@@ -376,8 +376,8 @@ private:
         auto const& graph = tables->graph;
         auto const& known = side == Side::Input ? addedInputs : addedOutputs;
         auto const later = known.find(portId);
-        std::uint32_t const owners[] = {side == Side::Input ? graph.inputs.at(portId).owner
-                                                            : graph.outputs.at(portId).owner,
+        std::uint32_t const owners[] = {side == Side::Input ? graph.inputs.slotFor(portId).owner
+                                                            : graph.outputs.slotFor(portId).owner,
                                         later == known.end() ? kNone : later->second};
         for (std::uint32_t const owner : owners) {
             if (owner == kNone || !isThere(owner)) continue;

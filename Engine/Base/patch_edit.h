@@ -38,61 +38,58 @@ public:
     static constexpr std::size_t kEnd = std::numeric_limits<std::size_t>::max();
 
     /// Shares the tables of the index until `commit`, whatever becomes of the index.
-    TARN_ENGINE_BASE_EXPORT explicit PatchEdit(PatchIndex const& index);
+    TARN_API explicit PatchEdit(PatchIndex const& index);
     /// One that was moved from is only to be assigned to or destroyed.
-    TARN_ENGINE_BASE_EXPORT PatchEdit(PatchEdit&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT PatchEdit& operator=(PatchEdit&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT ~PatchEdit();
+    TARN_API PatchEdit(PatchEdit&& other) noexcept;
+    TARN_API PatchEdit& operator=(PatchEdit&& other) noexcept;
+    TARN_API ~PatchEdit();
 
     /// The patch (the port) as it will be, to be changed in place; null for one that is not there
     /// or is removed. Valid until `commit`, whatever else is changed. The `id` stays, whatever is
     /// written there. Another list that is assigned to the patch takes the place of the former one
     /// and of all changes made to that; the edit knows nothing of what is in it. (All empty lists
     /// of new records and of `arrayOf` are one: assigning it where it was is no change.)
-    TARN_ENGINE_BASE_EXPORT Patch* patch(unsigned long long id);
-    TARN_ENGINE_BASE_EXPORT Port* inputPort(unsigned long long portId);
-    TARN_ENGINE_BASE_EXPORT Port* outputPort(unsigned long long portId);
+    TARN_API Patch* patch(unsigned long long id);
+    TARN_API Port* inputPort(unsigned long long portId);
+    TARN_API Port* outputPort(unsigned long long portId);
 
     /// Adds a port to the patch, ahead of the one at `position`. False where the identifier of the
     /// port is 0 or taken.
-    TARN_ENGINE_BASE_EXPORT bool addInputPort(unsigned long long patchId, Port port,
-                                              std::size_t position = kEnd);
-    TARN_ENGINE_BASE_EXPORT bool addOutputPort(unsigned long long patchId, Port port,
-                                               std::size_t position = kEnd);
+    TARN_API bool addInputPort(unsigned long long patchId, Port port, std::size_t position = kEnd);
+    TARN_API bool addOutputPort(unsigned long long patchId, Port port, std::size_t position = kEnd);
     /// Removes the port, and the connections to it (from it) on the level of its patch.
-    TARN_ENGINE_BASE_EXPORT bool removeInputPort(unsigned long long portId);
-    TARN_ENGINE_BASE_EXPORT bool removeOutputPort(unsigned long long portId);
+    TARN_API bool removeInputPort(unsigned long long portId);
+    TARN_API bool removeOutputPort(unsigned long long portId);
 
     /// Adds a patch, with all that is in it, to the children of another, ahead of the one at
     /// `position`. False where an identifier in it is 0, occurs twice or is taken. Linear in its
     /// size.
-    TARN_ENGINE_BASE_EXPORT bool addPatch(unsigned long long parentId, Patch patch,
-                                          std::size_t position = kEnd);
+    TARN_API bool addPatch(unsigned long long parentId, Patch patch, std::size_t position = kEnd);
     /// Removes the patch with all that is in it, and the connections of its parent that begin or
     /// end at it. The root stays.
-    TARN_ENGINE_BASE_EXPORT bool removePatch(unsigned long long id);
+    TARN_API bool removePatch(unsigned long long id);
     /// Moves the patch to the children of another, ahead of the one that is then at `position`.
     /// Connections of a parent that it leaves are removed. False for the root, and for a parent
     /// that is the patch itself or inside it.
-    TARN_ENGINE_BASE_EXPORT bool movePatch(unsigned long long id, unsigned long long parentId,
-                                           std::size_t position = kEnd);
+    TARN_API bool movePatch(unsigned long long id, unsigned long long parentId,
+                            std::size_t position = kEnd);
 
     /// Adds the connection; an input may have several. False where it is there already, and where
     /// its ends are not an output and an input of two children of one patch, or of one child.
-    TARN_ENGINE_BASE_EXPORT bool connect(Connection connection);
+    TARN_API bool connect(Connection connection);
     /// Removes the connection, wherever it stands in the list of the patch that one of its ends is
     /// a child of. False where there is none.
-    TARN_ENGINE_BASE_EXPORT bool disconnect(Connection connection);
+    TARN_API bool disconnect(Connection connection);
 
     /// An identifier that neither the former document has nor this edit has seen; each call gives
     /// another. 0 where there is none left.
-    TARN_ENGINE_BASE_EXPORT unsigned long long freshPatchId();
-    TARN_ENGINE_BASE_EXPORT unsigned long long freshPortId();
+    TARN_API unsigned long long freshPatchId();
+    TARN_API unsigned long long freshPortId();
 
     /// The new root. What was changed back to what it was before, to the last bit, is no change: a
     /// root without any has the lists of the former one. Afterwards the edit is done: it answers
     /// null and false, and the same root again.
-    TARN_ENGINE_BASE_EXPORT Patch commit();
+    TARN_API Patch commit();
 
 private:
     class State;

@@ -38,7 +38,8 @@ void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
         if (slots.empty()) {
             auto const place = list.begin() + static_cast<std::ptrdiff_t>(i);
             isFirst = std::find(list.begin(), place, list[i]) == place;
-        } else if (std::uint32_t const first = firstOfHash.at(slots[i].key).position; first != i) {
+        } else if (std::uint32_t const first = firstOfHash.slotFor(slots[i].key).position;
+                   first != i) {
             isFirst = list[first] != list[i] && others.insert(list[i]).second;
         }
         if (isFirst) places.push_back({&list[i], parent, i});
@@ -65,7 +66,7 @@ void PatchTables::lookAtIds() {
     for (auto const& slot : graph.inputs) {
         if (slot.isFree()) continue;
         largestPortId = std::max<unsigned long long>(largestPortId, slot.key);
-        hasUniqueIds = hasUniqueIds && graph.outputs.at(slot.key).isFree();
+        hasUniqueIds = hasUniqueIds && graph.outputs.slotFor(slot.key).isFree();
     }
 }
 
@@ -149,10 +150,10 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
     std::uint32_t const to = graph.recordOf(connection.toPatchId);
     if (isChild(to)) add(graph.records[to].incoming);
 
-    auto& output = graph.outputs.at(connection.fromPortId);
+    auto& output = graph.outputs.slotFor(connection.fromPortId);
     if (isChild(innerOwner(output))) add(output.link);
 
-    auto& input = graph.inputs.at(connection.toPortId);
+    auto& input = graph.inputs.slotFor(connection.toPortId);
     bool const isInput = hasUniqueIds && !input.isFree();
     std::uint32_t const owner = isInput ? input.owner : graph.ownerOfPort(connection.toPortId);
     if (!isChild(owner)) return;
@@ -204,11 +205,11 @@ Patch const* PatchIndex::parentOf(unsigned long long id) const {
 }
 
 Port const* PatchIndex::findInputPort(unsigned long long portId) const {
-    return tables->graph.inputs.at(portId).port;
+    return tables->graph.inputs.slotFor(portId).port;
 }
 
 Port const* PatchIndex::findOutputPort(unsigned long long portId) const {
-    return tables->graph.outputs.at(portId).port;
+    return tables->graph.outputs.slotFor(portId).port;
 }
 
 Patch const* PatchIndex::ownerOfPort(unsigned long long portId) const {
@@ -217,7 +218,7 @@ Patch const* PatchIndex::ownerOfPort(unsigned long long portId) const {
 }
 
 ConnectionView PatchIndex::outgoingConnections(unsigned long long portId) const {
-    auto const& output = tables->graph.outputs.at(portId);
+    auto const& output = tables->graph.outputs.slotFor(portId);
     if (output.link == detail::kNone) return {};
     std::uint32_t const owner = output.owner != 0 ? output.owner : tables->innerOwners.at(portId);
     return tables->view(tables->graph.records[owner].parent, output.link);
@@ -227,7 +228,7 @@ Connection const* PatchIndex::incomingConnection(unsigned long long portId) cons
     auto const& graph = tables->graph;
     std::uint32_t const owner = graph.ownerOfPort(portId);
     if (owner == detail::kNone || graph.records[owner].parent == detail::kNone) return nullptr;
-    auto const& input = graph.inputs.at(portId);
+    auto const& input = graph.inputs.slotFor(portId);
     std::uint32_t position = input.link;
     if (owner != input.owner) {
         auto const known = tables->incomingToOutputs.find(portId);
@@ -270,11 +271,11 @@ EvalPatch const* EvalPatchIndex::parentOf(unsigned long long id) const {
 }
 
 EvalPort const* EvalPatchIndex::findInputPort(unsigned long long portId) const {
-    return tables->inputs.at(portId).port;
+    return tables->inputs.slotFor(portId).port;
 }
 
 EvalPort const* EvalPatchIndex::findOutputPort(unsigned long long portId) const {
-    return tables->outputs.at(portId).port;
+    return tables->outputs.slotFor(portId).port;
 }
 
 EvalPatch const* EvalPatchIndex::ownerOfPort(unsigned long long portId) const {

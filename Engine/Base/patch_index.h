@@ -88,33 +88,32 @@ public:
     /// Positions take 32 bits: a graph of more than a thousand million patches, ports or
     /// connections, shared lists counted wherever they occur, may throw `std::length_error`. The
     /// stack does not grow with the depth.
-    TARN_ENGINE_BASE_EXPORT explicit PatchIndex(Patch root);
+    TARN_API explicit PatchIndex(Patch root);
 
     /// The patch that the index was made of, in the place where its answers refer to it.
-    TARN_ENGINE_BASE_EXPORT Patch const& root() const;
+    TARN_API Patch const& root() const;
 
     /// As `findPatchRecursive(root(), id)`.
-    TARN_ENGINE_BASE_EXPORT Patch const* findPatch(unsigned long long id) const;
+    TARN_API Patch const* findPatch(unsigned long long id) const;
     /// The patch whose `children` hold `findPatch(id)`; null for the root and for unknown ids.
-    TARN_ENGINE_BASE_EXPORT Patch const* parentOf(unsigned long long id) const;
+    TARN_API Patch const* parentOf(unsigned long long id) const;
 
     /// The input (output) of this id anywhere in the graph: the first in the order in which
     /// `findPatchRecursive` looks at patches; null where there is none.
-    TARN_ENGINE_BASE_EXPORT Port const* findInputPort(unsigned long long portId) const;
-    TARN_ENGINE_BASE_EXPORT Port const* findOutputPort(unsigned long long portId) const;
+    TARN_API Port const* findInputPort(unsigned long long portId) const;
+    TARN_API Port const* findOutputPort(unsigned long long portId) const;
     /// The patch of the first port of this id, in the same order, inputs before outputs.
-    TARN_ENGINE_BASE_EXPORT Patch const* ownerOfPort(unsigned long long portId) const;
+    TARN_API Patch const* ownerOfPort(unsigned long long portId) const;
 
     /// The connections of `findOutgoingConnectionsFromPort(root(), portId)`.
-    TARN_ENGINE_BASE_EXPORT ConnectionView outgoingConnections(unsigned long long portId) const;
+    TARN_API ConnectionView outgoingConnections(unsigned long long portId) const;
     /// What `findIncomingConnectionToPort` finds in the parent of the port's owner, or null.
-    TARN_ENGINE_BASE_EXPORT Connection const* incomingConnection(unsigned long long portId) const;
+    TARN_API Connection const* incomingConnection(unsigned long long portId) const;
 
     /// What `findIncomingConnectionsToPatch` (`findOutgoingConnectionsFromPatch`) finds in
     /// `parentOf(id)`; empty where that is null.
-    TARN_ENGINE_BASE_EXPORT ConnectionView incomingConnectionsToPatch(unsigned long long id) const;
-    TARN_ENGINE_BASE_EXPORT ConnectionView
-    outgoingConnectionsFromPatch(unsigned long long id) const;
+    TARN_API ConnectionView incomingConnectionsToPatch(unsigned long long id) const;
+    TARN_API ConnectionView outgoingConnectionsFromPatch(unsigned long long id) const;
 
     /// Makes this the index of another root: afterwards its answers are those of
     /// `PatchIndex(root)`. The cost follows what differs from the root before, lists that are one
@@ -126,7 +125,7 @@ public:
     /// ports and connections live as long as the lists that they refer into: those of the former
     /// root, while somebody holds it, and all that the new one shares with it. A failing
     /// allocation leaves the index as it was. Nobody may ask this index anything meanwhile.
-    TARN_ENGINE_BASE_EXPORT void update(Patch root);
+    TARN_API void update(Patch root);
 
 private:
     friend class PatchEdit;
@@ -140,19 +139,19 @@ private:
 class EvalPatchIndex {
 public:
     /// Shares the lists of `root`. Costs as that of `PatchIndex`.
-    TARN_ENGINE_BASE_EXPORT explicit EvalPatchIndex(EvalPatch root);
+    TARN_API explicit EvalPatchIndex(EvalPatch root);
 
     /// Looks at the graph again. Afterwards the answers are those of the lists as they are now. A
     /// failing allocation leaves the index as it was.
-    TARN_ENGINE_BASE_EXPORT void rebuild();
+    TARN_API void rebuild();
 
     /// As those of `PatchIndex`. None allocates.
-    TARN_ENGINE_BASE_EXPORT EvalPatch const& root() const;
-    TARN_ENGINE_BASE_EXPORT EvalPatch const* findPatch(unsigned long long id) const;
-    TARN_ENGINE_BASE_EXPORT EvalPatch const* parentOf(unsigned long long id) const;
-    TARN_ENGINE_BASE_EXPORT EvalPort const* findInputPort(unsigned long long portId) const;
-    TARN_ENGINE_BASE_EXPORT EvalPort const* findOutputPort(unsigned long long portId) const;
-    TARN_ENGINE_BASE_EXPORT EvalPatch const* ownerOfPort(unsigned long long portId) const;
+    TARN_API EvalPatch const& root() const;
+    TARN_API EvalPatch const* findPatch(unsigned long long id) const;
+    TARN_API EvalPatch const* parentOf(unsigned long long id) const;
+    TARN_API EvalPort const* findInputPort(unsigned long long portId) const;
+    TARN_API EvalPort const* findOutputPort(unsigned long long portId) const;
+    TARN_API EvalPatch const* ownerOfPort(unsigned long long portId) const;
 
 private:
     struct Tables;

@@ -195,7 +195,7 @@ private:
         Ids seen;
         auto const isFree = [](HashTable<PortSlot<Port>> const& table, PortPlan const& plan,
                                unsigned long long id) {
-            return table.at(id).isFree() || plan.erased.count(id) != 0;
+            return table.slotFor(id).isFree() || plan.erased.count(id) != 0;
         };
         for (PortPlan const* const plan : {&inputs, &outputs}) {
             for (PortPlan::Insertion const& insertion : plan->inserted) {
@@ -239,7 +239,8 @@ private:
             dropGroups(graph.records[record], graph.records[record].patch->outputs);
             graph.patches.erase(graph.records[record].patch->id);
         }
-        for (unsigned long long const id : outputs.erased) dropGroup(graph.outputs.at(id).link);
+        for (unsigned long long const id : outputs.erased)
+            dropGroup(graph.outputs.slotFor(id).link);
         applyErasures(graph.inputs, inputs);
         applyErasures(graph.outputs, outputs);
         for (Refresh const& now : refreshed) {
@@ -259,7 +260,7 @@ private:
     }
 
     void applyInsertions(HashTable<PortSlot<Port>>& table, PortPlan const& plan) noexcept {
-        for (Port const* const port : plan.refreshed) table.at(port->id).port = port;
+        for (Port const* const port : plan.refreshed) table.slotFor(port->id).port = port;
         for (auto const& [port, owner] : plan.inserted) {
             table.insert({port->id, port, owner});
             tables.largestPortId = std::max(tables.largestPortId, port->id);
@@ -284,7 +285,7 @@ private:
     void dropGroups(PatchRecord<Patch>& record, Array<Port> const& ports) noexcept {
         dropGroup(record.incoming);
         dropGroup(record.outgoing);
-        for (Port const& port : *ports) dropGroup(graph.outputs.at(port.id).link);
+        for (Port const& port : *ports) dropGroup(graph.outputs.slotFor(port.id).link);
     }
 
     void dropGroup(std::uint32_t& group) noexcept {
@@ -308,7 +309,7 @@ private:
     void groupConnections() noexcept {
         forEachRegrouped([this](PatchRecord<Patch>& record, Patch const& child) {
             dropGroups(record, child.outputs);
-            for (Port const& port : *child.inputs) graph.inputs.at(port.id).link = kNone;
+            for (Port const& port : *child.inputs) graph.inputs.slotFor(port.id).link = kNone;
         });
         for (ConnectionPlace const& place : places) tables.addMembers(place, members);
         PatchTables::count(members);
@@ -317,7 +318,7 @@ private:
             tables.layOut(record.incoming, end);
             tables.layOut(record.outgoing, end);
             for (Port const& port : *child.outputs) {
-                tables.layOut(graph.outputs.at(port.id).link, end);
+                tables.layOut(graph.outputs.slotFor(port.id).link, end);
             }
         });
         tables.positions.resize(end);

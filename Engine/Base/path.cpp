@@ -1,7 +1,7 @@
 #include <Engine/Base/path.h>
 
-#include <Engine/Base/assertion.h>
 #include <Engine/Base/detail/immortal.h>
+#include <Engine/Base/detail/unreachable.h>
 
 #include <algorithm>
 #include <array>
@@ -13,8 +13,6 @@
 namespace tarn::engine {
 
 namespace {
-
-constexpr char kModule[] = "Engine/Base/path";
 
 constexpr std::array<std::string_view, 5> kInstructionNames{"moveTo", "lineTo", "curveTo",
                                                             "quadCurveTo", "close"};
@@ -36,7 +34,7 @@ void add(std::vector<PathElement>& elements, PathInstruction instruction, Vector
 
 std::string pathInstructionToString(PathInstruction instruction) {
     if (std::size_t(instruction) >= kInstructionNames.size()) {
-        assertionFailed("0", __func__, kModule, __LINE__);
+        TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/path");
     }
     return std::string(kInstructionNames[std::size_t(instruction)]);
 }
@@ -50,7 +48,7 @@ Optional<PathInstruction> parsePathInstruction(std::string const& name) {
 
 PathInstruction stringToPathInstruction(std::string const& name) {
     Optional<PathInstruction> const instruction = parsePathInstruction(name);
-    if (!instruction) assertionFailed("0", __func__, kModule, __LINE__);
+    if (!instruction) TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/path");
     return *instruction;
 }
 

@@ -31,16 +31,16 @@ enum class PathInstruction : unsigned char {
 };
 
 /// "moveTo" to "close". An enumerator out of range is an assertion failure.
-TARN_ENGINE_BASE_EXPORT std::string pathInstructionToString(PathInstruction instruction);
+TARN_API std::string pathInstructionToString(PathInstruction instruction);
 
 /// The inverse, byte by byte. Any other text is an assertion failure, with the condition `0`.
-TARN_ENGINE_BASE_EXPORT PathInstruction stringToPathInstruction(std::string const& name);
+TARN_API PathInstruction stringToPathInstruction(std::string const& name);
 
 /// The same, empty for any other text.
-TARN_ENGINE_BASE_EXPORT Optional<PathInstruction> parsePathInstruction(std::string const& name);
+TARN_API Optional<PathInstruction> parsePathInstruction(std::string const& name);
 
 /// Writes the name; "PathInstruction(77)" for what is no enumerator.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, PathInstruction instruction);
+TARN_API std::ostream& operator<<(std::ostream& stream, PathInstruction instruction);
 
 /// One instruction with its points. Their number is not checked against the instruction.
 struct PathElement {
@@ -51,8 +51,8 @@ struct PathElement {
 
     /// Equal instructions, and as many points, equal as floating-point numbers are: with a NaN
     /// in it an element is unequal to itself.
-    TARN_ENGINE_BASE_EXPORT bool operator==(PathElement const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(PathElement const& other) const;
+    TARN_API bool operator==(PathElement const& other) const;
+    TARN_API bool operator!=(PathElement const& other) const;
 };
 
 /// An outline: elements in drawing order. Copying is deep.
@@ -61,20 +61,20 @@ struct Path {
     std::vector<PathElement> elements;
 
     /// Empty, of the elements given, or a copy; a move takes constant time.
-    TARN_ENGINE_BASE_EXPORT Path();
-    TARN_ENGINE_BASE_EXPORT Path(std::vector<PathElement> drawn);
-    TARN_ENGINE_BASE_EXPORT Path(Path const& other);
-    TARN_ENGINE_BASE_EXPORT Path(Path&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT Path& operator=(Path const& other);
-    TARN_ENGINE_BASE_EXPORT Path& operator=(Path&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT ~Path();
+    TARN_API Path();
+    TARN_API Path(std::vector<PathElement> drawn);
+    TARN_API Path(Path const& other);
+    TARN_API Path(Path&& other) noexcept;
+    TARN_API Path& operator=(Path const& other);
+    TARN_API Path& operator=(Path&& other) noexcept;
+    TARN_API ~Path();
 
     /// As many elements, equal in order.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Path const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Path const& other) const;
+    TARN_API bool operator==(Path const& other) const;
+    TARN_API bool operator!=(Path const& other) const;
 
     /// The one empty path that everyone shares: the same object at every call.
-    TARN_ENGINE_BASE_EXPORT static std::shared_ptr<Path const> EmptyPath();
+    TARN_API static std::shared_ptr<Path const> EmptyPath();
 };
 static_assert(std::is_nothrow_move_constructible_v<PathElement>, "elements move when paths grow");
 
@@ -90,45 +90,48 @@ public:
     std::vector<PathElement> elements = {};
 
     /// Afterwards the current point is p.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& moveTo(FloatVec2 p);
+    TARN_API PathBuilder& moveTo(FloatVec2 p);
     /// Afterwards the current point is p.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& lineTo(FloatVec2 p);
+    TARN_API PathBuilder& lineTo(FloatVec2 p);
     /// A cubic curve with the control points c1 and c2. Afterwards the current point is p.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& curveTo(FloatVec2 c1, FloatVec2 c2, FloatVec2 p);
+    TARN_API PathBuilder& curveTo(FloatVec2 c1, FloatVec2 c2, FloatVec2 p);
     /// A quadratic curve with the control point c. Afterwards the current point is p.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& quadCurveTo(FloatVec2 c, FloatVec2 p);
+    TARN_API PathBuilder& quadCurveTo(FloatVec2 c, FloatVec2 p);
     /// Afterwards the current point is what it was, not the start of the outline.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& close();
+    TARN_API PathBuilder& close();
     /// Every element of `path`, or none where memory fails. Afterwards the current point is what
     /// it was, not the end of `path`.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& append(Path path);
+    TARN_API PathBuilder& append(Path path);
 
     /// A quarter of an ellipse with its axes along x and y, as one cubic curve (at most 2.8e-4 of
     /// the radius off). `verticalFirst`: leave along y and arrive along x; otherwise the reverse.
     /// Afterwards the current point is p.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& arcTo(FloatVec2 p, bool verticalFirst);
+    TARN_API PathBuilder& arcTo(FloatVec2 p, bool verticalFirst);
 
-    /// Closed outlines. None checks its sizes; negative ones turn the outline over.
+    // Closed outlines.
 
-    /// `radii` are half the width and half the height. Starts at the largest x and runs through
-    /// the largest y. Afterwards the current point is that start.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& ellipse(FloatVec2 center, FloatVec2 radii);
-    TARN_ENGINE_BASE_EXPORT PathBuilder& circle(FloatVec2 center, double radius);
-    /// `origin` is the corner of smallest x and y. `radius` is at most half the width and half the
-    /// height; a NaN is the largest. Afterwards the current point is (origin.x + radius, origin.y).
-    TARN_ENGINE_BASE_EXPORT PathBuilder& roundRect(FloatVec2 origin, FloatVec2 size, double radius);
-    /// A rectangle with each corner cut off, `cut` along either edge, not limited. Afterwards the
-    /// current point is (origin.x, origin.y + cut), where its last line ended.
-    TARN_ENGINE_BASE_EXPORT PathBuilder& hexaRect(FloatVec2 origin, FloatVec2 size, double cut);
+    /// `radii` are half the width and half the height, not checked; negative ones turn the outline
+    /// over. Starts at the largest x and runs through the largest y. Afterwards the current point
+    /// is that start.
+    TARN_API PathBuilder& ellipse(FloatVec2 center, FloatVec2 radii);
+    TARN_API PathBuilder& circle(FloatVec2 center, double radius);
+    /// `origin` is the corner of smallest x and y. `size` is not checked; a negative one turns the
+    /// outline over. `radius` is at most half the width and half the height; a NaN is the largest.
+    /// Afterwards the current point is (origin.x + radius, origin.y).
+    TARN_API PathBuilder& roundRect(FloatVec2 origin, FloatVec2 size, double radius);
+    /// A rectangle with each corner cut off, `cut` along either edge, not limited. `size` is not
+    /// checked; a negative one turns the outline over. Afterwards the current point is (origin.x,
+    /// origin.y + cut), where its last line ended.
+    TARN_API PathBuilder& hexaRect(FloatVec2 origin, FloatVec2 size, double cut);
 
     /// A path of all elements so far. The builder keeps them and can go on; one that is done
     /// hands them over without a copy: `std::move(builder).build()`.
-    TARN_ENGINE_BASE_EXPORT Path build() const&;
-    TARN_ENGINE_BASE_EXPORT Path build() &&;
+    TARN_API Path build() const&;
+    TARN_API Path build() &&;
 
     /// The same elements and the same current point.
-    TARN_ENGINE_BASE_EXPORT bool operator==(PathBuilder const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(PathBuilder const& other) const;
+    TARN_API bool operator==(PathBuilder const& other) const;
+    TARN_API bool operator!=(PathBuilder const& other) const;
 
 private:
     void reserve(std::size_t more);

@@ -31,18 +31,18 @@ struct Bounds {
 /// begins at (0, 0). Empty for a path without a point whose coordinates are
 /// numbers; where a control point is infinite, so is the box. Elements with fewer points than their
 /// instruction wants are left out, and so is a coordinate that is a NaN. Linear.
-TARN_ENGINE_BASE_EXPORT Optional<Bounds> bounds(Path const& path);
+TARN_API Optional<Bounds> bounds(Path const& path);
 
 /// The path with every point moved by `offset`.
-TARN_ENGINE_BASE_EXPORT Path translated(Path const& path, FloatVec2 offset);
+TARN_API Path translated(Path const& path, FloatVec2 offset);
 
 /// The path with every point's coordinates times `factors`: larger and smaller about the origin.
-TARN_ENGINE_BASE_EXPORT Path scaled(Path const& path, FloatVec2 factors);
+TARN_API Path scaled(Path const& path, FloatVec2 factors);
 
 /// The path on the way from `a` to `b`: `a` itself at `t` 0, `b` itself at 1, and between and
 /// beyond them every coordinate x + (y - x) * t. Empty where the two have different instructions or
 /// numbers of points. Linear.
-TARN_ENGINE_BASE_EXPORT Optional<Path> interpolate(Path const& a, Path const& b, double t);
+TARN_API Optional<Path> interpolate(Path const& a, Path const& b, double t);
 
 }  // namespace tarn::engine
 

@@ -27,8 +27,8 @@ namespace detail {
 
 // `std::out_of_range` and `std::length_error`, out of line: callers may be compiled without
 // exceptions.
-[[noreturn]] TARN_ENGINE_BASE_EXPORT void throwOutOfRange(char const* what);
-[[noreturn]] TARN_ENGINE_BASE_EXPORT void throwLengthError(char const* what);
+[[noreturn]] TARN_API void throwOutOfRange(char const* what);
+[[noreturn]] TARN_API void throwLengthError(char const* what);
 
 }  // namespace detail
 

@@ -21,7 +21,7 @@ namespace tarn::engine {
 /// as 0, and no infinity, which is written as the largest double. Elements with fewer points than
 /// their instruction wants are left out, their further points are not written, and a path that
 /// begins without a `moveTo` begins with "M0 0". Linear.
-TARN_ENGINE_BASE_EXPORT std::string svgPathData(Path const& path);
+TARN_API std::string svgPathData(Path const& path);
 
 /// The path of such a text, of all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
 /// relative. It consists of `moveTo`, `lineTo`, `curveTo`, `quadCurveTo` and `close` alone: arcs
@@ -31,8 +31,7 @@ TARN_ENGINE_BASE_EXPORT std::string svgPathData(Path const& path);
 /// Empty where the data is faulty, also where it only ends too early, does not begin with M, or has
 /// a number beyond the range of a double; `*fault` is then the position of the first byte that
 /// cannot be read. Otherwise it is left as it is.
-TARN_ENGINE_BASE_EXPORT Optional<Path> pathFromSvgPathData(std::string const& data,
-                                                           std::size_t* fault = nullptr);
+TARN_API Optional<Path> pathFromSvgPathData(std::string const& data, std::size_t* fault = nullptr);
 
 }  // namespace tarn::engine
 

@@ -66,10 +66,10 @@ bool isEmptyContainer(Unstructured const& tree) {
 
 }  // namespace
 
-Unstructured::Unstructured(Map const& map) : storage(made(Map(map))) {}
-Unstructured::Unstructured(Map&& map) : storage(made(std::move(map))) {}
-Unstructured::Unstructured(Array const& array) : storage(made(Array(array))) {}
-Unstructured::Unstructured(Array&& array) : storage(made(std::move(array))) {}
+Unstructured::Unstructured(Map const& map) : storage(makeStorage(Map(map))) {}
+Unstructured::Unstructured(Map&& map) : storage(makeStorage(std::move(map))) {}
+Unstructured::Unstructured(Array const& array) : storage(makeStorage(Array(array))) {}
+Unstructured::Unstructured(Array&& array) : storage(makeStorage(std::move(array))) {}
 Unstructured::Unstructured(std::string const& text) : storage(new std::string(text)) {}
 Unstructured::Unstructured(std::string&& text) : storage(new std::string(std::move(text))) {}
 Unstructured::Unstructured(char const* text)
@@ -97,7 +97,7 @@ std::uint32_t Unstructured::height() const {
 bool Unstructured::isDeep() const { return height() > kDeepestRecursion; }
 
 template <class T>
-Unstructured::Storage Unstructured::made(T&& content) {
+Unstructured::Storage Unstructured::makeStorage(T&& content) {
     std::uint32_t levels = 0;
     for (auto const& element : content) {
         Unstructured const& tree = elementOf(element);
@@ -108,7 +108,7 @@ Unstructured::Storage Unstructured::made(T&& content) {
 }
 
 template <class T>
-Unstructured::Storage Unstructured::copied(Node<T> const& node) {
+Unstructured::Storage Unstructured::copyStorage(Node<T> const& node) {
     return new Node<T>{node.content, node.height};
 }
 
@@ -121,8 +121,8 @@ Unstructured::Storage Unstructured::copiedContent() const {
         return taken;
     }
     switch (type()) {
-        case Type::Map: return copied(*node<Map>());
-        case Type::Array: return copied(*node<Array>());
+        case Type::Map: return copyStorage(*node<Map>());
+        case Type::Array: return copyStorage(*node<Array>());
         case Type::String: return new std::string(*ifString());
         case Type::Null:
         case Type::Float:

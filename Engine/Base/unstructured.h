@@ -69,9 +69,7 @@ public:
         Step(char const* mapKey) : key(mapKey == nullptr ? "" : mapKey), isKey(true) {}
         Step(std::string mapKey) : key(std::move(mapKey)), isKey(true) {}
         /// To the element of an array at this position. A negative one is that of no element.
-        template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer> ||
-                                                      detail::isUnsignedInteger<Integer>,
-                                                  int> = 0>
+        template <class Integer, std::enable_if_t<detail::isInteger<Integer>, int> = 0>
         Step(Integer arrayPosition) : position(positionOf(arrayPosition)) {}
 
     private:
@@ -102,29 +100,25 @@ public:
     };
 
     /// Null.
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured() : storage(nullptr) {}
-    TARN_ENGINE_BASE_EXPORT Unstructured(Map const& map);
-    TARN_ENGINE_BASE_EXPORT Unstructured(Map&& map);
-    TARN_ENGINE_BASE_EXPORT Unstructured(Array const& array);
-    TARN_ENGINE_BASE_EXPORT Unstructured(Array&& array);
-    TARN_ENGINE_BASE_EXPORT Unstructured(std::string const& text);
-    TARN_ENGINE_BASE_EXPORT Unstructured(std::string&& text);
+    TARN_API_INLINE Unstructured() : storage(nullptr) {}
+    TARN_API Unstructured(Map const& map);
+    TARN_API Unstructured(Map&& map);
+    TARN_API Unstructured(Array const& array);
+    TARN_API Unstructured(Array&& array);
+    TARN_API Unstructured(std::string const& text);
+    TARN_API Unstructured(std::string&& text);
     /// The bytes up to the terminating zero; a null pointer is the empty string.
-    TARN_ENGINE_BASE_EXPORT Unstructured(char const* text);
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(long long const& integer) : storage(integer) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(double const& number) : storage(number) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(unsigned long long const& integer)
-        : storage(integer) {}
+    TARN_API Unstructured(char const* text);
+    TARN_API_INLINE Unstructured(long long const& integer) : storage(integer) {}
+    TARN_API_INLINE Unstructured(double const& number) : storage(number) {}
+    TARN_API_INLINE Unstructured(unsigned long long const& integer) : storage(integer) {}
     /// Every other integer type, by its sign; a truth value or a character is neither.
-    template <class Integer, std::enable_if_t<(detail::isSignedInteger<Integer> ||
-                                               detail::isUnsignedInteger<Integer>)&&!detail::
-                                                  isOneOf<Integer, long long, unsigned long long>,
-                                              int> = 0>
+    template <class Integer, std::enable_if_t<detail::isOtherInteger<Integer>, int> = 0>
     Unstructured(Integer integer)
         : Unstructured(static_cast<std::conditional_t<std::is_signed_v<Integer>, long long,
                                                       unsigned long long>>(integer)) {}
     /// As `value.asUnstructured()`.
-    TARN_ENGINE_BASE_EXPORT Unstructured(Value const& value);
+    TARN_API Unstructured(Value const& value);
 
     template <
         class Source,
@@ -133,36 +127,36 @@ public:
     Unstructured(std::nullptr_t) = delete;
 
     /// The whole tree, copied; or taken over in constant time, null being left behind.
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured const& other)
+    TARN_API_INLINE Unstructured(Unstructured const& other)
         : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Unstructured(Unstructured&& other) noexcept
+    TARN_API_INLINE Unstructured(Unstructured&& other) noexcept
         : storage(std::move(other.storage)) {
         other.forget();
     }
     /// A failing allocation leaves this as it was. What is assigned may be a part of this; a whole
     /// may be copied, but not moved, into a part of itself.
-    TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured const& other);
-    TARN_ENGINE_BASE_EXPORT Unstructured& operator=(Unstructured&& other) noexcept;
-    TARN_ENGINE_BASE_EXPORT_INLINE ~Unstructured() {
+    TARN_API Unstructured& operator=(Unstructured const& other);
+    TARN_API Unstructured& operator=(Unstructured&& other) noexcept;
+    TARN_API_INLINE ~Unstructured() {
         if (ownsContent()) destroyContent();
     }
 
     /// Null, by name.
-    TARN_ENGINE_BASE_EXPORT_INLINE static Unstructured Undefined() { return Unstructured(); }
+    TARN_API_INLINE static Unstructured Undefined() { return Unstructured(); }
 
     /// The kind of this value. Constant time.
-    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const noexcept { return Type(storage.which()); }
+    TARN_API_INLINE Type type() const noexcept { return Type(storage.which()); }
 
     /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy
     /// nothing.
-    TARN_ENGINE_BASE_EXPORT Map asMap() const;
-    TARN_ENGINE_BASE_EXPORT Array asArray() const;
-    TARN_ENGINE_BASE_EXPORT std::string asString() const;
+    TARN_API Map asMap() const;
+    TARN_API Array asArray() const;
+    TARN_API std::string asString() const;
 
     /// The signed number, or the floating-point one (towards zero and kept in range, NaN as 0, for
     /// an integer). Deliberate: an unsigned number is an identifier and reads as 0 in both.
-    TARN_ENGINE_BASE_EXPORT long long asInteger() const;
-    TARN_ENGINE_BASE_EXPORT_INLINE double asFloat() const {
+    TARN_API long long asInteger() const;
+    TARN_API_INLINE double asFloat() const {
         if (double const* number = boost::get<double>(&storage)) return *number;
         if (long long const* integer = boost::get<long long>(&storage)) {
             return static_cast<double>(*integer);
@@ -171,16 +165,16 @@ public:
     }
     /// Deliberate: every map and every array is true, empty ones included; a string when it is not
     /// empty, a number when it is not zero.
-    TARN_ENGINE_BASE_EXPORT bool asBool() const;
+    TARN_API bool asBool() const;
     /// The unsigned number, the signed one's bits, or the floating-point one towards zero and
     /// kept in range; else 0.
-    TARN_ENGINE_BASE_EXPORT unsigned long long asId() const;
+    TARN_API unsigned long long asId() const;
 
     /// The content in place, or null for every other kind. Lives until this is assigned to,
     /// moved from or destroyed.
-    TARN_ENGINE_BASE_EXPORT_INLINE Map const* ifMap() const { return content<Map>(); }
-    TARN_ENGINE_BASE_EXPORT_INLINE Array const* ifArray() const { return content<Array>(); }
-    TARN_ENGINE_BASE_EXPORT_INLINE std::string const* ifString() const {
+    TARN_API_INLINE Map const* ifMap() const { return content<Map>(); }
+    TARN_API_INLINE Array const* ifArray() const { return content<Array>(); }
+    TARN_API_INLINE std::string const* ifString() const {
         std::string* const* text = boost::get<std::string*>(&storage);
         return text == nullptr ? nullptr : *text;
     }
@@ -196,28 +190,26 @@ public:
 
     /// The number of elements of a map or an array, and whether it is 0; every other kind has none.
     /// Constant time.
-    TARN_ENGINE_BASE_EXPORT std::size_t size() const noexcept;
+    TARN_API std::size_t size() const noexcept;
     bool empty() const noexcept { return size() == 0; }
 
     /// The element of a map with this key, the element of an array at this position, or what a path
     /// of both leads to; null where there is none, and for data of another kind. An empty path
     /// leads to this itself. Lives as the content in place does. Copies nothing.
-    TARN_ENGINE_BASE_EXPORT Unstructured const* find(std::string const& key) const noexcept;
-    TARN_ENGINE_BASE_EXPORT Unstructured const* find(std::size_t position) const noexcept;
-    TARN_ENGINE_BASE_EXPORT Unstructured const* find(Steps path) const noexcept;
+    TARN_API Unstructured const* find(std::string const& key) const noexcept;
+    TARN_API Unstructured const* find(std::size_t position) const noexcept;
+    TARN_API Unstructured const* find(Steps path) const noexcept;
 
     /// What is at the end of the path, or `otherwise` where it leads nowhere or to data of another
     /// kind; `lookup`, where it is given, says which. A number is as in `isNumber`; an integer is a
     /// signed one, or a floating-point number without a fraction that fits; a truth is the integer
     /// 1 or 0.
-    TARN_ENGINE_BASE_EXPORT double numberAt(Steps path, double otherwise,
-                                            Lookup* lookup = nullptr) const noexcept;
-    TARN_ENGINE_BASE_EXPORT long long integerAt(Steps path, long long otherwise,
-                                                Lookup* lookup = nullptr) const noexcept;
-    TARN_ENGINE_BASE_EXPORT bool boolAt(Steps path, bool otherwise,
-                                        Lookup* lookup = nullptr) const noexcept;
-    TARN_ENGINE_BASE_EXPORT std::string stringAt(Steps path, std::string otherwise,
-                                                 Lookup* lookup = nullptr) const;
+    TARN_API double numberAt(Steps path, double otherwise, Lookup* lookup = nullptr) const noexcept;
+    TARN_API long long integerAt(Steps path, long long otherwise,
+                                 Lookup* lookup = nullptr) const noexcept;
+    TARN_API bool boolAt(Steps path, bool otherwise, Lookup* lookup = nullptr) const noexcept;
+    TARN_API std::string stringAt(Steps path, std::string otherwise,
+                                  Lookup* lookup = nullptr) const;
 
     /// A text for people, on one line, in the manner of JSON: `{"id": 7u, "size": [80.0, 50.5]}`.
     /// Kinds can be told apart: a floating-point number has a point, an exponent or is "nan" or
@@ -227,19 +219,18 @@ public:
     /// `maxDepth` levels of maps and arrays are shown; a deeper one is "{...}" or "[...]", unless
     /// it is empty. The text has at most `maxBytes` bytes: what would be longer ends in "..."
     /// there. The cost follows the text, not the tree; nothing recurses.
-    TARN_ENGINE_BASE_EXPORT std::string toText(std::size_t maxBytes = 4096,
-                                               std::size_t maxDepth = 16) const;
+    TARN_API std::string toText(std::size_t maxBytes = 4096, std::size_t maxDepth = 16) const;
 
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
     /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
     /// fills every component. Everything else is zero. Nothing is allocated.
-    TARN_ENGINE_BASE_EXPORT operator FloatVec2() const;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec3() const;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec4() const;
+    TARN_API operator FloatVec2() const;
+    TARN_API operator FloatVec3() const;
+    TARN_API operator FloatVec4() const;
 
     /// The same kind with equal content, deeply: 1, 1u and 1.0 are three different things.
-    TARN_ENGINE_BASE_EXPORT bool operator==(Unstructured const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(Unstructured const& other) const;
+    TARN_API bool operator==(Unstructured const& other) const;
+    TARN_API bool operator!=(Unstructured const& other) const;
     /// With what data is made from on the left side, as it may stand on the right.
     template <class Source, detail::EnableIfDataSource<Source> = 0>
     friend bool operator==(Source const& source, Unstructured const& data) {
@@ -252,7 +243,7 @@ public:
 
     /// A copy of `map` without its empty maps, arrays and strings. One level deep: what is kept is
     /// kept whole. Null and zero are not empty.
-    TARN_ENGINE_BASE_EXPORT static Map removeEmptyValues(Map const& map);
+    TARN_API static Map removeEmptyValues(Map const& map);
 
 private:
     // A map or array with the number of levels from it downwards. Content never changes once it
@@ -288,9 +279,9 @@ private:
     Unstructured const* findOfKind(Steps path, bool (*isKind)(Unstructured const&),
                                    Lookup* lookup) const noexcept;
     template <class T>
-    static Storage made(T&& content);
+    static Storage makeStorage(T&& content);
     template <class T>
-    static Storage copied(Node<T> const& node);
+    static Storage copyStorage(Node<T> const& node);
     static void copyDeep(Unstructured const& from, Unstructured& to);
     static bool equalDeep(Unstructured const& a, Unstructured const& b);
     Unstructured* lastElement() const;
@@ -298,18 +289,18 @@ private:
     void emptyDeep() noexcept;
     // Afterwards this is null. Whoever calls it has taken the content over.
     void forget() noexcept { ::new (static_cast<void*>(&storage)) Storage(nullptr); }
-    TARN_ENGINE_BASE_EXPORT Storage copiedContent() const;
-    TARN_ENGINE_BASE_EXPORT void destroyContent() noexcept;
+    TARN_API Storage copiedContent() const;
+    TARN_API void destroyContent() noexcept;
 
     Storage storage;
 };
 
 /// The name of a kind, for people: "null", "map", "array", "float", "integer", "unsigned integer"
 /// or "string"; "Unstructured::Type(77)" for what is no enumerator.
-TARN_ENGINE_BASE_EXPORT std::string to_string(Unstructured::Type kind);
+TARN_API std::string to_string(Unstructured::Type kind);
 
 /// Writes that name.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Unstructured::Type kind);
+TARN_API std::ostream& operator<<(std::ostream& stream, Unstructured::Type kind);
 
 }  // namespace tarn::engine
 

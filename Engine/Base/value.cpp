@@ -1,8 +1,9 @@
 #include <Engine/Base/value.h>
 
 #include <Engine/Base/detail/immortal.h>
-#include <Engine/Base/detail/radix_point.h>
+#include <Engine/Base/detail/number_text.h>
 #include <Engine/Base/detail/truncate.h>
+#include <Engine/Base/detail/unreachable.h>
 #include <Engine/Base/path.h>
 #include <Engine/Base/unstructured.h>
 
@@ -10,27 +11,20 @@
 #include <boost/variant/get.hpp>
 #include <boost/variant/static_visitor.hpp>
 
-#include <algorithm>
 #include <array>
 #include <cerrno>
-#include <cfenv>
-#include <cmath>
 #include <cstdint>
-#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <initializer_list>
-#include <iostream>
-#include <limits>
-#include <locale>
+#include <iterator>
+#include <ostream>
 #include <string_view>
 #include <utility>
 
 namespace tarn::engine {
 
 namespace {
-
-constexpr char kModule[] = "Engine/Base/value";
 
 // Known to those who search logs for it; kept wherever the check moves.
 constexpr int kResourceTypeLine = 161;
@@ -40,12 +34,6 @@ constexpr FloatMat4 FloatMat4Identity{{1, 0, 0, 0,  //
                                        0, 0, 1, 0,  //
                                        0, 0, 0, 1}};
 
-// What `indexLoopCasting` takes from an empty loop.
-Value const& nullValue() {
-    static detail::Immortal<Value> const null;
-    return null.value;
-}
-
 // The types and their names, at the enumerator's position.
 constexpr std::array<std::string_view, 14> kTypeNames{
     "float", "vec2",  "vec3",  "vec4", "mat4",   "boolean", "int",
@@ -53,8 +41,14 @@ constexpr std::array<std::string_view, 14> kTypeNames{
 static_assert(kTypeNames.size() == std::size_t(Type::Unstructured) + 1);
 
 // A set of types as bits; a byte that is no enumerator is in no set.
-constexpr unsigned kResourceTypes = 0x1380;
-constexpr unsigned kCopiedTypes = 0xBFF;
+constexpr unsigned setOf(std::initializer_list<Type> types) {
+    unsigned bits = 0;
+    for (Type const type : types) bits |= 1u << unsigned(type);
+    return bits;
+}
+constexpr unsigned kAllTypes = (1u << kTypeNames.size()) - 1;
+constexpr unsigned kResourceTypes = setOf({Type::Image, Type::Video, Type::Sound, Type::Model});
+constexpr unsigned kCopiedTypes = kAllTypes & ~setOf({Type::Path, Type::Model, Type::Unstructured});
 
 bool contains(unsigned types, Type type) {
     return std::size_t(type) < kTypeNames.size() && (types >> unsigned(type) & 1u) != 0;
@@ -226,130 +220,6 @@ struct AsUnstructured : boost::static_visitor<Unstructured> {
     Unstructured operator()(T const&) const = delete;
 };
 
-// The text that "%.f" gives for negative zero.
-std::string const& negativeZero() {
-    static detail::Immortal<std::string> const text([] {
-        char buffer[16];
-        std::snprintf(buffer, sizeof buffer, "%.f", -0.0);
-        return std::string(buffer);
-    }());
-    return text.value;
-}
-
-// Whether numbers are rounded to the nearest: in any other mode the two sums differ. The C library
-// asks the control word of the processor, which took a tenth of the time of a number's string.
-bool roundsToNearest() {
-    double const volatile tiny = 0x1p-60;
-    return 1.0 + tiny == 1.0 - tiny;
-}
-
-// Where numbers have no fraction and one decimal still fits into 64 bits.
-constexpr double kTwo52 = 4503599627370496.0;
-
-// The magnitude of `d` times `scale`, as an integer, rounded as the C library rounds. Exact: the
-// mantissa times the scale fits into 64 bits. For a `d` between -2^52 and 2^52 and a scale of at
-// most 100.
-std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
-    std::uint64_t bits = 0;
-    std::memcpy(&bits, &d, sizeof bits);
-    int const biased = static_cast<int>(bits >> 52 & 0x7ff);
-    std::uint64_t const fraction = bits & 0xfffffffffffff;
-    std::uint64_t const mantissa = biased == 0 ? fraction : fraction | std::uint64_t(1) << 52;
-    int const shift = 1075 - (biased == 0 ? 1 : biased);  // At least 1, for a number below 2^52.
-    std::uint64_t const product = mantissa * scale;       // Below 2^60.
-    // From 62 on, the product is less than a quarter of what it is shifted by.
-    std::uint64_t const whole = shift < 62 ? product >> shift : 0;
-    std::uint64_t const rest = shift < 62 ? product - (whole << shift) : product;
-    std::uint64_t const half = std::uint64_t(1) << (shift < 62 ? shift - 1 : 61);
-    [[maybe_unused]] bool const negative = bits >> 63 != 0;
-    if (rest == 0) return whole;
-    std::uint64_t const nearest = whole + (rest > half || (rest == half && whole % 2 != 0) ? 1 : 0);
-    if (roundsToNearest()) return nearest;
-    switch (std::fegetround()) {
-#if defined(FE_UPWARD)
-        case FE_UPWARD: return negative ? whole : whole + 1;
-#endif
-#if defined(FE_DOWNWARD)
-        case FE_DOWNWARD: return negative ? whole + 1 : whole;
-#endif
-#if defined(FE_TOWARDZERO)
-        case FE_TOWARDZERO: return whole;
-#endif
-        default: return nearest;
-    }
-}
-
-// A number's text from the end to the beginning.
-class Digits {
-public:
-    // `decimals` places behind `point`, of `multiple`, which is that many powers of ten too large.
-    // Those that are zero are left out where `trimmed`, and so is a point with nothing behind it.
-    Digits(std::uint64_t multiple, int decimals, char const* point, bool trimmed, bool negative) {
-        bool shown = !trimmed;
-        for (; decimals > 0; --decimals, multiple /= 10) {
-            shown = shown || multiple % 10 != 0;
-            if (shown) *--begin = static_cast<char>('0' + multiple % 10);
-        }
-        if (shown) {
-            std::size_t const length = std::strlen(point);
-            begin -= length;
-            std::memcpy(begin, point, length);
-        }
-        do {
-            *--begin = static_cast<char>('0' + multiple % 10);
-            multiple /= 10;
-        } while (multiple != 0);
-        if (negative) *--begin = '-';
-    }
-    // Until this is destroyed.
-    std::string_view text() const {
-        return {begin, static_cast<std::size_t>(std::end(buffer) - begin)};
-    }
-
-private:
-    char buffer[48] = {};  // A sign, 20 digits, a point of a few bytes, two decimals.
-    char* begin = buffer + sizeof buffer;
-};
-
-// That of `std::cout`'s locale. Most often it is the classic one, which is quickly seen.
-char decimalPoint() {
-    std::locale const locale = std::cout.getloc();
-    if (locale == std::locale::classic()) return '.';
-    return std::use_facet<std::numpunct<char>>(locale).decimal_point();
-}
-
-// Without the zeros that end it, and without a point with nothing behind it.
-std::string_view trimmed(std::string_view text, char point) {
-    if (std::size_t const position = text.find(point); position != std::string_view::npos) {
-        while (text.size() > position + 1 && text.back() == '0') text.remove_suffix(1);
-        if (text.size() == position + 1) text.remove_suffix(1);
-    }
-    return text == negativeZero() ? "0" : text;
-}
-
-// Appends the number as the C library formats it with "%.1f" from 1000.0 on and with "%.2f" below,
-// trimmed. What is no finite number is "nan" or "inf" behind its sign, on every platform.
-void appendNumber(std::string& text, double d) {
-    char const point = decimalPoint();
-    bool const isNegative = std::signbit(d);
-    if (std::abs(d) < kTwo52) {
-        detail::RadixPoint const radix;
-        bool const isUsual = point == '.' && radix.text[0] == '.' && radix.text[1] == '\0';
-        int const decimals = std::abs(d) >= 1000.0 ? 1 : 2;
-        std::uint64_t const multiple = roundedMultiple(d, decimals == 1 ? 10 : 100);
-        bool const hasSign = isNegative && (multiple != 0 || !isUsual);
-        Digits const digits(multiple, decimals, radix.text, isUsual, hasSign);
-        text += isUsual ? digits.text() : trimmed(digits.text(), point);
-    } else if (std::isfinite(d)) {
-        char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
-        std::snprintf(buffer, sizeof buffer, "%.1f", d);
-        text += trimmed(buffer, point);
-    } else {
-        char const* const name = std::isnan(d) ? "-nan" : "-inf";
-        text += trimmed(isNegative ? name : name + 1, point);
-    }
-}
-
 struct AppendText : boost::static_visitor<void> {
     explicit AppendText(std::string& appendedTo) : text(appendedTo) {}
 
@@ -357,13 +227,13 @@ struct AppendText : boost::static_visitor<void> {
         std::uint64_t const bits = static_cast<std::uint64_t>(i);
         integer(i < 0 ? 0 - bits : bits, i < 0);
     }
-    void operator()(double d) const { appendNumber(text, d); }
+    void operator()(double d) const { detail::appendNumber(text, d); }
     void operator()(FloatVec2 const& v) const { list({v.x, v.y}); }
     void operator()(FloatVec3 const& v) const { list({v.x, v.y, v.z}); }
     void operator()(FloatVec4 const& v) const { list({v.x, v.y, v.z, v.w}); }
     void operator()(std::shared_ptr<FloatMat4 const> const& m) const {
         for (std::size_t i = 0; m && i < std::size(m->elements); ++i) {
-            appendNumber(text, m->elements[i]);
+            detail::appendNumber(text, m->elements[i]);
             text += i % 4 == 3 ? " \n" : " ";
         }
     }
@@ -387,13 +257,13 @@ struct AppendText : boost::static_visitor<void> {
 
 private:
     void integer(std::uint64_t magnitude, bool isNegative) const {
-        text += Digits(magnitude, 0, "", true, isNegative).text();
+        detail::appendInteger(text, magnitude, isNegative);
     }
     void list(std::initializer_list<double> numbers) const {
         char const* separator = "";
         for (double const number : numbers) {
             text += separator;
-            appendNumber(text, number);
+            detail::appendNumber(text, number);
             separator = ", ";
         }
     }
@@ -509,7 +379,9 @@ std::shared_ptr<T const> shared(std::shared_ptr<T const> const* held) {
 }  // namespace
 
 std::string typeToString(Type type) {
-    if (std::size_t(type) >= kTypeNames.size()) assertionFailed("0", __func__, kModule, __LINE__);
+    if (std::size_t(type) >= kTypeNames.size()) {
+        TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/value");
+    }
     return std::string(kTypeNames[std::size_t(type)]);
 }
 
@@ -550,7 +422,7 @@ Value::Value(unsigned long long id, Type type) {
         case Type::String:
         case Type::Unstructured: break;
     }
-    assertionFailed("0", __func__, kModule, kResourceTypeLine);
+    TARN_ENGINE_BASE_UNREACHABLE_AT("Engine/Base/value", kResourceTypeLine);
 }
 
 Value Value::Image(unsigned long long id) { return Value(id, Type::Image); }
@@ -577,7 +449,7 @@ Value Value::defaultValue(Type type, unsigned char qualifier) {
         case Type::String: return std::string();
         case Type::Unstructured: return Unstructured::Undefined();
     }
-    assertionFailed("0", __func__, kModule, __LINE__);
+    TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/value");
 }
 
 Value::operator long long() const noexcept { return boost::apply_visitor(AsInteger(), storage); }
@@ -660,10 +532,10 @@ Value Value::asType(Type type) const {
         case Type::String: return operator std::string();
         case Type::Unstructured: return Value(Unstructured(*this));
     }
-    assertionFailed("0", __func__, kModule, __LINE__);
+    TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/value");
 }
 
-TARN_ENGINE_BASE_FLATTEN bool Value::contentEquals(Value const& other) const {
+TARN_FLATTEN bool Value::contentEquals(Value const& other) const {
     int const alternative = storage.which();
     if (other.storage.which() != alternative) return false;
     auto const same = [&](auto const* left) {
@@ -699,64 +571,6 @@ std::string to_string(Value const& value) {
     return text;
 }
 
-bool TypeInfo::operator==(TypeInfo const& other) const {
-    return type == other.type && subtype == other.subtype && min == other.min && max == other.max &&
-           extra == other.extra;
-}
-bool TypeInfo::operator!=(TypeInfo const& other) const { return !(*this == other); }
-
-std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural) {
-    switch (typeInfo.type) {
-        case Type::Float:
-        case Type::Int: return plural ? "Numbers" : "Number";
-        case Type::Vec2: return plural ? "Positions" : "Position";
-        case Type::Vec3: return plural ? "3D Points" : "Point 3D";
-        case Type::Vec4: return plural ? "Colors" : "Color";
-        case Type::Mat4: return plural ? "Matrices" : "Matrix";
-        case Type::Boolean:
-            if (typeInfo.subtype == 1) return plural ? "Pulses" : "Pulse";
-            return plural ? "Booleans" : "Boolean";
-        case Type::Image: return plural ? "Images" : "Image";
-        case Type::Video: return plural ? "Videos" : "Video";
-        case Type::Sound: return plural ? "Sounds" : "Sound";
-        case Type::Path: return plural ? "Paths" : "Path";
-        case Type::String: return plural ? "Strings" : "String";
-        case Type::Model: return plural ? "Models" : "Model";
-        case Type::Unstructured:
-            if (typeInfo.subtype == 1) return plural ? "Layers" : "Layer";
-            return "Unstructured";
-    }
-    assertionFailed("0", __func__, kModule, __LINE__);
-}
-
-// Deliberate: the value is copied, not moved from.
-Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
-    Value const& named = value;
-    return castValueToType(named, typeInfo);
-}
-
-void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long first,
-                      std::size_t count, Value const** results) noexcept {
-    for (std::size_t done = 0; done < count;) {
-        // Up to the end of the loop, or to where the index wraps around.
-        unsigned long long const index = first + done;
-        unsigned long long const left = std::numeric_limits<unsigned long long>::max() - index;
-        std::size_t const size = std::max<std::size_t>(loop.size(), 1);
-        std::size_t const start = static_cast<std::size_t>(index % size);
-        std::size_t length = std::min(count - done, size - start);
-        if (left < length) length = static_cast<std::size_t>(left) + 1;
-        for (std::size_t i = 0; i < length; ++i) {
-            results[done + i] = loop.empty() ? &detail::castNullValue(typeInfo)
-                                             : &castValueToType(loop[start + i], typeInfo);
-        }
-        done += length;
-    }
-}
-
-Value const& detail::castNullValue(TypeInfo const& typeInfo) noexcept {
-    return castValueToType(nullValue(), typeInfo);
-}
-
 FloatMat4 const& detail::neutralMatrix() noexcept { return FloatMat4Identity; }
 Path const& detail::neutralPath() noexcept {
     static Immortal<Path> const path;
@@ -771,11 +585,6 @@ std::string const& detail::neutralString() noexcept {
     return text.value;
 }
 
-Loop const& nullLoop() {
-    static detail::Immortal<Loop> const loop;
-    return loop.value;
-}
-
 std::ostream& operator<<(std::ostream& stream, Value const& value) {
     return stream << to_string(value);
 }
@@ -783,10 +592,6 @@ std::ostream& operator<<(std::ostream& stream, Value const& value) {
 std::ostream& operator<<(std::ostream& stream, Type type) {
     if (std::size_t(type) >= kTypeNames.size()) return stream << "Type(" << int(type) << ")";
     return stream << kTypeNames[std::size_t(type)];
-}
-
-std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo) {
-    return stream << "[type: " << typeToString(typeInfo.type) << "]";
 }
 
 }  // namespace tarn::engine

@@ -9,6 +9,7 @@
 #define TARN_ENGINE_BASE_VALUE_H
 
 #include <Engine/Base/comparison.h>
+#include <Engine/Base/conversion_traits.h>
 #include <Engine/Base/export.h>
 #include <Engine/Base/optional.h>
 
@@ -108,62 +109,210 @@ struct FloatMat4 {
 };
 static_assert(sizeof(FloatMat4) == 128, "sixteen doubles and nothing else");
 
-namespace detail {
-
-template <class T, class... Candidates>
-constexpr bool isOneOf = (std::is_same_v<T, Candidates> || ...);
-
-template <class T>
-constexpr bool isSignedInteger = isOneOf<T, signed char, short, int, long, long long>;
-
-template <class T>
-constexpr bool isUnsignedInteger =
-    isOneOf<T, unsigned char, unsigned short, unsigned int, unsigned long, unsigned long long>;
-
-template <class T>
-constexpr bool isCharacter = std::is_integral_v<T> && !isSignedInteger<T> &&
-                             !isUnsignedInteger<T> && !std::is_same_v<T, bool>;
-
-/// The other spelling of a 64-bit integer: `long` where `std::int64_t` is one, for example.
-template <class T>
-constexpr bool isWideInteger = isOneOf<T, long, unsigned long> && sizeof(long) == sizeof(long long);
-
-/// What a `Value` refuses to be read as, since a promotion of its truth value would answer.
-template <class T>
-constexpr bool isNarrowNumber = std::is_arithmetic_v<T> && !isWideInteger<T> &&
-                                !isOneOf<T, bool, double, long long, unsigned long long>;
-
-/// An object that becomes a pointer, as a lambda without captures becomes one to a function.
-template <class T, class = void>
-constexpr bool becomesPointer = false;
-template <class T>
-constexpr bool
-    becomesPointer<T, std::enable_if_t<std::is_class_v<T> &&
-                                       std::is_pointer_v<decltype(+std::declval<T const&>())>>> =
-        true;
-
-/// What a `Value` refuses to be made from, since its truth value would be stored.
-template <class T>
-constexpr bool isNoValueSource =
-    isUnsignedInteger<T> || isCharacter<T> || std::is_same_v<T, long double> ||
-    std::is_member_pointer_v<T> ||
-    (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>) || becomesPointer<T>;
-
-}  // namespace detail
-
 /// The name that documents store, "float" to "unstructured". An enumerator out of range is an
 /// assertion failure.
-TARN_ENGINE_BASE_EXPORT std::string typeToString(Type type);
+TARN_API std::string typeToString(Type type);
 
 /// The inverse of `typeToString`, byte by byte; empty for any other text.
-TARN_ENGINE_BASE_EXPORT Optional<Type> stringToType(std::string const& name);
+TARN_API Optional<Type> stringToType(std::string const& name);
 
 /// True for images, videos, sounds and models; false for any byte that is no enumerator.
-TARN_ENGINE_BASE_EXPORT bool typeIsResource(Type type);
+TARN_API bool typeIsResource(Type type);
 
 /// Whether the value that flowed along a deleted connection is copied across to the input: true
 /// but for paths, models and unstructured data; false for any byte that is no enumerator.
-TARN_ENGINE_BASE_EXPORT bool typeShouldCopyAcrossDeletedConnections(Type type);
+TARN_API bool typeShouldCopyAcrossDeletedConnections(Type type);
+
+/// One value of one of the fourteen types. Numbers, vectors, truth values and identifiers are held
+/// inline; a matrix, a path, a tree or a string is allocated once, never changed afterwards, and
+/// shared by every copy. A copy costs at most one reference count and never fails.
+///
+/// Every value reads as every type, without failing: a reading that makes no sense is zero, false,
+/// the identity matrix or the empty path. A value that was moved from, or made from a null pointer,
+/// may hold a null payload; it reads as neutral and equals only another null of its alternative.
+///
+/// Distinct values may be used on distinct threads, copies of one value included.
+class Value {
+public:
+    /// A resource by its number; 0 is no resource. Four types, so that an image is never a video.
+    template <Type resource>
+    struct ResourceID {
+        /// The resource's number; 0 is none.
+        unsigned long long id = 0;
+
+        /// The same kind and the same number.
+        friend constexpr bool operator==(ResourceID a, ResourceID b) { return a.id == b.id; }
+        friend constexpr bool operator!=(ResourceID a, ResourceID b) { return a.id != b.id; }
+    };
+    /// One for each kind of resource.
+    using ImageID = ResourceID<Type::Image>;
+    using VideoID = ResourceID<Type::Video>;
+    using SoundID = ResourceID<Type::Sound>;
+    using ModelID = ResourceID<Type::Model>;
+
+    /// The double 0.0.
+    TARN_API_INLINE Value() noexcept : storage(0.0) {}
+    TARN_API_INLINE Value(double number) noexcept : storage(number) {}
+    TARN_API_INLINE Value(long long integer) noexcept : storage(integer) {}
+    /// Every other signed integer type; `char` is not one.
+    template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
+    Value(Integer integer) noexcept : Value(static_cast<long long>(integer)) {}
+    TARN_API_INLINE Value(bool truth) noexcept : storage(truth) {}
+    TARN_API_INLINE Value(FloatVec2 vector) noexcept : storage(vector) {}
+    TARN_API_INLINE Value(FloatVec3 vector) noexcept : storage(vector) {}
+    TARN_API_INLINE Value(FloatVec4 vector) noexcept : storage(vector) {}
+    TARN_API Value(FloatMat4 const& matrix);
+    /// The bytes up to the terminating zero; a null pointer is the empty string.
+    TARN_API Value(char const* text);
+    TARN_API Value(std::string text);
+    TARN_API Value(Path path);
+    /// Shares the path; nothing is copied.
+    TARN_API Value(std::shared_ptr<Path const> path) noexcept;
+    TARN_API Value(Unstructured tree);
+    /// Shares the data; nothing is copied. An aliasing pointer makes an element of a large document
+    /// a value: `std::shared_ptr<Unstructured const>(document, &element)`. The whole lives as long.
+    TARN_API Value(std::shared_ptr<Unstructured const> tree) noexcept;
+    /// The resource `id`. A `type` that is no resource is an assertion failure.
+    TARN_API Value(unsigned long long id, Type type);
+
+    /// An unsigned number needs its `Type`; a character, a pointer or null would be a truth value.
+    template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
+    Value(Source) = delete;
+    Value(std::nullptr_t) = delete;
+
+    /// Shares the payload of `other`, or takes it over. Neither allocates.
+    Value(Value const& other) noexcept = default;
+    Value(Value&& other) noexcept = default;
+    Value& operator=(Value const& other) noexcept = default;
+    Value& operator=(Value&& other) noexcept = default;
+    ~Value() = default;
+
+    /// As the constructor of the same type.
+    TARN_API static Value Image(unsigned long long id);
+    TARN_API static Value Video(unsigned long long id);
+    TARN_API static Value Sound(unsigned long long id);
+    TARN_API static Value Model(unsigned long long id);
+
+    /// What a fresh port of `type` starts with: zero, false, the identity matrix, identifier 0, an
+    /// empty path or string, null data. `qualifier` 4 makes a `Vec4` start as (0, 0, 0, 1), an
+    /// opaque black, and changes nothing else. An enumerator out of range is an assertion failure.
+    TARN_API static Value defaultValue(Type type);
+    TARN_API static Value defaultValue(Type type, unsigned char qualifier);
+
+    /// The type of what the value holds. Constant time, a few instructions.
+    TARN_API_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
+
+    /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
+    /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
+    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
+    /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
+    /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
+    /// integer towards zero, kept in range, and 0 for a NaN.
+    TARN_API operator long long() const noexcept;
+    TARN_API_INLINE TARN_FLATTEN operator double() const noexcept {
+        if (TARN_LIKELY(storage.which() == kFloat)) {
+            return *boost::get<double>(&storage);
+        }
+        return readDouble();
+    }
+    TARN_API operator bool() const noexcept;
+    /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
+    TARN_API operator unsigned long long() const noexcept;
+    /// As `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
+    template <class Integer, std::enable_if_t<detail::isWideInteger<Integer>, int> = 0>
+    operator Integer() const noexcept {
+        using Reading =
+            std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
+        return static_cast<Integer>(operator Reading());
+    }
+    /// `int(value)` would be a promoted truth value: read a `long long` and narrow that.
+    template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
+    operator Narrow() const = delete;
+
+    /// Would be the element of the array at the value's integer.
+    template <class T>
+    void operator[](T const*) const = delete;
+
+    /// Vector readings, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would fill the
+    /// record's first number and nothing else. None allocates. A number or truth value fills every
+    /// component, a shorter vector is filled up with zeros and a longer one cut; data reads as
+    /// `Unstructured` says; everything else is zero.
+    TARN_API operator FloatVec2() const noexcept;
+    TARN_API operator FloatVec3() const noexcept;
+    TARN_API operator FloatVec4() const noexcept;
+    /// The matrix held, else the identity.
+    TARN_API operator FloatMat4() const noexcept;
+    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing. Its callers
+    /// include path.h, as those of `asUnstructured` include unstructured.h.
+    TARN_API operator Path() const;
+    /// As `to_string`, but "??" for data that is no string. Made, not assigned: `s = value` does
+    /// not compile, since a string is assigned a character too; `s = std::string(value)` does.
+    TARN_API operator std::string() const;
+    /// The data of this value: numbers, strings and trees as they are, a truth value as the integer
+    /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
+    TARN_API Unstructured asUnstructured() const;
+
+    /// The payload inside the value, or null where the value holds another alternative or a null
+    /// payload. Lives until the value is assigned to or destroyed. Copies nothing.
+    TARN_API FloatMat4 const* asFloatMat4() const noexcept;
+    TARN_API Path const* ifPath() const noexcept;
+    TARN_API std::string const* ifString() const noexcept;
+    TARN_API Unstructured const* ifUnstructured() const noexcept;
+
+    /// The payload, shared: the pointer that every copy of the value holds, or null as above. Costs
+    /// one reference count, and keeps the payload for as long as it is held.
+    TARN_API std::shared_ptr<FloatMat4 const> sharedFloatMat4() const noexcept;
+    TARN_API std::shared_ptr<Path const> sharedPath() const noexcept;
+    TARN_API std::shared_ptr<std::string const> sharedString() const noexcept;
+    TARN_API std::shared_ptr<Unstructured const> sharedUnstructured() const noexcept;
+
+    /// What the visitor gives for what the value holds, as a reference to const: a `long long`, a
+    /// `double`, a vector, a `FloatMat4`, a `bool`, a `ResourceID`, a `Path`, an `Unstructured` or
+    /// a `std::string`. A null payload is the identity matrix, the empty path, null data or the
+    /// empty string. Every call has to have the same type of result.
+    template <class Visitor>
+    decltype(auto) visit(Visitor&& visitor) const;
+
+    /// A value of exactly `type`, made from the matching reading with a payload of its own, even
+    /// when this value has that type already. An enumerator out of range is an assertion failure.
+    TARN_API Value asType(Type type) const;
+
+    /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
+    /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
+    TARN_API_INLINE TARN_FLATTEN bool operator==(Value const& other) const {
+        if (storage.which() != other.storage.which()) return false;
+        if (storage.which() != kFloat) return contentEquals(other);
+        return detail::equalNumbers(*boost::get<double>(&storage),
+                                    *boost::get<double>(&other.storage));
+    }
+    TARN_API_INLINE bool operator!=(Value const& other) const { return !(*this == other); }
+
+private:
+    friend std::string to_string(Value const& value);
+    friend void appendText(std::string& text, Value const& value);
+    friend struct std::hash<Value>;
+
+    using Storage =
+        boost::variant<long long, double, FloatVec2, FloatVec3, FloatVec4,
+                       std::shared_ptr<FloatMat4 const>, bool, ImageID, VideoID, SoundID, ModelID,
+                       std::shared_ptr<Path const>, std::shared_ptr<Unstructured const>,
+                       std::shared_ptr<std::string const>>;
+    // By alternative: the only place where the two numberings meet.
+    static constexpr Type kTypes[] = {Type::Int,          Type::Float, Type::Vec2,    Type::Vec3,
+                                      Type::Vec4,         Type::Mat4,  Type::Boolean, Type::Image,
+                                      Type::Video,        Type::Sound, Type::Model,   Type::Path,
+                                      Type::Unstructured, Type::String};
+
+    // Most values are numbers: they are looked for first.
+    static constexpr int kFloat = 1;
+    static_assert(kTypes[kFloat] == Type::Float);
+
+    TARN_API double readDouble() const noexcept;
+    // For values of the same alternative.
+    TARN_API bool contentEquals(Value const& other) const;
+
+    Storage storage;
+};
 
 /// The tag of a native type. Other types than these do not compile.
 template <class T>
@@ -212,200 +361,6 @@ template <>
 constexpr Type TarnType<Unstructured>() {
     return Type::Unstructured;
 }
-
-/// One value of one of the fourteen types. Numbers, vectors, truth values and identifiers are held
-/// inline; a matrix, a path, a tree or a string is allocated once, never changed afterwards, and
-/// shared by every copy. A copy costs at most one reference count and never fails.
-///
-/// Every value reads as every type, without failing: a reading that makes no sense is zero, false,
-/// the identity matrix or the empty path. A value that was moved from, or made from a null pointer,
-/// may hold a null payload; it reads as neutral and equals only another null of its alternative.
-///
-/// Distinct values may be used on distinct threads, copies of one value included.
-class Value {
-public:
-    /// A resource by its number; 0 is no resource. Four types, so that an image is never a video.
-    template <Type resource>
-    struct ResourceID {
-        /// The resource's number; 0 is none.
-        unsigned long long id = 0;
-
-        /// The same kind and the same number.
-        friend constexpr bool operator==(ResourceID a, ResourceID b) { return a.id == b.id; }
-        friend constexpr bool operator!=(ResourceID a, ResourceID b) { return a.id != b.id; }
-    };
-    /// One for each kind of resource.
-    using ImageID = ResourceID<Type::Image>;
-    using VideoID = ResourceID<Type::Video>;
-    using SoundID = ResourceID<Type::Sound>;
-    using ModelID = ResourceID<Type::Model>;
-
-    /// The double 0.0.
-    TARN_ENGINE_BASE_EXPORT_INLINE Value() noexcept : storage(0.0) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(double number) noexcept : storage(number) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(long long integer) noexcept : storage(integer) {}
-    /// Every other signed integer type; `char` is not one.
-    template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
-    Value(Integer integer) noexcept : Value(static_cast<long long>(integer)) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(bool truth) noexcept : storage(truth) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec2 vector) noexcept : storage(vector) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec3 vector) noexcept : storage(vector) {}
-    TARN_ENGINE_BASE_EXPORT_INLINE Value(FloatVec4 vector) noexcept : storage(vector) {}
-    TARN_ENGINE_BASE_EXPORT Value(FloatMat4 const& matrix);
-    /// The bytes up to the terminating zero; a null pointer is the empty string.
-    TARN_ENGINE_BASE_EXPORT Value(char const* text);
-    TARN_ENGINE_BASE_EXPORT Value(std::string text);
-    TARN_ENGINE_BASE_EXPORT Value(Path path);
-    /// Shares the path; nothing is copied.
-    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Path const> path) noexcept;
-    TARN_ENGINE_BASE_EXPORT Value(Unstructured tree);
-    /// Shares the data; nothing is copied. An aliasing pointer makes an element of a large document
-    /// a value: `std::shared_ptr<Unstructured const>(document, &element)`. The whole lives as long.
-    TARN_ENGINE_BASE_EXPORT Value(std::shared_ptr<Unstructured const> tree) noexcept;
-    /// The resource `id`. A `type` that is no resource is an assertion failure.
-    TARN_ENGINE_BASE_EXPORT Value(unsigned long long id, Type type);
-
-    /// An unsigned number needs its `Type`; a character, a pointer or null would be a truth value.
-    template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
-    Value(Source) = delete;
-    Value(std::nullptr_t) = delete;
-
-    /// Shares the payload of `other`, or takes it over. Neither allocates.
-    Value(Value const& other) noexcept = default;
-    Value(Value&& other) noexcept = default;
-    Value& operator=(Value const& other) noexcept = default;
-    Value& operator=(Value&& other) noexcept = default;
-    ~Value() = default;
-
-    /// As the constructor of the same type.
-    TARN_ENGINE_BASE_EXPORT static Value Image(unsigned long long id);
-    TARN_ENGINE_BASE_EXPORT static Value Video(unsigned long long id);
-    TARN_ENGINE_BASE_EXPORT static Value Sound(unsigned long long id);
-    TARN_ENGINE_BASE_EXPORT static Value Model(unsigned long long id);
-
-    /// What a fresh port of `type` starts with: zero, false, the identity matrix, identifier 0, an
-    /// empty path or string, null data. `qualifier` 4 makes a `Vec4` start as (0, 0, 0, 1), an
-    /// opaque black, and changes nothing else. An enumerator out of range is an assertion failure.
-    TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type);
-    TARN_ENGINE_BASE_EXPORT static Value defaultValue(Type type, unsigned char qualifier);
-
-    /// The type of what the value holds. Constant time, a few instructions.
-    TARN_ENGINE_BASE_EXPORT_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
-
-    /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
-    /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
-    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
-    /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
-    /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
-    /// integer towards zero, kept in range, and 0 for a NaN.
-    TARN_ENGINE_BASE_EXPORT operator long long() const noexcept;
-    TARN_ENGINE_BASE_EXPORT_INLINE TARN_ENGINE_BASE_FLATTEN operator double() const noexcept {
-        if (TARN_ENGINE_BASE_LIKELY(storage.which() == kFloat)) {
-            return *boost::get<double>(&storage);
-        }
-        return readDouble();
-    }
-    TARN_ENGINE_BASE_EXPORT operator bool() const noexcept;
-    /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
-    TARN_ENGINE_BASE_EXPORT operator unsigned long long() const noexcept;
-    /// As `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
-    template <class Integer, std::enable_if_t<detail::isWideInteger<Integer>, int> = 0>
-    operator Integer() const noexcept {
-        using Reading =
-            std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
-        return static_cast<Integer>(operator Reading());
-    }
-    /// `int(value)` would be a promoted truth value: read a `long long` and narrow that.
-    template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
-    operator Narrow() const = delete;
-
-    /// Would be the element of the array at the value's integer.
-    template <class T>
-    void operator[](T const*) const = delete;
-
-    /// Vector readings, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would fill the
-    /// record's first number and nothing else. None allocates. A number or truth value fills every
-    /// component, a shorter vector is filled up with zeros and a longer one cut; data reads as
-    /// `Unstructured` says; everything else is zero.
-    TARN_ENGINE_BASE_EXPORT operator FloatVec2() const noexcept;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec3() const noexcept;
-    TARN_ENGINE_BASE_EXPORT operator FloatVec4() const noexcept;
-    /// The matrix held, else the identity.
-    TARN_ENGINE_BASE_EXPORT operator FloatMat4() const noexcept;
-    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing. Its callers
-    /// include path.h, as those of `asUnstructured` include unstructured.h.
-    TARN_ENGINE_BASE_EXPORT operator Path() const;
-    /// As `to_string`, but "??" for data that is no string. Made, not assigned: `s = value` does
-    /// not compile, since a string is assigned a character too; `s = std::string(value)` does.
-    TARN_ENGINE_BASE_EXPORT operator std::string() const;
-    /// The data of this value: numbers, strings and trees as they are, a truth value as the integer
-    /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
-    TARN_ENGINE_BASE_EXPORT Unstructured asUnstructured() const;
-
-    /// The payload inside the value, or null where the value holds another alternative or a null
-    /// payload. Lives until the value is assigned to or destroyed. Copies nothing.
-    TARN_ENGINE_BASE_EXPORT FloatMat4 const* asFloatMat4() const noexcept;
-    TARN_ENGINE_BASE_EXPORT Path const* ifPath() const noexcept;
-    TARN_ENGINE_BASE_EXPORT std::string const* ifString() const noexcept;
-    TARN_ENGINE_BASE_EXPORT Unstructured const* ifUnstructured() const noexcept;
-
-    /// The payload, shared: the pointer that every copy of the value holds, or null as above. Costs
-    /// one reference count, and keeps the payload for as long as it is held.
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<FloatMat4 const> sharedFloatMat4() const noexcept;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Path const> sharedPath() const noexcept;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<std::string const> sharedString() const noexcept;
-    TARN_ENGINE_BASE_EXPORT std::shared_ptr<Unstructured const> sharedUnstructured() const noexcept;
-
-    /// What the visitor gives for what the value holds, as a reference to const: a `long long`, a
-    /// `double`, a vector, a `FloatMat4`, a `bool`, a `ResourceID`, a `Path`, an `Unstructured` or
-    /// a `std::string`. A null payload is the identity matrix, the empty path, null data or the
-    /// empty string. Every call has to have the same type of result.
-    template <class Visitor>
-    decltype(auto) visit(Visitor&& visitor) const;
-
-    /// A value of exactly `type`, made from the matching reading with a payload of its own, even
-    /// when this value has that type already. An enumerator out of range is an assertion failure.
-    TARN_ENGINE_BASE_EXPORT Value asType(Type type) const;
-
-    /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
-    /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
-    TARN_ENGINE_BASE_EXPORT_INLINE TARN_ENGINE_BASE_FLATTEN bool
-    operator==(Value const& other) const {
-        if (storage.which() != other.storage.which()) return false;
-        if (storage.which() != kFloat) return contentEquals(other);
-        return detail::equalNumbers(*boost::get<double>(&storage),
-                                    *boost::get<double>(&other.storage));
-    }
-    TARN_ENGINE_BASE_EXPORT_INLINE bool operator!=(Value const& other) const {
-        return !(*this == other);
-    }
-
-private:
-    friend std::string to_string(Value const& value);
-    friend void appendText(std::string& text, Value const& value);
-    friend struct std::hash<Value>;
-
-    using Storage =
-        boost::variant<long long, double, FloatVec2, FloatVec3, FloatVec4,
-                       std::shared_ptr<FloatMat4 const>, bool, ImageID, VideoID, SoundID, ModelID,
-                       std::shared_ptr<Path const>, std::shared_ptr<Unstructured const>,
-                       std::shared_ptr<std::string const>>;
-    // By alternative: the only place where the two numberings meet.
-    static constexpr Type kTypes[] = {Type::Int,          Type::Float, Type::Vec2,    Type::Vec3,
-                                      Type::Vec4,         Type::Mat4,  Type::Boolean, Type::Image,
-                                      Type::Video,        Type::Sound, Type::Model,   Type::Path,
-                                      Type::Unstructured, Type::String};
-
-    // Most values are numbers: they are looked for first.
-    static constexpr int kFloat = 1;
-    static_assert(kTypes[kFloat] == Type::Float);
-
-    TARN_ENGINE_BASE_EXPORT double readDouble() const noexcept;
-    // For values of the same alternative.
-    TARN_ENGINE_BASE_EXPORT bool contentEquals(Value const& other) const;
-
-    Storage storage;
-};
 static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they grow");
 
 }  // namespace tarn::engine
@@ -414,7 +369,7 @@ static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they
 /// first level counts. The number may be another one in each process, version and platform.
 template <>
 struct std::hash<tarn::engine::Value> {
-    TARN_ENGINE_BASE_EXPORT std::size_t operator()(tarn::engine::Value const& value) const noexcept;
+    TARN_API std::size_t operator()(tarn::engine::Value const& value) const noexcept;
 };
 
 namespace tarn::engine {
@@ -426,12 +381,12 @@ namespace tarn::engine {
 /// by ", ", and a matrix is four lines of four. Truth is "1" or "0", an identifier its number, a
 /// path "Path" or "Empty Path", data "unstructured" unless it is a string. The decimal point that
 /// is trimmed is that of `std::cout`'s locale at the call; nobody may change that locale meanwhile.
-TARN_ENGINE_BASE_EXPORT std::string to_string(Value const& value);
+TARN_API std::string to_string(Value const& value);
 
 /// Appends `to_string(value)` to `text`. Numbers and vectors of them need no string of their own:
 /// where `text` has room, nothing is allocated. A failing allocation leaves `text` as it was, or
 /// with the first components of a vector or a matrix.
-TARN_ENGINE_BASE_EXPORT void appendText(std::string& text, Value const& value);
+TARN_API void appendText(std::string& text, Value const& value);
 
 namespace detail {
 
@@ -494,47 +449,46 @@ struct TypeInfo {
     Optional<Value> extra = {};
 
     /// Field by field.
-    TARN_ENGINE_BASE_EXPORT bool operator==(TypeInfo const& other) const;
-    TARN_ENGINE_BASE_EXPORT bool operator!=(TypeInfo const& other) const;
+    TARN_API bool operator==(TypeInfo const& other) const;
+    TARN_API bool operator!=(TypeInfo const& other) const;
 };
 
 /// The name of a port of this kind, such as "Number" or, where `plural`, "Numbers". Only `type` and
 /// `subtype` matter. An enumerator out of range is an assertion failure.
-TARN_ENGINE_BASE_EXPORT std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural);
+TARN_API std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural);
 
 /// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
 /// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
 /// refers into one of the arguments and lives no longer than both.
-TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
-castValueToType(Value const& value, TypeInfo const& typeInfo) noexcept;
+TARN_API_INLINE inline Value const& castValueToType(Value const& value,
+                                                    TypeInfo const& typeInfo) noexcept;
 
 /// The same decision, as a copy of the value chosen.
-TARN_ENGINE_BASE_EXPORT Value castValueToType(Value&& value, TypeInfo const& typeInfo);
+TARN_API Value castValueToType(Value&& value, TypeInfo const& typeInfo);
 
 /// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as
 /// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
 /// a value that lives to program exit.
-TARN_ENGINE_BASE_EXPORT_INLINE inline Value const&
-indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long index) noexcept;
+TARN_API_INLINE inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
+                                                     unsigned long long index) noexcept;
 
 /// The same for a range of indices: `results[i]` becomes the address of `indexLoopCasting(loop,
 /// typeInfo, first + i)`, for each `i` below `count`; the sum wraps around at 2^64. One division
 /// each time that the loop begins again.
-TARN_ENGINE_BASE_EXPORT void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
-                                              unsigned long long first, std::size_t count,
-                                              Value const** results) noexcept;
+TARN_API void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long first,
+                               std::size_t count, Value const** results) noexcept;
 
 /// The empty loop that everyone shares; lives to program exit.
-TARN_ENGINE_BASE_EXPORT Loop const& nullLoop();
+TARN_API Loop const& nullLoop();
 
 /// Writes `to_string(value)`.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Value const& value);
+TARN_API std::ostream& operator<<(std::ostream& stream, Value const& value);
 
 /// Writes the name of the type, "float" to "unstructured"; "Type(77)" for what is no enumerator.
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, Type type);
+TARN_API std::ostream& operator<<(std::ostream& stream, Type type);
 
 /// Writes the type alone: "[type: float]".
-TARN_ENGINE_BASE_EXPORT std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
+TARN_API std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
 
 // Implementation
 
@@ -544,13 +498,13 @@ namespace detail {
 Value const& clamped(Value const& value, TypeInfo const& typeInfo) noexcept;
 
 // What an empty loop counts as, cast to the port.
-TARN_ENGINE_BASE_EXPORT Value const& castNullValue(TypeInfo const& typeInfo) noexcept;
+TARN_API Value const& castNullValue(TypeInfo const& typeInfo) noexcept;
 
 // What a visitor is shown in the place of a null payload.
-TARN_ENGINE_BASE_EXPORT FloatMat4 const& neutralMatrix() noexcept;
-TARN_ENGINE_BASE_EXPORT Path const& neutralPath() noexcept;
-TARN_ENGINE_BASE_EXPORT Unstructured const& neutralData() noexcept;
-TARN_ENGINE_BASE_EXPORT std::string const& neutralString() noexcept;
+TARN_API FloatMat4 const& neutralMatrix() noexcept;
+TARN_API Path const& neutralPath() noexcept;
+TARN_API Unstructured const& neutralData() noexcept;
+TARN_API std::string const& neutralString() noexcept;
 
 }  // namespace detail
 
@@ -579,8 +533,8 @@ decltype(auto) Value::visit(Visitor&& visitor) const {
     return show(ifString() ? *ifString() : detail::neutralString());
 }
 
-TARN_ENGINE_BASE_FLATTEN inline Value const& detail::clamped(Value const& value,
-                                                             TypeInfo const& typeInfo) noexcept {
+TARN_FLATTEN inline Value const& detail::clamped(Value const& value,
+                                                 TypeInfo const& typeInfo) noexcept {
     double const number = value;
     if (typeInfo.min && detail::lessNumber(number, double(*typeInfo.min))) return *typeInfo.min;
     if (typeInfo.max && detail::lessNumber(double(*typeInfo.max), number)) return *typeInfo.max;

@@ -34,8 +34,7 @@ struct DocumentError {
 
 /// Writes "line 3, column 9: /root/id: the message", without what is missing; control characters of
 /// the pointer as escapes.
-TARN_ENGINE_DOCUMENT_EXPORT std::ostream& operator<<(std::ostream& stream,
-                                                     DocumentError const& error);
+TARN_DOCUMENT_API std::ostream& operator<<(std::ostream& stream, DocumentError const& error);
 
 /// What a document has beside its graph, and what reading it changed.
 struct DocumentInfo {
@@ -60,7 +59,7 @@ struct DocumentInfo {
     std::vector<std::string> notes = {};
 
     /// The counts in one line, "2 nodes renumbered, 1 link left out"; empty where all are 0.
-    TARN_ENGINE_DOCUMENT_EXPORT std::string summary() const;
+    TARN_DOCUMENT_API std::string summary() const;
 };
 
 /// The graph of a document: of our own form, which docs/documents.md describes, or of a node graph
@@ -76,37 +75,35 @@ struct DocumentInfo {
 /// Patches and model layers nest 10,000 levels at most, groups of a node graph 1,000, data as deep
 /// as memory allows. Linear in a document of our own form, in a node graph and its copies of shared
 /// definitions. Throws where memory fails, and nothing else.
-TARN_ENGINE_DOCUMENT_EXPORT Optional<Patch>
+TARN_DOCUMENT_API Optional<Patch>
 readDocument(std::string_view text, DocumentError* error = nullptr, DocumentInfo* info = nullptr);
 
 /// The document of our own form with this graph: UTF-8, the same bytes for graphs that are equal to
 /// the last bit, a line for each record. Every graph of up to 10,000 levels can be written and read
 /// back, whatever it holds; a frame rate that is not above 0 and
 /// finite is left out. Linear; 8 MiB of stack are enough for 10,000 levels.
-TARN_ENGINE_DOCUMENT_EXPORT std::string writeDocument(Patch const& root,
-                                                      double framesPerSecond = 60.0);
+TARN_DOCUMENT_API std::string writeDocument(Patch const& root, double framesPerSecond = 60.0);
 
 /// The same from a file.
-TARN_ENGINE_DOCUMENT_EXPORT Optional<Patch> loadDocument(std::string const& fileName,
-                                                         DocumentError* error = nullptr,
-                                                         DocumentInfo* info = nullptr);
+TARN_DOCUMENT_API Optional<Patch> loadDocument(std::string const& fileName,
+                                               DocumentError* error = nullptr,
+                                               DocumentInfo* info = nullptr);
 
 /// Writes the document into a file, as `replaceFile` does.
-TARN_ENGINE_DOCUMENT_EXPORT bool saveDocument(std::string const& fileName, Patch const& root,
-                                              double framesPerSecond = 60.0,
-                                              DocumentError* error = nullptr);
+TARN_DOCUMENT_API bool saveDocument(std::string const& fileName, Patch const& root,
+                                    double framesPerSecond = 60.0, DocumentError* error = nullptr);
 
 /// Replaces the content of a file in one step, so that whoever reads it finds the old content or
 /// the new one whole: it is written beside the file, flushed to the disk and renamed. The file
 /// keeps its permissions, and where it is a symbolic link, that stays one. False where this fails,
 /// for example on a full disk: then the file is as it was, and `*error`, where given, says why.
-TARN_ENGINE_DOCUMENT_EXPORT bool replaceFile(std::string const& fileName, std::string_view content,
-                                             DocumentError* error = nullptr);
+TARN_DOCUMENT_API bool replaceFile(std::string const& fileName, std::string_view content,
+                                   DocumentError* error = nullptr);
 
 /// The names that documents have for built-in kinds, "unknown" to "text". Empty for other numbers,
 /// which documents write as such, and for other names.
-TARN_ENGINE_DOCUMENT_EXPORT std::string kindToString(unsigned long long builtin);
-TARN_ENGINE_DOCUMENT_EXPORT Optional<unsigned long long> stringToKind(std::string const& name);
+TARN_DOCUMENT_API std::string kindToString(unsigned long long builtin);
+TARN_DOCUMENT_API Optional<unsigned long long> stringToKind(std::string const& name);
 
 }  // namespace tarn::engine
 

@@ -4,6 +4,7 @@
 #define TARN_TESTS_SUPPORT_GRAPHS_H
 
 #include <Engine/Base/patch.h>
+#include <Engine/Base/path.h>
 
 #include <memory>
 #include <string>
@@ -15,8 +16,11 @@ namespace tests {
 using tarn::engine::Array;
 using tarn::engine::arrayOf;
 using tarn::engine::Connection;
+using tarn::engine::FloatVec4;
 using tarn::engine::Patch;
+using tarn::engine::Path;
 using tarn::engine::Port;
+using tarn::engine::Type;
 
 inline Port port(unsigned long long id, unsigned long long tag = 0) {
     Port result;
@@ -40,6 +44,30 @@ inline Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> o
     base.inputs = arrayOf(std::move(inputs));
     base.outputs = arrayOf(std::move(outputs));
     return base;
+}
+
+// Three levels, with everything that the debug text shows.
+inline Patch sampleDocument() {
+    Port number = port(11, 1);
+    number.name = "";
+    number.defaultValue = 2.5;
+    Port text = port(12, 2);
+    text.typeInfo.type = Type::String;
+    text.defaultValue = "a text";
+    Port color = port(13);
+    color.typeInfo.type = Type::Vec4;
+    color.defaultValue = FloatVec4{1, 0.5, 0, 1};
+    Port shape = port(21, 7);
+    shape.typeInfo.type = Type::Path;
+    shape.defaultValue = Path();
+    Patch const leaf = withPorts(patch(4), {number}, {});
+    Patch const bare = patch(5);
+    Patch const middle =
+        withPorts(patch(2, {leaf, bare}, {{4, 11, 5, 99}}), {text, color}, {shape});
+    Patch root = patch(1, {middle, patch(3)}, {{2, 21, 3, 31}, {2, 21, 2, 12}});
+    root.builtin = 77;
+    root.descriptor = "not printed";
+    return root;
 }
 
 // A random tree with few identifiers, so that they occur often and in many places. `Source` gives

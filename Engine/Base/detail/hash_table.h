@@ -2,7 +2,7 @@
 // installed.
 //
 //     HashTable<Slot> table(slots);
-//     if (!table.at(id).isFree()) { use(table.at(id)); }
+//     if (!table.slotFor(id).isFree()) { use(table.slotFor(id)); }
 
 #ifndef TARN_ENGINE_BASE_DETAIL_HASH_TABLE_H
 #define TARN_ENGINE_BASE_DETAIL_HASH_TABLE_H
@@ -32,7 +32,7 @@ inline void requireCountable(std::size_t count) {
 constexpr std::size_t kAhead = 8;
 
 /// Spreads identifiers that were counted up over all bits.
-constexpr std::uint64_t mixed(std::uint64_t key) {
+constexpr std::uint64_t mix(std::uint64_t key) {
     key ^= key >> 32;
     key *= 0xd6e8feb86659fd93;
     key ^= key >> 32;
@@ -43,12 +43,12 @@ constexpr std::uint64_t mixed(std::uint64_t key) {
 /// Different in every table, by where it is in memory: a document cannot choose its identifiers so
 /// that all of them come to the same slot.
 struct SeededHash {
-    std::uint64_t seed = mixed(reinterpret_cast<std::uintptr_t>(this));
-    std::uint64_t operator()(std::uint64_t key) const { return mixed(key ^ seed); }
+    std::uint64_t seed = mix(reinterpret_cast<std::uintptr_t>(this));
+    std::uint64_t operator()(std::uint64_t key) const { return mix(key ^ seed); }
     std::size_t operator()(Connection const& c) const {
         std::uint64_t result = seed;
         for (std::uint64_t const end : {c.fromPatchId, c.fromPortId, c.toPatchId, c.toPortId}) {
-            result = mixed(result ^ end);
+            result = mix(result ^ end);
         }
         return static_cast<std::size_t>(result);
     }
@@ -61,13 +61,13 @@ template <class Slot>
 class HashTable {
 public:
     explicit HashTable(std::vector<Slot> const& filled)
-        : HashTable(filled, SeededHash{mixed(reinterpret_cast<std::uintptr_t>(this))}) {}
+        : HashTable(filled, SeededHash{mix(reinterpret_cast<std::uintptr_t>(this))}) {}
     /// Tables with one seed have their keys in one order.
     HashTable(std::vector<Slot> const& filled, SeededHash seeded)
         : slots(sizeFor(filled.size())), hash(seeded) {
         for (std::size_t i = 0; i < filled.size(); ++i) {
             if (i + kAhead < filled.size()) prefetch(filled[i + kAhead].key);
-            Slot& slot = at(filled[i].key);
+            Slot& slot = slotFor(filled[i].key);
             if (!slot.isFree()) continue;
             slot = filled[i];
             ++count;
@@ -79,8 +79,8 @@ public:
     std::size_t size() const { return count; }
 
     /// The slot of the key, or the free one where it would be.
-    Slot const& at(std::uint64_t key) const { return slots[positionOf(key)]; }
-    Slot& at(std::uint64_t key) { return slots[positionOf(key)]; }
+    Slot const& slotFor(std::uint64_t key) const { return slots[positionOf(key)]; }
+    Slot& slotFor(std::uint64_t key) { return slots[positionOf(key)]; }
 
     /// Asks for the slots where the key will be looked for; probes often reach into a second line
     /// of the cache.
@@ -98,13 +98,13 @@ public:
         requireCountable(old.size());
         old.swap(slots);
         for (Slot const& slot : old) {
-            if (!slot.isFree()) at(slot.key) = slot;
+            if (!slot.isFree()) slotFor(slot.key) = slot;
         }
     }
 
     /// Adds a slot. There is room, and its key is new.
     void insert(Slot const& slot) noexcept {
-        at(slot.key) = slot;
+        slotFor(slot.key) = slot;
         ++count;
     }
 

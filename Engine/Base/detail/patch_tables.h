@@ -112,7 +112,7 @@ struct Graph {
     }
 
     std::uint32_t recordOf(unsigned long long id) const {
-        return id == 0 ? kNone : patches.at(id).record;
+        return id == 0 ? kNone : patches.slotFor(id).record;
     }
 
     AnyPatch const* findPatch(unsigned long long id) const {
@@ -127,8 +127,8 @@ struct Graph {
     }
 
     std::uint32_t ownerOfPort(unsigned long long portId) const {
-        std::uint32_t const ofInput = inputs.at(portId).owner;
-        std::uint32_t const ofOutput = outputs.at(portId).owner;
+        std::uint32_t const ofInput = inputs.slotFor(portId).owner;
+        std::uint32_t const ofOutput = outputs.slotFor(portId).owner;
         return ofInput <= ofOutput ? ofInput : ofOutput;
     }
 
