@@ -54,3 +54,33 @@ std::string escaped(std::string const& text) {
     }
     return result;
 }
+
+Element& Element::set(std::string const& attribute, std::string const& value) {
+    return setMarkup(attribute + "=\"" + escaped(value) + "\"");
+}
+Element& Element::set(std::string const& attribute, char const* value) {
+    return set(attribute, std::string(value));
+}
+Element& Element::set(std::string const& attribute, double value) {
+    return set(attribute, number(value));
+}
+Element& Element::setView(double left, double top, double width, double height) {
+    return set("viewBox",
+               number(left) + " " + number(top) + " " + number(width) + " " + number(height));
+}
+Element& Element::setMarkup(std::string const& attributes) {
+    start += " " + attributes;
+    return *this;
+}
+
+Element& Element::text(std::string const& shown) { return add(escaped(shown)); }
+Element& Element::add(std::string const& markup) {
+    content += markup;
+    hasContent = true;
+    return *this;
+}
+
+std::string Element::markup() const {
+    if (!hasContent) return start + "/>";
+    return start + ">" + content + "</" + name + ">";
+}

@@ -84,9 +84,72 @@ std::string quoted(std::string const& text) {
     return result + "'";
 }
 
+struct Options {
+    std::string file;
+    bool debug = false;
+    long long frames = 13;
+    long long every = 1;
+    long long reportFrames = 120;
+    bool paths = false;
+    std::string report;
+    std::string picture;
+    std::string copy;
+    std::optional<std::string> other;
+    std::optional<unsigned long long> patchId;
+    std::optional<unsigned long long> portId;
+
+    explicit Options(CLI::App& app) {
+        app.add_option("FILE", file, "The document")->required();
+        app.add_flag("--debug", debug, "Print the graph's debug text");
+        app.add_option("--patch", patchId, "Say what the patch ID is and is connected to")
+            ->type_name("ID");
+        app.add_option("--port", portId, "Say what the port ID is and is connected to")
+            ->type_name("ID");
+        addFrames(app);
+        addFiles(app);
+    }
+
+private:
+    void addFrames(CLI::App& app) {
+        app.add_option("--frames", frames, "How many frames to evaluate; 0 for none")
+            ->type_name("N")
+            ->check(CLI::Range(0LL, 10000000LL))
+            ->capture_default_str();
+        app.add_option("--every", every, "Print every K-th frame")
+            ->type_name("K")
+            ->check(CLI::Range(1LL, 10000000LL))
+            ->capture_default_str();
+        app.add_flag("--paths", paths, "Print the SVG path data of what is drawn in those frames");
+    }
+
+    void addFiles(CLI::App& app) {
+        app.add_option("--report", report,
+                       "Write a page with the graph, the animation and its plots (needs Graphviz)")
+            ->type_name("HTML")
+            ->take_last();
+        app.add_option("--report-frames", reportFrames, "How many frames the page plays")
+            ->type_name("N")
+            ->check(CLI::Range(1LL, 10000LL))
+            ->capture_default_str();
+        app.add_option(
+               "--picture", picture,
+               "Write a picture of the graph and of the last of the frames (needs Graphviz)")
+            ->type_name("SVG");
+        app.add_option("--write", copy,
+                       "Save what was read, in the form of documents; may be FILE itself")
+            ->type_name("JSON");
+        app.add_option(
+               "--compare", other,
+               "Print what is changed in the document FILE2, a line each, and nothing else; "
+               "ends with 1 where they differ. The page marks the changes")
+            ->type_name("FILE2");
+    }
+};
+
 // As `diff` ends: 0 for the same, 1 for changes, 2 for trouble.
-int compare(std::string const& file, std::string const& other, std::string const& report,
-            long long reportFrames) {
+int compare(Options const& options) {
+    std::string const& file = options.file;
+    std::string const& other = *options.other;
     std::string const* current = &file;
     try {
         Document const before = openDocument(file);
@@ -98,10 +161,11 @@ int compare(std::string const& file, std::string const& other, std::string const
             marks.frameRates = "changed frames per second " + Unstructured(rates[0]).toText() +
                                " -> " + Unstructured(rates[1]).toText() + "\n";
         }
-        if (!report.empty()) {
-            for (std::string const& input : {file, other}) refuseToReplace(input, report);
+        if (!options.report.empty()) {
+            for (std::string const& input : {file, other}) refuseToReplace(input, options.report);
             std::filesystem::path const fileName = std::filesystem::path(other).filename();
-            writeFile(report, pageText(after, fileName.string(), reportFrames, &marks));
+            writeFile(options.report,
+                      pageText(after, fileName.string(), options.reportFrames, &marks));
         }
         std::string const text = to_string(marks.changes) + marks.frameRates;
         std::cout << text << std::flush;
@@ -117,117 +181,79 @@ int compare(std::string const& file, std::string const& other, std::string const
     return kBadInput;
 }
 
+// What was asked for, whose files are written on the way.
+std::string answer(Document const& document, Options const& options) {
+    std::ostringstream output;
+    output << countsText(document);
+    if (options.debug) output << "\n" << document.root << "\n";
+    if (options.patchId) {
+        std::string const text = patchText(document, *options.patchId);
+        if (text.empty()) throw InputError("no patch " + std::to_string(*options.patchId));
+        output << "\n" << text;
+    }
+    if (options.portId) {
+        std::string const text = portText(document, *options.portId);
+        if (text.empty()) throw InputError("no port " + std::to_string(*options.portId));
+        output << "\n" << text;
+    }
+    if (options.frames > 0) {
+        Progress progress(options.frames);
+        output << "\n"
+               << framesText(document, options.frames, options.every,
+                             [&](long long frame) { progress(frame); });
+    }
+    if (options.paths) output << "\n" << pathsText(document, options.frames, options.every);
+    for (std::string const& written : {options.picture, options.report})
+        refuseToReplace(options.file, written);
+    if (!options.picture.empty()) {
+        writeFile(options.picture, pictureText(document, std::max(options.frames - 1, 0LL)));
+    }
+    if (!options.copy.empty())
+        writeFile(options.copy, writeDocument(document.root, document.info.framesPerSecond));
+    if (!options.report.empty()) {
+        std::filesystem::path const fileName = std::filesystem::path(options.file).filename();
+        writeFile(options.report, pageText(document, fileName.string(), options.reportFrames));
+        std::string const place = std::filesystem::absolute(options.report).string();
+        output << "\nreport: " << printable(place)
+               << "\nopen it in a browser, for example: xdg-open " << quoted(printable(place))
+               << "\n";
+    }
+    return output.str();
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
     CLI::App app("Reads a document of patches, or a node graph exported by a browser's node "
                  "editor (JSON), and animates it.");
-    std::string file;
-    bool debug = false;
-    long long frames = 13;
-    long long every = 1;
-    long long reportFrames = 120;
-    bool paths = false;
-    std::string report;
-    std::string picture;
-    std::string copy;
-    std::string other;
-    std::optional<unsigned long long> patchId;
-    std::optional<unsigned long long> portId;
-    app.add_option("FILE", file, "The document")->required();
-    app.add_flag("--debug", debug, "Print the graph's debug text");
-    app.add_option("--patch", patchId, "Say what the patch ID is and is connected to")
-        ->type_name("ID");
-    app.add_option("--port", portId, "Say what the port ID is and is connected to")
-        ->type_name("ID");
-    app.add_option("--frames", frames, "How many frames to evaluate; 0 for none")
-        ->type_name("N")
-        ->check(CLI::Range(0LL, 10000000LL))
-        ->capture_default_str();
-    app.add_option("--every", every, "Print every K-th frame")
-        ->type_name("K")
-        ->check(CLI::Range(1LL, 10000000LL))
-        ->capture_default_str();
-    app.add_flag("--paths", paths, "Print the SVG path data of what is drawn in those frames");
-    app.add_option("--report", report,
-                   "Write a page with the graph, the animation and its plots (needs Graphviz)")
-        ->type_name("HTML")
-        ->take_last();
-    app.add_option("--report-frames", reportFrames, "How many frames the page plays")
-        ->type_name("N")
-        ->check(CLI::Range(1LL, 10000LL))
-        ->capture_default_str();
-    app.add_option("--picture", picture,
-                   "Write a picture of the graph and of the last of the frames (needs Graphviz)")
-        ->type_name("SVG");
-    app.add_option("--write", copy,
-                   "Save what was read, in the form of documents; may be FILE itself")
-        ->type_name("JSON");
-    app.add_option("--compare", other,
-                   "Print what is changed in the document FILE2, a line each, and nothing else; "
-                   "ends with 1 where they differ. The page marks the changes")
-        ->type_name("FILE2");
+    Options options(app);
     try {
         app.parse(argc, argv);
     } catch (CLI::ParseError const& error) {
         return app.exit(error) == 0 ? 0 : kBadInput;
     }
 
-    if (app.count("--compare") > 0) return compare(file, other, report, reportFrames);
+    if (options.other) return compare(options);
+    std::string const shownName = printable(options.file);
     try {
-        Document const document = openDocument(file);
+        Document const document = openDocument(options.file);
         std::string const changes = document.info.summary();
-        if (!changes.empty()) {
-            std::cerr << "document_road: " << printable(file) << ": " << changes << "\n";
-        }
+        if (!changes.empty())
+            std::cerr << "document_road: " << shownName << ": " << changes << "\n";
         // All of the output is made before any of it is written.
-        std::ostringstream output;
-        output << countsText(document);
-        if (debug) output << "\n" << document.root << "\n";
-        if (patchId) {
-            std::string const text = patchText(document, *patchId);
-            if (text.empty()) throw InputError("no patch " + std::to_string(*patchId));
-            output << "\n" << text;
-        }
-        if (portId) {
-            std::string const text = portText(document, *portId);
-            if (text.empty()) throw InputError("no port " + std::to_string(*portId));
-            output << "\n" << text;
-        }
-        if (frames > 0) {
-            Progress progress(frames);
-            output << "\n"
-                   << framesText(document, frames, every,
-                                 [&](long long frame) { progress(frame); });
-        }
-        if (paths) output << "\n" << pathsText(document, frames, every);
-        for (std::string const& written : {picture, report}) refuseToReplace(file, written);
-        if (!picture.empty()) {
-            writeFile(picture, pictureText(document, std::max(frames - 1, 0LL)));
-        }
-        if (!copy.empty())
-            writeFile(copy, writeDocument(document.root, document.info.framesPerSecond));
-        if (!report.empty()) {
-            std::filesystem::path const fileName = std::filesystem::path(file).filename();
-            writeFile(report, pageText(document, fileName.string(), reportFrames));
-            std::string const place = std::filesystem::absolute(report).string();
-            output << "\nreport: " << printable(place)
-                   << "\nopen it in a browser, for example: xdg-open " << quoted(printable(place))
-                   << "\n";
-        }
-        std::cout << output.str() << std::flush;
+        std::cout << answer(document, options) << std::flush;
         if (!std::cout) {
             std::cerr << "document_road: the output cannot be written\n";
             return 1;
         }
     } catch (InputError const& error) {
-        std::cerr << "document_road: " << printable(file) << ": " << error.what() << "\n";
+        std::cerr << "document_road: " << shownName << ": " << error.what() << "\n";
         return kBadInput;
     } catch (std::runtime_error const& error) {
         std::cerr << "document_road: " << error.what() << "\n";
         return 1;
     } catch (std::bad_alloc const&) {
-        std::cerr << "document_road: " << printable(file) << ": not enough memory\n";
+        std::cerr << "document_road: " << shownName << ": not enough memory\n";
         return kBadInput;
     }
     return 0;

@@ -35,9 +35,13 @@ std::string wire(Connection const& connection, Anchor const& from, Anchor const&
                           .moveTo({from.x, from.y})
                           .curveTo({from.x + bend, from.y}, {to.x - bend, to.y}, {to.x, to.y})
                           .build();
-    return "<path class=\"t-" + typeToString(from.type) + mark + "\" data-from=\"" +
-           std::to_string(connection.fromPortId) + "\" data-to=\"" +
-           std::to_string(connection.toPortId) + "\" d=\"" + pathData(path) + "\"/>\n";
+    return Element("path")
+               .set("class", "t-" + typeToString(from.type) + mark)
+               .set("data-from", connection.fromPortId)
+               .set("data-to", connection.toPortId)
+               .set("d", pathData(path))
+               .markup() +
+           "\n";
 }
 
 void addAttributes(std::vector<std::string>& parts,
@@ -47,10 +51,8 @@ void addAttributes(std::vector<std::string>& parts,
     }
 }
 
-// As an attribute in quotes.
-std::string partsText(std::vector<std::string> const& parts) {
-    return escaped(jsonText(Json(parts)));
-}
+// For the page's program.
+std::string partsText(std::vector<std::string> const& parts) { return jsonText(Json(parts)); }
 
 }  // namespace
 
@@ -134,61 +136,85 @@ std::string Drawing::markOf(Patch const& patch) const {
 }
 
 std::string Drawing::port(Port const& port, bool isInput, double width, double y) const {
-    std::string const label = labelOf(port);
+    std::string const whole = labelOf(port);
     std::string const type = portNameForTypeInfo(port.typeInfo, false);
-    std::string const name = label.substr(0, label.size() - type.size());
-    std::ostringstream text;
-    text << "<g class=\"port t-" << typeToString(port.typeInfo.type)
-         << "\" role=\"img\" tabindex=\"-1\" data-port=\"" << port.id << "\" data-parts=\""
-         << partsText(describe(port, isInput)) << "\"><rect class=\"row\" x=\"1\" y=\""
-         << number(y - kRowHeight / 2) << "\" width=\"" << number(width - 2) << "\" height=\""
-         << number(kRowHeight) << "\"/><circle cx=\"" << number(isInput ? 0 : width) << "\" cy=\""
-         << number(y) << "\" r=\"5\"/><text x=\""
-         << number(isInput ? kTextIndent : width - kTextIndent) << "\" y=\"" << number(y + 4)
-         << "\"" << (isInput ? "" : " class=\"end\"") << ">" << escaped(name)
-         << "<tspan class=\"type\">" << escaped(type) << "</tspan></text></g>\n";
-    return text.str();
+    std::string const name = whole.substr(0, whole.size() - type.size());
+    Element label("text");
+    label.set("x", isInput ? kTextIndent : width - kTextIndent).set("y", y + 4);
+    if (!isInput) label.set("class", "end");
+    label.text(name).add(Element("tspan").set("class", "type").text(type));
+    return Element("g")
+               .set("class", "port t-" + typeToString(port.typeInfo.type))
+               .set("role", "img")
+               .set("tabindex", -1)
+               .set("data-port", port.id)
+               .set("data-parts", partsText(describe(port, isInput)))
+               .add(Element("rect")
+                        .set("class", "row")
+                        .set("x", 1)
+                        .set("y", y - kRowHeight / 2)
+                        .set("width", width - 2)
+                        .set("height", kRowHeight))
+               .add(Element("circle").set("cx", isInput ? 0.0 : width).set("cy", y).set("r", 5))
+               .add(label)
+               .markup() +
+           "\n";
 }
 
 std::string Drawing::box(Box const& box) const {
     Patch const& patch = *box.patch;
     bool const isGroup = !patch.children->empty();
-    std::ostringstream text;
     std::string const mark = markOf(patch);
-    text << "<g class=\"patch" << (mark.empty() ? "" : " " + mark) << "\" transform=\"translate("
-         << number(box.x) << " " << number(box.y) << ")\"><rect class=\"body\" width=\""
-         << number(box.width) << "\" height=\"" << number(box.height) << "\" rx=\"6\"/>"
-         << "<g class=\"heading\" tabindex=\"-1\" data-parts=\"" << partsText(describe(patch))
-         << "\"";
-    if (!mark.empty()) text << " id=\"patch-" << patch.id << "\"";
+    Element heading("g");
+    heading.set("class", "heading")
+        .set("tabindex", -1)
+        .set("data-parts", partsText(describe(patch)));
+    if (!mark.empty()) heading.set("id", "patch-" + std::to_string(patch.id));
     if (isGroup) {
-        text << " role=\"button\" aria-expanded=\"false\" data-level=\"level-" << patch.id << "\"";
+        heading.set("role", "button")
+            .set("aria-expanded", "false")
+            .set("data-level", "level-" + std::to_string(patch.id));
     } else {
-        text << " role=\"img\"";
+        heading.set("role", "img");
     }
-    text << "><rect class=\"bar\" width=\"" << number(box.width) << "\" height=\""
-         << number(kHeadingHeight) << "\" rx=\"6\"/><text x=\"" << number(kTextIndent)
-         << "\" y=\"17\">" << escaped(headingOf(patch)) << "</text>";
-    if (!mark.empty()) text << "<text x=\"4\" y=\"17\">" << signOfChange(mark) << "</text>";
+    heading
+        .add(Element("rect")
+                 .set("class", "bar")
+                 .set("width", box.width)
+                 .set("height", kHeadingHeight)
+                 .set("rx", 6))
+        .add(Element("text").set("x", kTextIndent).set("y", 17).text(headingOf(patch)));
+    if (!mark.empty()) {
+        heading.add(Element("text").set("x", 4).set("y", 17).text(signOfChange(mark)));
+    }
     if (isGroup) {
-        text << "<text class=\"fold end\" x=\"" << number(box.width - kTextIndent)
-             << "\" y=\"17\">+</text>";
+        heading.add(Element("text")
+                        .set("class", "fold end")
+                        .set("x", box.width - kTextIndent)
+                        .set("y", 17)
+                        .text("+"));
     }
-    text << "</g>\n";
+    Element drawn("g");
+    drawn.set("class", mark.empty() ? "patch" : "patch " + mark)
+        .set("transform", "translate(" + number(box.x) + " " + number(box.y) + ")")
+        .add(Element("rect")
+                 .set("class", "body")
+                 .set("width", box.width)
+                 .set("height", box.height)
+                 .set("rx", 6))
+        .add(heading)
+        .add("\n");
     std::size_t row = 0;
     for (Port const& output : *patch.outputs) {
-        text << port(output, false, box.width, rowMiddle(row++));
+        drawn.add(port(output, false, box.width, rowMiddle(row++)));
     }
-    for (Port const& input : *patch.inputs) text << port(input, true, box.width, rowMiddle(row++));
-    text << "</g>\n";
-    return text.str();
+    for (Port const& input : *patch.inputs) {
+        drawn.add(port(input, true, box.width, rowMiddle(row++)));
+    }
+    return drawn.markup() + "\n";
 }
 
 std::string Drawing::graph(Level const& level, std::string const& attributes) const {
-    std::ostringstream text;
-    text << "<svg class=\"graph\" " << attributes << " width=\"" << number(level.width)
-         << "\" height=\"" << number(level.height) << "\" viewBox=\"0 0 " << number(level.width)
-         << " " << number(level.height) << "\">\n<g class=\"wires\" aria-hidden=\"true\">\n";
     std::unordered_map<unsigned long long, Anchor> outputs;
     std::unordered_map<unsigned long long, Anchor> inputs;
     for (Box const& drawn : level.boxes) {
@@ -201,11 +227,13 @@ std::string Drawing::graph(Level const& level, std::string const& attributes) co
             inputs[port.id] = {drawn.x, drawn.y + rowMiddle(row++), port.typeInfo.type};
         }
     }
+    Element wires("g");
+    wires.set("class", "wires").set("aria-hidden", "true").add("\n");
     auto const addWire = [&](Connection const& connection, std::string const& mark) {
         auto const from = outputs.find(connection.fromPortId);
         auto const to = inputs.find(connection.toPortId);
         if (from != outputs.end() && to != inputs.end()) {
-            text << wire(connection, from->second, to->second, mark);
+            wires.add(wire(connection, from->second, to->second, mark));
         }
     };
     for (Connection const& connection : *level.group->connections) {
@@ -218,22 +246,28 @@ std::string Drawing::graph(Level const& level, std::string const& attributes) co
             for (Connection const& connection : removed->second) addWire(connection, " removed");
         }
     }
-    text << "</g>\n";
-    for (Box const& drawn : level.boxes) text << box(drawn);
-    text << "</svg>\n";
-    return text.str();
+    Element picture("svg");
+    picture.set("class", "graph")
+        .setMarkup(attributes)
+        .set("width", level.width)
+        .set("height", level.height)
+        .setView(0, 0, level.width, level.height)
+        .add("\n")
+        .add(wires)
+        .add("\n");
+    for (Box const& drawn : level.boxes) picture.add(box(drawn));
+    return picture.markup() + "\n";
 }
 
 std::string scenePaths(std::vector<Drawn> const& scene) {
     std::string text;
     for (Drawn const& drawn : scene) {
-        text += "<path class=\"" + std::string(drawn.isLayer ? "layer" : "outline") + "\" d=\"" +
-                drawn.data + "\"";
+        Element path("path");
+        path.set("class", drawn.isLayer ? "layer" : "outline").set("d", drawn.data);
         if (drawn.isLayer) {
-            text += " stroke=\"" + colorText(drawn.color) + "\" stroke-width=\"" +
-                    number(drawn.width) + "\"";
+            path.set("stroke", colorText(drawn.color)).set("stroke-width", drawn.width);
         }
-        text += "/>\n";
+        text += path.markup() + "\n";
     }
     return text;
 }
@@ -252,25 +286,38 @@ std::string pictureText(Document const& document, long long frame) {
     constexpr double kGap = 12.0;
     bool const isDrawn = !bounds.isEmpty;
     double const height = level.height + (isDrawn ? kSceneHeight + 2 * kGap : 0.0);
-    std::ostringstream text;
-    text << "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " << number(level.width) << " "
-         << number(height) << "\" role=\"img\" aria-label=\"The graph of "
-         << escaped(nameOf(document.root)) << ", and what it draws in frame " << frame << "\">\n"
-         << "<style>\n"
-         << page_files::kGraphCss << "</style>\n"
-         << "<rect class=\"paper\" width=\"" << number(level.width) << "\" height=\""
-         << number(height) << "\"/>\n"
-         << Drawing(document.root).graph(level, "");
+    Element picture("svg");
+    picture.set("xmlns", "http://www.w3.org/2000/svg")
+        .setView(0, 0, level.width, height)
+        .set("role", "img")
+        .set("aria-label", "The graph of " + nameOf(document.root) +
+                               ", and what it draws in frame " + std::to_string(frame))
+        .add("\n")
+        .add(Element("style").add(std::string("\n") + page_files::kGraphCss))
+        .add("\n")
+        .add(Element("rect").set("class", "paper").set("width", level.width).set("height", height))
+        .add("\n")
+        .add(Drawing(document.root).graph(level, ""));
     if (isDrawn) {
-        text << "<svg class=\"scene\" x=\"" << number(kGap) << "\" y=\""
-             << number(level.height + kGap) << "\" width=\"" << number(level.width - 2 * kGap)
-             << "\" height=\"" << number(kSceneHeight) << "\" viewBox=\"" << number(bounds.left)
-             << " " << number(bounds.top) << " " << number(bounds.right - bounds.left) << " "
-             << number(bounds.bottom - bounds.top) << "\">\n"
-             << "<rect class=\"stage\" x=\"-100000\" y=\"-100000\" width=\"200000\" "
-                "height=\"200000\"/>\n"
-             << scenePaths(drawn) << "</svg>\n";
+        Element stage("rect");
+        stage.set("class", "stage")
+            .set("x", -100000)
+            .set("y", -100000)
+            .set("width", 200000)
+            .set("height", 200000);
+        Element inner("svg");
+        inner.set("class", "scene")
+            .set("x", kGap)
+            .set("y", level.height + kGap)
+            .set("width", level.width - 2 * kGap)
+            .set("height", kSceneHeight)
+            .setView(bounds.left, bounds.top, bounds.right - bounds.left,
+                     bounds.bottom - bounds.top)
+            .add("\n")
+            .add(stage)
+            .add("\n")
+            .add(scenePaths(drawn));
+        picture.add(inner).add("\n");
     }
-    text << "</svg>\n";
-    return text.str();
+    return picture.markup() + "\n";
 }

@@ -1,7 +1,7 @@
 // Graphs and scenes as SVG.
 //
 //     Drawing drawing(document.root);
-//     std::string const svg = drawing.graph(layOut(document.root).front());
+//     std::string const svg = drawing.graph(layOut(document.root).front(), "");
 
 #ifndef REPORT_DRAWING_H
 #define REPORT_DRAWING_H

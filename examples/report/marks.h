@@ -1,7 +1,7 @@
 // What the report marks in a graph: how a document differs from another one.
 //
 //     Marks const marks = marksOf(before.root, after.root);
-//     Drawing const drawing(marks.shown, marks);
+//     Drawing const drawing(marks.shown, &marks);
 
 #ifndef REPORT_MARKS_H
 #define REPORT_MARKS_H

@@ -44,7 +44,7 @@ std::string dataText(Film const& film, Document const& document) {
 
 // The template with its {{NAMES}} filled in; what is from {{#NAME}} to {{/NAME}} stays where that
 // part is not empty.
-std::string filled(std::string const& page, std::map<std::string, std::string> const& parts) {
+std::string fillTemplate(std::string const& page, std::map<std::string, std::string> const& parts) {
     std::string text;
     std::size_t done = 0;
     for (std::size_t open = page.find("{{"); open != std::string::npos;
@@ -81,7 +81,7 @@ std::string pageText(Document const& document, std::string const& fileName, long
     }
     std::string const levels = levelsText(marks != nullptr ? marks->shown : document.root, marks);
     std::string const name = escaped(printable(fileName));
-    return filled(
+    return fillTemplate(
         page_files::kPageHtml,
         {{"TITLE", name},
          {"NAME", escaped(nameOf(document.root))},

@@ -1,10 +1,11 @@
 #include "report/plots.h"
 
+#include "animation/labels.h"
 #include "animation/markup.h"
 
 #include <algorithm>
 #include <cmath>
-#include <sstream>
+#include <string>
 
 using namespace tarn::engine;
 
@@ -35,6 +36,32 @@ std::string lineData(std::vector<double> const& values, double least, double mos
     return data;
 }
 
+Element headingOf(Plot const& plot) {
+    Element const type = Element("span")
+                             .set("class", "type")
+                             .text(portNameForTypeInfo(plot.typeInfo, plot.longestLoop > 1));
+    return Element("h3").text(plot.name + " ").add(type);
+}
+
+// The names of the first lines, in their colours.
+Element keysOf(Plot const& plot) {
+    Element keys("p");
+    keys.set("class", "keys").text("");
+    for (std::size_t i = 0; i < plot.lines.size() && i <= 4; ++i) {
+        Line const& line = plot.lines[i];
+        if (i > 0 && line.color == 0) break;
+        keys.add(Element("span").set("class", "key c" + std::to_string(line.color)).text(line.name))
+            .add(" ");
+    }
+    if (plot.longestLoop > 1) {
+        keys.add(Element("span").text(std::to_string(plot.longestLoop) + " in the loop"));
+    }
+    if (plot.lines.empty()) {
+        keys.add(Element("span").text(counted(plot.changes.size(), "change", "changes")));
+    }
+    return keys;
+}
+
 }  // namespace
 
 std::string plotText(Plot const& plot, std::size_t position, long long frames,
@@ -48,43 +75,48 @@ std::string plotText(Plot const& plot, std::size_t position, long long frames,
             most = std::max(most, value);
         }
     }
-    std::string const name = escaped(plot.name);
-    std::ostringstream text;
-    text << "<div class=\"plot\"><h3>" << name << " <span class=\"type\">"
-         << portNameForTypeInfo(plot.typeInfo, plot.longestLoop > 1)
-         << "</span></h3>\n<p class=\"keys\">";
-    for (std::size_t i = 0; i < plot.lines.size() && i <= 4; ++i) {
-        Line const& line = plot.lines[i];
-        if (i > 0 && line.color == 0) break;
-        text << "<span class=\"key c" << line.color << "\">" << line.name << "</span> ";
-    }
-    if (plot.longestLoop > 1) text << "<span>" << plot.longestLoop << " in the loop</span>";
-    if (plot.lines.empty()) {
-        text << "<span>" << plot.changes.size()
-             << (plot.changes.size() == 1 ? " change</span>" : " changes</span>");
-    }
-    text << "</p>\n<div class=\"chart\" role=\"slider\" tabindex=\"0\" data-plot=\"" << position
-         << "\" aria-label=\"" << name << " over time\" aria-valuemin=\"0\" aria-valuemax=\""
-         << frames - 1 << "\" aria-valuenow=\"0\" aria-valuetext=\"frame 0: " << escaped(firstText)
-         << "\"><svg aria-hidden=\"true\" preserveAspectRatio=\"none\" viewBox=\"0 -3 "
-         << std::max(frames - 1, 1LL) << " 106\">";
+    Element section("div");
+    section.set("class", "plot").add(headingOf(plot)).add("\n").add(keysOf(plot)).add("\n");
+    Element curves("svg");
+    curves.set("aria-hidden", "true")
+        .set("preserveAspectRatio", "none")
+        .set("viewBox", "0 -3 " + std::to_string(std::max(frames - 1, 1LL)) + " 106");
     bool const isStepped = plot.typeInfo.type == Type::Boolean || plot.typeInfo.type == Type::Int;
     for (Line const& line : plot.lines) {
-        text << "<path class=\"line c" << line.color << "\" d=\""
-             << lineData(line.values, least, most, isStepped) << "\"/>";
+        curves.add(Element("path")
+                       .set("class", "line c" + std::to_string(line.color))
+                       .set("d", lineData(line.values, least, most, isStepped)));
     }
     if (plot.lines.empty()) {
-        text << "<path class=\"line c0\" d=\"M0 50H" << std::max(frames - 1, 1LL);
-        for (long long const frame : plot.changes) text << "M" << frame << " 25V75";
-        text << "\"/>";
+        std::string data = "M0 50H" + std::to_string(std::max(frames - 1, 1LL));
+        for (long long const frame : plot.changes) data += "M" + std::to_string(frame) + " 25V75";
+        curves.add(Element("path").set("class", "line c0").set("d", data));
     }
-    text << "<path class=\"cursor\" d=\"M0 -3V103\"/></svg></div>\n";
+    curves.add(Element("path").set("class", "cursor").set("d", "M0 -3V103"));
+    section
+        .add(Element("div")
+                 .set("class", "chart")
+                 .set("role", "slider")
+                 .set("tabindex", 0)
+                 .set("data-plot", position)
+                 .set("aria-label", plot.name + " over time")
+                 .set("aria-valuemin", 0)
+                 .set("aria-valuemax", frames - 1)
+                 .set("aria-valuenow", 0)
+                 .set("aria-valuetext", "frame 0: " + firstText)
+                 .add(curves))
+        .add("\n");
     if (least <= most) {
-        text << "<p class=\"range\"><span>" << to_string(Value(least)) << " to "
-             << to_string(Value(most)) << "</span></p>\n";
+        std::string const range = to_string(Value(least)) + " to " + to_string(Value(most));
+        section.add(Element("p").set("class", "range").add(Element("span").text(range))).add("\n");
     }
-    text << "<p class=\"now\" role=\"group\" tabindex=\"0\" aria-label=\"" << name
-         << ", the value\"><span class=\"frame\">frame 0</span> <span class=\"value\">"
-         << escaped(firstText) << "</span></p></div>\n";
-    return text.str();
+    section.add(Element("p")
+                    .set("class", "now")
+                    .set("role", "group")
+                    .set("tabindex", 0)
+                    .set("aria-label", plot.name + ", the value")
+                    .add(Element("span").set("class", "frame").text("frame 0"))
+                    .add(" ")
+                    .add(Element("span").set("class", "value").text(firstText)));
+    return section.markup() + "\n";
 }

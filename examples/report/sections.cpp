@@ -10,7 +10,6 @@
 #include <algorithm>
 #include <functional>
 #include <map>
-#include <sstream>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -23,53 +22,61 @@ constexpr int kDeepestTree = 64;
 
 // The root is in no level: its ports are listed.
 std::string rootPortsText(Drawing const& drawing, Patch const& root) {
-    std::string items;
+    Element list("ul");
+    list.set("class", "ports").add("\n");
     auto const add = [&](Port const& port, bool isInput) {
         std::string line;
         for (std::string const& part : drawing.describe(port, isInput)) {
             line += (line.empty() ? "" : "; ") + part;
         }
-        items += "<li>" + escaped(line) + "</li>\n";
+        list.add(Element("li").text(line)).add("\n");
     };
     for (Port const& input : *root.inputs) add(input, true);
     for (Port const& output : *root.outputs) add(output, false);
-    if (items.empty()) return "";
-    return "<details><summary>The document's own ports, " +
-           std::to_string(root.inputs->size() + root.outputs->size()) +
-           "</summary><ul class=\"ports\">\n" + items + "</ul></details>\n";
+    std::size_t const count = root.inputs->size() + root.outputs->size();
+    if (count == 0) return "";
+    Element details("details");
+    details.add(Element("summary").text("The document's own ports, " + std::to_string(count)))
+        .add(list);
+    return details.markup() + "\n";
 }
 
-void writeTree(std::ostream& stream, std::string const& name, Unstructured const& data, int depth) {
+// A list that can be unfolded.
+std::string foldedList(Element const& summary, std::string const& items) {
+    Element const details = Element("details").add(summary).add(Element("ul").add("\n" + items));
+    return Element("li").add(details).markup() + "\n";
+}
+
+std::string treeText(std::string const& name, Unstructured const& data, int depth) {
+    Element const shownName = Element("span").set("class", "name").text(printable(name));
     Unstructured::Map const* const map = data.ifMap();
     Unstructured::Array const* const array = data.ifArray();
     if (map == nullptr && array == nullptr) {
-        stream << "<li><span class=\"name\">" << escaped(printable(name)) << "</span> "
-               << escaped(data.toText(kLongestText)) << "</li>\n";
-        return;
+        return Element("li").add(shownName).add(" ").text(data.toText(kLongestText)).markup() +
+               "\n";
     }
-    std::size_t const size = map != nullptr ? map->size() : array->size();
-    stream << "<li><details><summary><span class=\"name\">" << escaped(printable(name))
-           << "</span> " << (map != nullptr ? "{" : "[") << size << (map != nullptr ? "}" : "]")
-           << "</summary><ul>\n";
+    std::string items;
     if (depth == kDeepestTree) {
-        stream << "<li>nested deeper than this page shows</li>\n";
+        items = Element("li").text("nested deeper than this page shows").markup() + "\n";
     } else if (map != nullptr) {
-        for (auto const& [key, member] : *map) writeTree(stream, key, member, depth + 1);
+        for (auto const& [key, member] : *map) items += treeText(key, member, depth + 1);
     } else {
         for (std::size_t i = 0; i < array->size(); ++i) {
-            writeTree(stream, std::to_string(i), (*array)[i], depth + 1);
+            items += treeText(std::to_string(i), (*array)[i], depth + 1);
         }
     }
-    stream << "</ul></details></li>\n";
+    std::string const size = std::to_string(map != nullptr ? map->size() : array->size());
+    std::string const brackets = map != nullptr ? "{" + size + "}" : "[" + size + "]";
+    return foldedList(Element("summary").add(shownName).text(" " + brackets), items);
 }
 
-void writeAttributes(std::ostream& stream, std::string const& owner,
-                     std::map<std::string, Unstructured> const& attributes) {
-    if (attributes.empty()) return;
-    stream << "<li><details><summary>" << escaped(owner) << " {" << attributes.size()
-           << "}</summary><ul>\n";
-    for (auto const& [key, value] : attributes) writeTree(stream, key, value, 1);
-    stream << "</ul></details></li>\n";
+std::string attributesOf(std::string const& owner,
+                         std::map<std::string, Unstructured> const& attributes) {
+    if (attributes.empty()) return "";
+    std::string items;
+    for (auto const& [key, value] : attributes) items += treeText(key, value, 1);
+    return foldedList(
+        Element("summary").text(owner + " {" + std::to_string(attributes.size()) + "}"), items);
 }
 
 // The values of the attributes `id` that begin with `prefix`.
@@ -85,55 +92,86 @@ std::unordered_set<std::string> idsIn(std::string const& markup, std::string con
 
 }  // namespace
 
+namespace {
+
+Element zoomButton(char const* factor, std::string const& label, char const* sign) {
+    return Element("button")
+        .set("type", "button")
+        .set("class", "zoom")
+        .set("data-factor", factor)
+        .set("aria-label", label)
+        .text(sign);
+}
+
+Element captionOf(Level const& level, int depth) {
+    Patch const& group = *level.group;
+    std::string const name = nameOf(group);
+    Element caption("figcaption");
+    caption.add(Element("span").set("class", "name").text(name))
+        .add(" ")
+        .add(Element("span")
+                 .set("class", "type")
+                 .text("level " + std::to_string(depth) + ", patch " + std::to_string(group.id) +
+                       ", " + counted(group.children->size(), "patch", "patches") + " inside"));
+    if (!level.boxes.empty()) {
+        caption.add(" ")
+            .add(zoomButton("0.8", "Draw " + name + " smaller", "\u2212"))
+            .add(" ")
+            .add(zoomButton("1.25", "Draw " + name + " larger", "+"));
+    }
+    if (depth > 1) {
+        caption.add(" ").add(
+            Element("button").set("type", "button").set("class", "close").text("Close " + name));
+    }
+    return caption;
+}
+
+std::string paragraph(std::string const& text) { return Element("p").text(text).markup() + "\n"; }
+
+}  // namespace
+
 std::string levelsText(Patch const& root, Marks const* marks) {
     std::vector<Level> const levels = layOut(root);
     std::unordered_map<Patch const*, Level const*> levelOf;
     for (Level const& level : levels) levelOf.emplace(level.group, &level);
     Drawing const drawing(root, marks);
-    std::ostringstream text;
     // A level's figure holds those of the groups in it: closing it closes them.
-    std::function<void(Level const&, int)> const write = [&](Level const& level, int depth) {
+    std::function<std::string(Level const&, int)> const figureOf = [&](Level const& level,
+                                                                       int depth) {
         Patch const& group = *level.group;
-        std::string const name = escaped(nameOf(group));
-        text << "<figure class=\"level\" tabindex=\"-1\" id=\"level-" << group.id << "\""
-             << (depth > 1 ? " hidden" : "") << ">\n<figcaption><span class=\"name\">" << name
-             << "</span> <span class=\"type\">level " << depth << ", patch " << group.id << ", "
-             << group.children->size() << (group.children->size() == 1 ? " patch" : " patches")
-             << " inside</span>";
-        if (!level.boxes.empty()) {
-            text << " <button type=\"button\" class=\"zoom\" data-factor=\"0.8\" aria-label=\"Draw "
-                 << name
-                 << " smaller\">\u2212</button> <button type=\"button\" class=\"zoom\" "
-                    "data-factor=\"1.25\" aria-label=\"Draw "
-                 << name << " larger\">+</button>";
-        }
-        if (depth > 1)
-            text << " <button type=\"button\" class=\"close\">Close " << name << "</button>";
-        text << "</figcaption>\n";
+        Element figure("figure");
+        figure.set("class", "level")
+            .set("tabindex", -1)
+            .set("id", "level-" + std::to_string(group.id));
+        if (depth > 1) figure.setMarkup("hidden");
+        figure.add("\n").add(captionOf(level, depth)).add("\n");
         if (level.boxes.size() < group.children->size()) {
-            text << "<p>Shown are the first " << level.boxes.size() << ".</p>\n";
+            figure.add(
+                paragraph("Shown are the first " + std::to_string(level.boxes.size()) + "."));
         }
         if (level.isInRows) {
-            text << "<p>Graphviz takes too long for this level: its patches are in rows, in the "
-                    "order of the document.</p>\n";
+            figure.add(paragraph("Graphviz takes too long for this level: its patches are in rows, "
+                                 "in the order of the document."));
         }
-        if (depth == 1) text << rootPortsText(drawing, group);
+        if (depth == 1) figure.add(rootPortsText(drawing, group));
         if (level.boxes.empty()) {
-            text << "<p>There is nothing inside.</p>\n";
+            figure.add(paragraph("There is nothing inside."));
         } else {
-            text << "<div class=\"scroll\" tabindex=\"-1\">"
-                 << drawing.graph(level, "role=\"group\" aria-label=\"Graph of " + name +
-                                             "\" aria-describedby=\"graph-keys\"")
-                 << "</div>\n<div class=\"info\" aria-hidden=\"true\"></div>\n";
+            std::string const graph = drawing.graph(
+                level, "role=\"group\" aria-label=\"Graph of " + escaped(nameOf(group)) +
+                           "\" aria-describedby=\"graph-keys\"");
+            figure.add(Element("div").set("class", "scroll").set("tabindex", -1).add(graph))
+                .add("\n")
+                .add(Element("div").set("class", "info").set("aria-hidden", "true").text(""))
+                .add("\n");
         }
         for (Patch const& child : *group.children) {
             auto const inner = levelOf.find(&child);
-            if (inner != levelOf.end()) write(*inner->second, depth + 1);
+            if (inner != levelOf.end()) figure.add(figureOf(*inner->second, depth + 1));
         }
-        text << "</figure>\n";
+        return figure.markup() + "\n";
     };
-    write(levels.front(), 1);
-    return text.str();
+    return figureOf(levels.front(), 1);
 }
 
 std::string legendText(Patch const& root) {
@@ -149,7 +187,7 @@ std::string legendText(Patch const& root) {
     });
     std::string text;
     for (auto const& [name, type] : types) {
-        text += "<li class=\"t-" + type + "\">" + name + "</li>\n";
+        text += Element("li").set("class", "t-" + type).text(name).markup() + "\n";
     }
     return text;
 }
@@ -158,18 +196,30 @@ std::string curvesText() {
     constexpr double kSize = 100.0;
     double const side = (kCurveEnd - kCurveStart) * kSize;
     double const margin = -kCurveStart * kSize;
-    std::ostringstream text;
+    std::string text;
     std::vector<std::string> const names = easingFunctionNames();
     for (std::size_t i = 0; i < names.size(); ++i) {
-        text << "<figure class=\"curve\"><svg role=\"img\" aria-label=\"" << escaped(names[i])
-             << "\" viewBox=\"" << -margin << " " << margin - side << " " << side << " " << side
-             << "\"><rect class=\"beyond\" x=\"" << -margin << "\" y=\"" << margin - side
-             << "\" width=\"" << side << "\" height=\"" << side << "\"/><rect class=\"way\" y=\""
-             << -kSize << "\" width=\"" << kSize << "\" height=\"" << kSize << "\"/><path d=\""
-             << pathData(curve(EasingFunction(i), kSize)) << "\"/></svg><figcaption>"
-             << escaped(names[i]) << "</figcaption></figure>\n";
+        Element picture("svg");
+        picture.set("role", "img")
+            .set("aria-label", names[i])
+            .setView(-margin, margin - side, side, side)
+            .add(Element("rect")
+                     .set("class", "beyond")
+                     .set("x", -margin)
+                     .set("y", margin - side)
+                     .set("width", side)
+                     .set("height", side))
+            .add(Element("rect")
+                     .set("class", "way")
+                     .set("y", -kSize)
+                     .set("width", kSize)
+                     .set("height", kSize))
+            .add(Element("path").set("d", pathData(curve(EasingFunction(i), kSize))));
+        Element figure("figure");
+        figure.set("class", "curve").add(picture).add(Element("figcaption").text(names[i]));
+        text += figure.markup() + "\n";
     }
-    return text.str();
+    return text;
 }
 
 std::string shapesText() {
@@ -191,77 +241,91 @@ std::string shapesText() {
         {"hexaRect", PathBuilder().hexaRect({0, 0}, {50, 32}, 9).build()},
         {"append", PathBuilder().append(leaf).circle({20, 14}, 8).build()},
     };
-    std::ostringstream text;
+    std::string text;
     for (Shape const& shape : shapes) {
         Bounds bounds;
         bounds.add(shape.path);
         bounds = bounds.widened(5.0);
-        text << "<figure class=\"shape\"><figcaption>" << shape.call
-             << "</figcaption><svg class=\"points\" role=\"img\" aria-label=\"" << shape.call
-             << "\" viewBox=\"" << number(bounds.left) << " " << number(bounds.top) << " "
-             << number(bounds.right - bounds.left) << " " << number(bounds.bottom - bounds.top)
-             << "\"><path class=\"outline\" d=\"" << pathData(shape.path) << "\"/></svg>\n<ol>";
+        Element picture("svg");
+        picture.set("class", "points")
+            .set("role", "img")
+            .set("aria-label", shape.call)
+            .setView(bounds.left, bounds.top, bounds.right - bounds.left,
+                     bounds.bottom - bounds.top)
+            .add(Element("path").set("class", "outline").set("d", pathData(shape.path)));
+        Element elements("ol");
         for (PathElement const& element : shape.path.elements) {
-            text << "<li>" << pathInstructionToString(element.instruction);
+            std::string line = pathInstructionToString(element.instruction);
             char const* before = " ";
             for (FloatVec2 const p : element.points) {
-                text << before << point(p);
+                line += before + point(p);
                 before = ", ";
             }
-            text << "</li>\n";
+            elements.add(Element("li").text(line)).add("\n");
         }
-        text << "</ol></figure>\n";
+        Element figure("figure");
+        figure.set("class", "shape")
+            .add(Element("figcaption").text(shape.call))
+            .add(picture)
+            .add("\n")
+            .add(elements);
+        text += figure.markup() + "\n";
     }
-    return text.str();
+    return text;
 }
 
 std::string attributesText(Patch const& root) {
-    std::ostringstream text;
+    std::string items;
     forEachPatch(root, [&](Patch const& patch, std::size_t) {
         std::string const owner = nameOf(patch) + " (patch " + std::to_string(patch.id) + ")";
-        writeAttributes(text, owner, patch.attributes);
+        items += attributesOf(owner, patch.attributes);
         for (auto const& list : {patch.inputs, patch.outputs}) {
             for (Port const& port : *list) {
-                writeAttributes(text,
-                                owner + ", " + printable(port.name) + " (port " +
-                                    std::to_string(port.id) + ")",
-                                port.attributes);
+                items += attributesOf(owner + ", " + printable(port.name) + " (port " +
+                                          std::to_string(port.id) + ")",
+                                      port.attributes);
             }
         }
     });
-    std::string const list = text.str();
-    return list.empty() ? "" : "<ul class=\"tree\">\n" + list + "</ul>\n";
+    if (items.empty()) return "";
+    return Element("ul").set("class", "tree").add("\n" + items).markup() + "\n";
 }
 
 std::string changesText(Marks const* marks, std::string const& levels) {
     constexpr std::size_t kMostChanges = 2000;
     if (marks == nullptr) return "";
     if (marks->changes.empty() && marks->frameRates.empty()) {
-        return "<p>The documents are the same.</p>\n";
+        return paragraph("The documents are the same.");
     }
     std::unordered_set<std::string> const patches = idsIn(levels, "patch-");
     std::unordered_set<std::string> const groups = idsIn(levels, "level-");
-    std::string text = "<ul tabindex=\"0\" aria-label=\"Changes\">\n";
+    Element list("ul");
+    list.set("tabindex", 0).set("aria-label", "Changes").add("\n");
     for (std::size_t i = 0; i < std::min(marks->changes.size(), kMostChanges); ++i) {
         PatchChange const& change = marks->changes[i];
         Patch const& patch = change.after != nullptr ? *change.after : *change.before;
         Patch const* const parent =
             change.after != nullptr ? change.parentAfter : change.parentBefore;
         std::string const kind = kindOfChange(change.kind);
-        std::string const line = escaped(to_string(change).substr(kind.size() + 1));
+        std::string const line = to_string(change).substr(kind.size() + 1);
         std::string id = "patch-" + std::to_string(patch.id);
         bool isThere = parent != nullptr && patches.count(id) != 0;
         if (!isThere) {
             id = "level-" + std::to_string(parent != nullptr ? parent->id : patch.id);
             isThere = groups.count(id) != 0;
         }
-        text += "<li><span class=\"mark\">" + signOfChange(kind) + " " + kind + "</span> " +
-                (isThere ? "<a href=\"#" + id + "\">" + line + "</a>" : line) + "</li>\n";
+        Element item("li");
+        item.add(Element("span").set("class", "mark").text(signOfChange(kind) + " " + kind))
+            .add(" ");
+        if (isThere) {
+            item.add(Element("a").set("href", "#" + id).text(line));
+        } else {
+            item.text(line);
+        }
+        list.add(item).add("\n");
     }
-    if (!marks->frameRates.empty()) text += "<li>" + escaped(marks->frameRates) + "</li>\n";
-    text += "</ul>\n";
-    if (marks->changes.size() > kMostChanges) {
-        text += "<p>" + std::to_string(marks->changes.size() - kMostChanges) + " more.</p>\n";
-    }
-    return text;
+    if (!marks->frameRates.empty()) list.add(Element("li").text(marks->frameRates)).add("\n");
+    std::size_t const count = marks->changes.size();
+    return list.markup() + "\n" +
+           (count > kMostChanges ? paragraph(std::to_string(count - kMostChanges) + " more.") : "");
 }

@@ -33,6 +33,24 @@ done
 [ "$programs" -ge 9 ]
 
 headers=0
+for header in "$root"/examples/*/*.h; do
+    name=${header#"$root/examples/"}
+    {
+        printf '#include "%s"\n#include <Engine/Base/base.h>\n#include <Engine/Document/document.h>\n' "$name"
+        printf '#include "animation/evaluator.h"\n#include "report/film.h"\n#include "report/layout.h"\n'
+        printf '#include <fstream>\n#include <iostream>\nusing namespace tarn::engine;\n'
+        printf 'extern Document document;\nextern Document before;\nextern Document after;\nextern Evaluator evaluator;\n'
+        printf 'extern Patch patch;\nextern EvalPort port;\nextern Film film;\n'
+        use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
+        [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
+        printf 'void shown() {\n%s\n}\n' "$use"
+    } > "$work/use.cpp"
+    "$compiler" -std=c++17 -fsyntax-only -I"$root" -I"$root/examples" $boost "$work/use.cpp" || {
+        cat "$work/use.cpp"
+        exit 1
+    }
+    headers=$((headers + 1))
+done
 for header in "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h; do
     name=${header#"$root/"}
     {
