@@ -12,6 +12,7 @@
 
 #include <algorithm>
 #include <atomic>
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <deque>
@@ -126,66 +127,88 @@ double heapBytes() {
 
 }  // namespace bench
 
+namespace {
+
+struct Options {
+    bool quick = false;
+    std::string filter;
+    std::string kept;
+    int rounds = 3;
+
+    explicit Options(CLI::App& app) {
+        app.add_flag("--quick", quick, "Measure the rows that matter most, once, in two minutes");
+        app.add_option("--filter", filter, "Measure the operations whose names match this")
+            ->type_name("REGEX");
+        app.add_option("--compare", kept,
+                       "Name what got worse by more than a tenth since this table was kept; end "
+                       "with 1 where there is any")
+            ->type_name("TABLE");
+        app.add_option("--rounds", rounds, "How often everyone is asked for three repetitions")
+            ->check(CLI::Range(1, 100))
+            ->capture_default_str();
+    }
+};
+
+// The C++ library counts references without atomics while a program has one thread.
+class SecondThread {
+public:
+    SecondThread() = default;
+    ~SecondThread() {
+        done = true;
+        thread.join();
+    }
+    SecondThread(SecondThread const&) = delete;
+    SecondThread& operator=(SecondThread const&) = delete;
+
+private:
+    std::atomic<bool> done{false};
+    std::thread thread{[this] {
+        while (!done) std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }};
+};
+
+int measure(Options const& options) {
+    bench::requireKnownPeers();
+    static_cast<void>(bench::figuresOfProcess({"--agree"}));
+    std::vector<bench::Row> rows;
+    for (bench::Operation const& operation : bench::operations()) {
+        bool const wanted = std::regex_search(operation.name, std::regex(options.filter));
+        if (!wanted || (options.quick && !operation.isQuick)) continue;
+        rows.push_back(bench::measured(operation, options.quick ? 1 : options.rounds, 3));
+    }
+    std::fprintf(stderr, "\n");
+    std::cout << bench::tableOf(rows);
+    if (options.kept.empty()) return 0;
+    std::string const worse = bench::whatIsWorse(rows, options.kept);
+    std::cout << "\n" << (worse.empty() ? "Nothing is worse by more than a tenth.\n" : worse);
+    return worse.empty() ? 0 : 1;
+}
+
+}  // namespace
+
 int main(int argc, char** argv) {
     // As in a process that has run for a while: memory that was given back is there, and the
     // kernel has no part in what is measured.
     mallopt(M_MMAP_THRESHOLD, 1 << 30);
     mallopt(M_TRIM_THRESHOLD, 1 << 30);
-
-    // The C++ library counts references without atomics while a program has one thread.
-    std::atomic<bool> done{false};
-    std::thread second([&done] {
-        while (!done) std::this_thread::sleep_for(std::chrono::milliseconds(5));
-    });
-    auto const end = [&](int status) {
-        done = true;
-        second.join();
-        return status;
-    };
+    SecondThread const second;
 
     bench::describeAll();
     if (argc == 5 && std::string(argv[1]) == "--run") {
-        return end(bench::runOne(argv[2], argv[3], std::atoi(argv[4])));
+        return bench::runOne(argv[2], argv[3], std::atoi(argv[4]));
     }
     if (argc == 2 && std::string(argv[1]) == "--agree") {
         for (auto const& check : bench::agreements()) check();
-        return end(0);
+        return 0;
     }
 
     CLI::App app("Measures the library beside its peers and prints a table. Every implementation "
                  "of an operation is run in a process of its own.");
-    bool quick = false;
-    std::string filter;
-    std::string kept;
-    int rounds = 3;
-    app.add_flag("--quick", quick, "Measure the rows that matter most, once, in two minutes");
-    app.add_option("--filter", filter, "Measure the operations whose names match this")
-        ->type_name("REGEX");
-    app.add_option("--compare", kept,
-                   "Name what got worse by more than a tenth since this table was kept; end with 1 "
-                   "where there is any")
-        ->type_name("TABLE");
-    app.add_option("--rounds", rounds, "How often everyone is asked for three repetitions")
-        ->check(CLI::Range(1, 100))
-        ->capture_default_str();
+    Options options(app);
     try {
         app.parse(argc, argv);
     } catch (CLI::ParseError const& error) {
-        return end(app.exit(error));
+        return app.exit(error);
     }
-
-    bench::requireKnownPeers();
-    static_cast<void>(bench::figuresOfProcess({"--agree"}));
-    std::vector<bench::Row> rows;
-    for (bench::Operation const& operation : bench::operations()) {
-        bool const wanted = std::regex_search(operation.name, std::regex(filter));
-        if (!wanted || (quick && !operation.isQuick)) continue;
-        rows.push_back(bench::measured(operation, quick ? 1 : rounds, 3));
-    }
-    std::fprintf(stderr, "\n");
-    std::cout << bench::tableOf(rows);
-    if (kept.empty()) return end(0);
-    std::string const worse = bench::whatIsWorse(rows, kept);
-    std::cout << "\n" << (worse.empty() ? "Nothing is worse by more than a tenth.\n" : worse);
-    return end(worse.empty() ? 0 : 1);
+    return measure(options);
 }
