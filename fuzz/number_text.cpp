@@ -7,15 +7,15 @@
 
 #include <Engine/Base/value.h>
 
-#include <clocale>
 #include <iterator>
+#include <optional>
 
 using namespace fuzz;
 
 extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
     Input input(data, size);
-    char const* const localeNames[] = {"C", "de_DE.UTF-8"};
-    std::setlocale(LC_NUMERIC, localeNames[input.below(2)]);  // Where it is there.
+    std::optional<tests::CLocaleWithComma> withComma;
+    if (input.below(2) == 1) withComma.emplace();
     char const points[] = {'.', '.', ',', ';'};
     char const point = points[input.below(std::size(points))];
     tests::CoutDecimalPoint const shown(point);

@@ -38,7 +38,6 @@ struct Inputs {
     Patch root = withPorts(
         patch(1, {withPorts(patch(2), {port(21)}, {port(22)}), patch(3)}, {{2, 22, 2, 21}}),
         {port(11)}, {port(12)});
-    PatchIndex index{root};
     EvalPatch evaluated{root};
     EvalPatchIndex evaluatedIndex{evaluated};
 };
@@ -269,17 +268,6 @@ std::vector<Row> const kRows{
                      findInputPort(in.evaluated, 21) && findOutputPort(in.evaluated, 22) &&
                      inPortForTag(in.root, 1) && outPortForTag(in.evaluated, 1) &&
                      findIncomingConnectionToPort(in.root, 21);
-     }},
-    {"queries of an index", 0,
-     [](Inputs const& in, Kept& k) {
-         for (unsigned long long id = 0; id < 50; ++id) {
-             k.number += in.index.findPatch(id) || in.index.parentOf(id) ||
-                         in.index.findInputPort(id) || in.index.findOutputPort(id) ||
-                         in.index.ownerOfPort(id) || in.index.incomingConnection(id);
-             k.number += double(in.index.outgoingConnections(id).size() +
-                                in.index.incomingConnectionsToPatch(id).size() +
-                                in.index.outgoingConnectionsFromPatch(id).size());
-         }
      }},
     {"queries of an index of the evaluation form", 0,
      [](Inputs const& in, Kept& k) {

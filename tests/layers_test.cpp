@@ -43,10 +43,7 @@ TEST(ModelLayer, EqualsDeeplyInOrder) {
              Row{"order of children",
                  [](ModelLayer& layer) { std::swap(layer.children[0], layer.children[1]); }, false},
              Row{"fewer children", [](ModelLayer& layer) { layer.children.pop_back(); }, false},
-             Row{"grandchild",
-                 [](ModelLayer& layer) {
-                     layer.children[0].children.push_back({5, {}, {}});
-                 },
+             Row{"grandchild", [](ModelLayer& layer) { layer.children[0].children.resize(1); },
                  false},
              Row{"additional layer", [](ModelLayer& layer) { layer.additionalLayers[0].id = 5; },
                  false},

@@ -52,6 +52,10 @@ std::function<bool(Model const&, Patch const&)> const isUntouched = [](Model con
     return same;
 };
 
+// In the small graph.
+constexpr Connection kBack{3, 32, 2, 21};
+constexpr Connection kFurther{2, 22, 3, 33};
+
 }  // namespace
 
 TEST(PatchEdit, ChangesFieldsAndPorts) {
@@ -251,14 +255,10 @@ TEST(PatchEdit, RemovesConnectionsWithTheirEnds) {
                  [](auto& e) { return e.removeOutputPort(22); },
                  {{3, 32, 2, 21}, {2, 23, 3, 31}}},
              Row{"one",
-                 [](auto& e) {
-                     return e.disconnect({3, 32, 2, 21});
-                 },
+                 [](auto& e) { return e.disconnect(kBack); },
                  {{2, 22, 3, 31}, {2, 23, 3, 31}}},
              Row{"another input",
-                 [](auto& e) {
-                     return e.connect({2, 22, 3, 33});
-                 },
+                 [](auto& e) { return e.connect(kFurther); },
                  {{2, 22, 3, 31}, {3, 32, 2, 21}, {2, 23, 3, 31}, {2, 22, 3, 33}}},
          }) {
         SCOPED_TRACE(row.what);

@@ -56,6 +56,14 @@ Patch smallGraph() {
                      {port(11)}, {port(12)});
 }
 
+// How many things a query finds.
+std::size_t countOf(void const* found) { return found == nullptr ? 0 : 1; }
+std::size_t countOf(ConnectionView const& found) { return found.size(); }
+template <auto query>
+std::size_t ask(PatchIndex const& index, unsigned long long id) {
+    return countOf((index.*query)(id));
+}
+
 }  // namespace
 
 TEST(PatchIndexDeathTest, ANullListIsNamed) {
@@ -455,55 +463,20 @@ TEST(PatchIndex, QueriesAllocateNothing) {
     PatchIndex const index(smallGraph());
     struct Query {
         char const* name;
-        std::size_t (*ask)(PatchIndex const&, unsigned long long id);
         std::size_t found;  // In the small graph, of all identifiers together.
+        std::size_t (*ask)(PatchIndex const&, unsigned long long id);
     };
-    for (Query const &query : {
-             Query{"findPatch",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.findPatch(id) ? 1 : 0;
-                   },
-                   4},
-             Query{"parentOf",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.parentOf(id) ? 1 : 0;
-                   },
-                   3},
-             Query{"findInputPort",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.findInputPort(id) ? 1 : 0;
-                   },
-                   4},
-             Query{"findOutputPort",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.findOutputPort(id) ? 1 : 0;
-                   },
-                   4},
-             Query{"ownerOfPort",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.ownerOfPort(id) ? 1 : 0;
-                   },
-                   8},
-             Query{"incomingConnection",
-                   [](PatchIndex const&i, unsigned long long id) -> std::size_t {
-                       return i.incomingConnection(id) ? 1 : 0;
-                   },
-                   2},
-             Query{"outgoingConnections",
-                   [](PatchIndex const&i, unsigned long long id) {
-                       return i.outgoingConnections(id).size();
-                   },
-                   3},
-             Query{"incomingConnectionsToPatch",
-                   [](PatchIndex const&i, unsigned long long id) {
-                       return i.incomingConnectionsToPatch(id).size();
-                   },
-                   3},
-             Query{"outgoingConnectionsFromPatch",
-                   [](PatchIndex const&i, unsigned long long id) {
-                       return i.outgoingConnectionsFromPatch(id).size();
-                   },
-                   3},
+    for (Query const& query : {
+             Query{"findPatch", 4, ask<&PatchIndex::findPatch>},
+             Query{"parentOf", 3, ask<&PatchIndex::parentOf>},
+             Query{"findInputPort", 4, ask<&PatchIndex::findInputPort>},
+             Query{"findOutputPort", 4, ask<&PatchIndex::findOutputPort>},
+             Query{"ownerOfPort", 8, ask<&PatchIndex::ownerOfPort>},
+             Query{"incomingConnection", 2, ask<&PatchIndex::incomingConnection>},
+             Query{"outgoingConnections", 3, ask<&PatchIndex::outgoingConnections>},
+             Query{"incomingConnectionsToPatch", 3, ask<&PatchIndex::incomingConnectionsToPatch>},
+             Query{"outgoingConnectionsFromPatch", 3,
+                   ask<&PatchIndex::outgoingConnectionsFromPatch>},
          }) {
         SCOPED_TRACE(query.name);
         std::size_t found = 0;

@@ -26,6 +26,8 @@ namespace {
 
 using Set = std::unordered_set<Connection>;
 
+std::map<std::string, Unstructured> const kOtherKeys{{"A", 1}, {"b", "two"}};
+
 }  // namespace
 
 TEST(Records, HoldEmptyListsUntilGivenOthers) {
@@ -71,11 +73,7 @@ TEST(Port, EqualsFieldByField) {
              Row{"extra", [](Port& p) { p.typeInfo.extra = Value("mm"); }, false},
              Row{"default value", [](Port& p) { p.defaultValue = 2; }, false},
              Row{"attribute's value", [](Port& p) { p.attributes["a"] = 2; }, false},
-             Row{"attribute's key",
-                 [](Port& p) {
-                     p.attributes = {{"A", 1}, {"b", "two"}};
-                 },
-                 false},
+             Row{"attribute's key", [](Port& p) { p.attributes = kOtherKeys; }, false},
              Row{"another attribute", [](Port& p) { p.attributes["c"] = 3; }, false},
              Row{"order of insertion",
                  [](Port& p) {

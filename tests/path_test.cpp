@@ -39,6 +39,12 @@ PathElement curve(FloatVec2 a, FloatVec2 b, FloatVec2 p) {
 }
 PathElement closed() { return {PathInstruction::close, {}}; }
 
+// Arguments of shapes where it does not matter which.
+constexpr FloatVec2 kOrigin{0, 0};
+constexpr FloatVec2 kAside{1, 2};
+constexpr FloatVec2 kRadii{2, 1};
+constexpr FloatVec2 kSize{30, 40};
+
 }  // namespace
 
 TEST(PathInstruction, HasItsNumberAndItsName) {
@@ -382,26 +388,10 @@ TEST(PathShapes, TakeTheRoomTheyNeedAndTwiceThatWhenItIsMore) {
         std::size_t size;
     };
     for (Row const& row : {
-             Row{"ellipse",
-                 [](PathBuilder& b) {
-                     b.ellipse({0, 0}, {2, 1});
-                 },
-                 6},
-             Row{"circle",
-                 [](PathBuilder& b) {
-                     b.circle({0, 0}, 1);
-                 },
-                 6},
-             Row{"roundRect",
-                 [](PathBuilder& b) {
-                     b.roundRect({0, 0}, {4, 4}, 1);
-                 },
-                 10},
-             Row{"hexaRect",
-                 [](PathBuilder& b) {
-                     b.hexaRect({0, 0}, {4, 4}, 1);
-                 },
-                 9},
+             Row{"ellipse", [](PathBuilder& b) { b.ellipse(kOrigin, kRadii); }, 6},
+             Row{"circle", [](PathBuilder& b) { b.circle(kOrigin, 1); }, 6},
+             Row{"roundRect", [](PathBuilder& b) { b.roundRect(kOrigin, kSize, 1); }, 10},
+             Row{"hexaRect", [](PathBuilder& b) { b.hexaRect(kOrigin, kSize, 1); }, 9},
          }) {
         SCOPED_TRACE(row.what);
         PathBuilder builder;
@@ -573,31 +563,11 @@ TEST(PathBuilder, KeepsWhatAShapeAppendedBeforeAllocationFailed) {
         std::size_t elements;
     };
     for (Row const& row : {
-             Row{"arcTo",
-                 [](PathBuilder& b) {
-                     b.arcTo({9, 9}, true);
-                 },
-                 1},
-             Row{"ellipse",
-                 [](PathBuilder& b) {
-                     b.ellipse({1, 2}, {3, 4});
-                 },
-                 6},
-             Row{"circle",
-                 [](PathBuilder& b) {
-                     b.circle({1, 2}, 3);
-                 },
-                 6},
-             Row{"roundRect",
-                 [](PathBuilder& b) {
-                     b.roundRect({1, 2}, {30, 40}, 3);
-                 },
-                 10},
-             Row{"hexaRect",
-                 [](PathBuilder& b) {
-                     b.hexaRect({1, 2}, {30, 40}, 3);
-                 },
-                 9},
+             Row{"arcTo", [](PathBuilder& b) { b.arcTo(kAside, true); }, 1},
+             Row{"ellipse", [](PathBuilder& b) { b.ellipse(kAside, kRadii); }, 6},
+             Row{"circle", [](PathBuilder& b) { b.circle(kAside, 3); }, 6},
+             Row{"roundRect", [](PathBuilder& b) { b.roundRect(kAside, kSize, 3); }, 10},
+             Row{"hexaRect", [](PathBuilder& b) { b.hexaRect(kAside, kSize, 3); }, 9},
          }) {
         SCOPED_TRACE(row.what);
         PathBuilder whole;

@@ -61,6 +61,11 @@ struct ReadOnce {
     bool operator!=(ReadOnce const& other) const { return position != other.position; }
 };
 
+// Arguments where it does not matter which; the longer list is as `counted` makes it.
+constexpr FloatVec2 kPoint{1, 2};
+constexpr std::initializer_list<FloatVec2> kPair{{1, 2}, {3, 4}};
+constexpr std::initializer_list<FloatVec2> kList{{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}};
+
 }  // namespace
 
 TEST(Points, AreMadeLikeAVector) {
@@ -192,25 +197,13 @@ TEST(Points, GrowGeometricallyHoweverTheyAreAppended) {
     };
     std::vector<FloatVec2> const two = counted(2);
     Row const rows[] = {
-        {"push_back",
-         [](Points& points) {
-             points.push_back({1, 2});
-         }},
+        {"push_back", [](Points& points) { points.push_back(kPoint); }},
         {"emplace_back", [](Points& points) { points.emplace_back(1.0, 2.0); }},
-        {"insert of one",
-         [](Points& points) {
-             points.insert(points.end(), FloatVec2{1, 2});
-         }},
-        {"insert of copies",
-         [](Points& points) {
-             points.insert(points.end(), 2, {1, 2});
-         }},
+        {"insert of one", [](Points& points) { points.insert(points.end(), kPoint); }},
+        {"insert of copies", [](Points& points) { points.insert(points.end(), 2, kPoint); }},
         {"insert of a range",
          [&](Points& points) { points.insert(points.end(), two.begin(), two.end()); }},
-        {"insert of a list",
-         [](Points& points) {
-             points.insert(points.end(), {{1, 2}, {3, 4}});
-         }},
+        {"insert of a list", [](Points& points) { points.insert(points.end(), kPair); }},
         {"emplace", [](Points& points) { points.emplace(points.end(), 1.0, 2.0); }},
         {"resize", [](Points& points) { points.resize(points.size() + 1); }},
     };
@@ -236,21 +229,9 @@ TEST(Points, AreAssignedIntoTheRoomThereIs) {
         {"copy of few", [&](Points& points) { points = few; }, 2},
         {"copy of many", [&](Points& points) { points = many; }, 10},
         {"copy of as many as there is room for", [&](Points& points) { points = full; }, 20},
-        {"list",
-         [](Points& points) {
-             points = {{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}};
-         },
-         4},
-        {"assign a list",
-         [](Points& points) {
-             points.assign({{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}});
-         },
-         4},
-        {"assign equal points",
-         [](Points& points) {
-             points.assign(1, {0, 0});
-         },
-         1},
+        {"list", [](Points& points) { points = kList; }, 4},
+        {"assign a list", [](Points& points) { points.assign(kList); }, 4},
+        {"assign equal points", [](Points& points) { points.assign(1, FloatVec2()); }, 1},
         {"itself", [](Points& points) { points = *&points; }, 20},
         {"assign as many equal points as there is room for",
          [&](Points& points) {

@@ -9,6 +9,7 @@
 #include <Engine/Base/value.h>
 
 #include "support/graphs.h"
+#include "support/print.h"
 
 #include <gtest/gtest.h>
 

@@ -1,5 +1,6 @@
 #include <Engine/Base/vector_math.h>
 
+#include "support/print.h"
 #include "support/random.h"
 
 #include <gtest/gtest.h>

@@ -11,7 +11,7 @@ namespace tarn::engine {
 
 /// Writes one line to standard error and calls `abort()`, in every build type:
 /// `Assertion failed: (<condition>), function <function>, file <module>, line <line>.`
-/// `module` is the source file from the repository root, without its extension.
+/// `module` is the header that says so, from the repository root, without its extension.
 /// Allocates nothing. The arguments are never null.
 [[noreturn]] TARN_API void assertionFailed(char const* condition, char const* function,
                                            char const* module, int line) noexcept;

@@ -56,6 +56,10 @@ constexpr bool isNoValueSource =
     std::is_member_pointer_v<T> ||
     (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>) || becomesPointer<T>;
 
+// What data refuses to be made from, since it would be a number.
+template <class T>
+constexpr bool isNoDataSource = std::is_same_v<T, bool> || isCharacter<T>;
+
 }  // namespace tarn::engine::detail
 
 #endif

@@ -34,6 +34,17 @@ double exponentialIn(double t) {
 }
 double exponentialOut(double t) { return 1.0 - std::exp2(t * -kExponent); }
 
+// What the other curves take the way times: the falling half of the quadratic one, and those of
+// the sinusoidal ones but for the sign.
+double quadraticFalling(double v) { return (v - 2.0) * v - 1.0; }
+double sinusoidalIn(double t) { return std::cos(t * kHalfPi); }
+double sinusoidalInOut(double t) { return std::cos(t * kPi) - 1.0; }
+
+// That part of the way.
+auto part(double factor) {
+    return [=](double a, double delta) { return a + factor * delta; };
+}
+
 // b - a in 64 bits, wrapping around.
 long long difference(long long b, long long a) {
     return static_cast<long long>(static_cast<unsigned long long>(b) -
@@ -73,9 +84,7 @@ T exponentialInOut(T const& from, T const& to, double t) {
     double const u = 2.0 * t;
     if (u < 1.0) {
         if (u == 0.0) return from;
-        double const factor = exponentialIn(u);
-        return eachComponent(from, middle,
-                             [=](double a, double delta) { return a + factor * delta; });
+        return eachComponent(from, middle, part(exponentialIn(u)));
     }
     double const v = u - 1.0;
     if (v == 1.0) return to;
@@ -103,22 +112,14 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
             // Both halves are computed, so that many of them can be at once.
             double const v = u - 1.0;
             double const rising = u * u;
-            double const falling = (v - 2.0) * v - 1.0;
+            double const falling = quadraticFalling(v);
             double const factor = u < 1.0 ? rising : falling;
             double const half = u < 1.0 ? 0.5 : -0.5;
             return eachComponent(
                 from, to, [=](double a, double delta) { return a + factor * (delta * half); });
         }
-        case EasingFunction::CubicIn: {
-            double const factor = cube(t);
-            return eachComponent(from, to,
-                                 [=](double a, double delta) { return a + factor * delta; });
-        }
-        case EasingFunction::CubicOut: {
-            double const factor = cube(t - 1.0) + 1.0;
-            return eachComponent(from, to,
-                                 [=](double a, double delta) { return a + factor * delta; });
-        }
+        case EasingFunction::CubicIn: return eachComponent(from, to, part(cube(t)));
+        case EasingFunction::CubicOut: return eachComponent(from, to, part(cube(t - 1.0) + 1.0));
         case EasingFunction::CubicInOut: {
             double const factor = u < 1.0 ? cube(u) : cube(u - 2.0) + 2.0;
             return eachComponent(
@@ -126,9 +127,7 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
         }
         case EasingFunction::ExponentialIn: {
             if (t == 0.0) return from;
-            double const factor = exponentialIn(t);
-            return eachComponent(from, to,
-                                 [=](double a, double delta) { return a + factor * delta; });
+            return eachComponent(from, to, part(exponentialIn(t)));
         }
         case EasingFunction::ExponentialOut: {
             if (t == 1.0) return to;
@@ -139,17 +138,14 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
         }
         case EasingFunction::ExponentialInOut: return exponentialInOut(from, to, t);
         case EasingFunction::SinusoidalIn: {
-            double const factor = std::cos(t * kHalfPi);
+            double const factor = sinusoidalIn(t);
             return eachComponent(
                 from, to, [=](double a, double delta) { return a + (delta - factor * delta); });
         }
-        case EasingFunction::SinusoidalOut: {
-            double const factor = std::sin(t * kHalfPi);
-            return eachComponent(from, to,
-                                 [=](double a, double delta) { return a + factor * delta; });
-        }
+        case EasingFunction::SinusoidalOut:
+            return eachComponent(from, to, part(std::sin(t * kHalfPi)));
         case EasingFunction::SinusoidalInOut: {
-            double const factor = std::cos(t * kPi) - 1.0;
+            double const factor = sinusoidalInOut(t);
             return eachComponent(
                 from, to, [=](double a, double delta) { return a + factor * (delta * -0.5); });
         }
@@ -249,13 +245,13 @@ TARN_FLATTEN long long ease(EasingFunction function, long long from, long long t
         return detail::truncate<long long>((t - 2.0) * (back * t) + a);
     }
     if (function == EasingFunction::QuadraticInOut && !(u < 1.0)) {
-        return detail::truncate<long long>(a + ((v - 2.0) * v - 1.0) * (back * 0.5));
+        return detail::truncate<long long>(a + quadraticFalling(v) * (back * 0.5));
     }
     if (function == EasingFunction::SinusoidalIn) {
-        return detail::truncate<long long>(a + (delta + std::cos(t * kHalfPi) * back));
+        return detail::truncate<long long>(a + (delta + sinusoidalIn(t) * back));
     }
     if (function == EasingFunction::SinusoidalInOut) {
-        return detail::truncate<long long>(a + (std::cos(t * kPi) - 1.0) * (back * 0.5));
+        return detail::truncate<long long>(a + sinusoidalInOut(t) * (back * 0.5));
     }
     return easeAlong(function, from, to, t);
 }

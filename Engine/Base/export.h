@@ -6,12 +6,11 @@
 #ifndef TARN_ENGINE_BASE_EXPORT_H
 #define TARN_ENGINE_BASE_EXPORT_H
 
-/// `TARN_API` is put before every public function and every public member function
-/// that is compiled into the library. Everything without it stays inside.
+/// `TARN_API` is put before every public function and every public member function that is compiled
+/// into the library. Everything without it stays inside.
 ///
-/// `TARN_API_INLINE` is the same for public functions that headers define, so that
-/// callers compile them in place: the shared library has each of them too, for those who find
-/// functions by name.
+/// `TARN_API_INLINE` is the same for public functions that headers define, so that callers compile
+/// them in place: the shared library has each of them too, for those who find functions by name.
 ///
 /// `TARN_ENGINE_BASE_BUILDING` is defined by the library's own build and by nobody else,
 /// `TARN_ENGINE_BASE_STATIC` by that of a static library and by everyone who links it. The CMake

@@ -26,7 +26,7 @@ bool listsEqual(List const& a, List const& b, char const* condition) {
 // The list, once it is known not to be null. (Conversions recurse: this one is done before they go
 // on.)
 template <class T>
-Array<T> const& checked(Array<T> const& list, char const* condition) {
+Array<T> const& requireList(Array<T> const& list, char const* condition) {
     static_cast<void>(elementsOf(list, condition));
     return list;
 }
@@ -166,10 +166,10 @@ EvalPatch::EvalPatch() = default;
 EvalPatch::EvalPatch(Patch const& patch)
     : id(patch.id),
       builtin(patch.builtin),
-      inputs(map(toEvalPort, checked(patch.inputs, kInputs))),
-      outputs(map(toEvalPort, checked(patch.outputs, kOutputs))),
+      inputs(map(toEvalPort, requireList(patch.inputs, kInputs))),
+      outputs(map(toEvalPort, requireList(patch.outputs, kOutputs))),
       name(patch.name),
-      children(map(toEvalPatch, checked(patch.children, kChildren))),
+      children(map(toEvalPatch, requireList(patch.children, kChildren))),
       modelLayer(patch.modelLayer),
       hasInputCount(patch.attributes.count("inputCount") != 0),
       hasOutputCount(patch.attributes.count("outputCount") != 0) {}

@@ -214,26 +214,27 @@ template <class Function, class T>
 MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
                                                                           Array<T> const& list);
 
-// Queries. None fails: what is not there is null, an empty optional or an empty set. All are linear
-// in what they search and allocate for their sets alone.
+// Queries. None fails. All are linear in what they search, and allocate for their sets alone.
 
 /// The patch of this id in the whole subtree, `root` included; null for id 0, even where a patch
 /// carries it. Each level's children are all looked at before the first of them is entered; the
-/// first found in this order wins. The pointer refers into the lists of `root` (or is `root`
-/// itself), and lives as long as they do.
+/// first found in this order wins. Linear in what it looks at. The pointer refers into the lists of
+/// `root` (or is `root` itself), and lives as long as they do.
 TARN_API Patch const* findPatchRecursive(Patch const& root, unsigned long long id);
 TARN_API EvalPatch const* findPatchRecursive(EvalPatch const& root, unsigned long long id);
 
 /// The port of this id among the inputs (outputs) of the patch, then of its children in order; not
-/// of grandchildren. The pointer refers into the list that has the port, and lives as long.
+/// of grandchildren; null where there is none. The pointer refers into the list that has the port,
+/// and lives as long. Linear in the number of ports searched.
 TARN_API EvalPort const* findInputPort(EvalPatch const& patch, unsigned long long portId);
 TARN_API EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long long portId);
 
-/// The first of the patch's own connections that leads to the port.
+/// The first of the patch's own connections that leads to the port; empty where none does. Linear.
 TARN_API Optional<Connection> findIncomingConnectionToPort(Patch const& patch,
                                                            unsigned long long portId);
 
-/// Those of the patch's own connections that lead to (start from) the patch `patchId`.
+/// Those of the patch's own connections that lead to (start from) the patch `patchId`; an empty set
+/// where there are none. Linear.
 TARN_API std::unordered_set<Connection> findIncomingConnectionsToPatch(Patch const& patch,
                                                                        unsigned long long patchId);
 TARN_API std::unordered_set<Connection>
@@ -241,7 +242,7 @@ findOutgoingConnectionsFromPatch(Patch const& patch, unsigned long long patchId)
 
 /// The connections that start from the port, out of those of the first patch in the subtree with a
 /// child that has the port among its outputs; searched from `root`, depth first. Empty where
-/// that patch has none, and for a port of `root` itself.
+/// that patch has none, and for a port of `root` itself. Linear in the size of the subtree.
 TARN_API std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,
                                                                         unsigned long long portId);
 
@@ -249,16 +250,17 @@ TARN_API std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch co
 TARN_API Optional<std::unordered_set<Connection>>
 _findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
 
-/// The first input (output) of the patch with this tag; children are not searched. The pointer
-/// refers into the list of the patch, and lives as long.
+/// The first input (output) of the patch with this tag, or null; children are not searched. The
+/// pointer refers into the list of the patch, and lives as long. Linear in the number of its ports.
 TARN_API Port const* inPortForTag(Patch const& patch, unsigned long long tag);
 TARN_API EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long tag);
 TARN_API Port const* outPortForTag(Patch const& patch, unsigned long long tag);
 TARN_API EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag);
 
-// Debug text, for people; nothing reads it back. Numbers follow the stream's flags.
+// Debug text, for people; nothing reads it back.
 
-/// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line.
+/// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line. Numbers
+/// follow the stream's flags here and below.
 TARN_API std::ostream& operator<<(std::ostream& stream, Port const& port);
 
 /// "[connection:12->34]", the ids of the ports, without an end of line.

@@ -73,42 +73,14 @@ void PatchTables::lookAtIds() {
 void PatchTables::groupConnections() {
     std::vector<Member> members;
     findMembers(placesOfConnections(), members);
-    count(members);
+    ConnectionGroups::count(members);
     std::size_t end = 0;
     for (auto& record : graph.records) {
-        layOut(record.incoming, end);
-        layOut(record.outgoing, end);
+        ConnectionGroups::layOut(record.incoming, end);
+        ConnectionGroups::layOut(record.outgoing, end);
     }
-    for (auto& slot : graph.outputs) layOut(slot.link, end);
-    positions.assign(end, 0);
-    fill(members);
-}
-
-void PatchTables::count(std::vector<Member> const& members) {
-    for (std::size_t i = 0; i < members.size(); ++i) {
-        if (i + 4 * kAhead < members.size()) prefetch(members[i + 4 * kAhead].group);
-        std::uint32_t& group = *members[i].group;
-        group = group == kNone ? 1 : group + 1;
-    }
-}
-
-void PatchTables::layOut(std::uint32_t& group, std::size_t& end) const {
-    if (group == kNone) return;
-    std::size_t const start = end;
-    end += 1 + group;
-    requireCountable(end);
-    group = static_cast<std::uint32_t>(start);
-}
-
-void PatchTables::fill(std::vector<Member> const& members) {
-    for (std::size_t i = 0; i < members.size(); ++i) {
-        if (i + 4 * kAhead < members.size()) prefetch(members[i + 4 * kAhead].group);
-        if (i + 2 * kAhead < members.size()) {
-            prefetch(&positions[*members[i + 2 * kAhead].group]);
-        }
-        std::uint32_t& size = positions[*members[i].group];
-        positions[*members[i].group + ++size] = members[i].position;
-    }
+    for (auto& slot : graph.outputs) ConnectionGroups::layOut(slot.outgoing, end);
+    groups.fill(members, end);
 }
 
 std::vector<ConnectionPlace> PatchTables::placesOfConnections() const {
@@ -143,7 +115,7 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
     auto const isChild = [&](std::uint32_t record) {
         return record != kNone && graph.records[record].parent == place.parent;
     };
-    auto const add = [&](std::uint32_t& group) { members.push_back({&group, place.position}); };
+    auto const add = [&](ConnectionGroup& group) { members.push_back({&group, place.position}); };
 
     std::uint32_t const from = graph.recordOf(connection.fromPatchId);
     if (isChild(from)) add(graph.records[from].outgoing);
@@ -151,14 +123,14 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
     if (isChild(to)) add(graph.records[to].incoming);
 
     auto& output = graph.outputs.slotFor(connection.fromPortId);
-    if (isChild(innerOwner(output))) add(output.link);
+    if (isChild(innerOwner(output))) add(output.outgoing);
 
     auto& input = graph.inputs.slotFor(connection.toPortId);
     bool const isInput = hasUniqueIds && !input.isFree();
     std::uint32_t const owner = isInput ? input.owner : graph.ownerOfPort(connection.toPortId);
     if (!isChild(owner)) return;
     if (owner == input.owner) {
-        if (input.link == kNone) input.link = place.position;
+        if (input.incoming == kNone) input.incoming = place.position;
     } else {
         incomingToOutputs.emplace(connection.toPortId, place.position);
     }
@@ -166,7 +138,7 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
 
 // A search for outgoing connections leaves the root's own outputs out: where such an identifier
 // occurs further down too, that patch counts.
-std::uint32_t PatchTables::innerOwner(PortSlot<Port> const& output) {
+std::uint32_t PatchTables::innerOwner(OutputSlot<Port> const& output) {
     if (output.owner != 0) return output.owner;
     if (hasUniqueIds) return kNone;
     if (innerOwners.empty()) {
@@ -219,9 +191,9 @@ Patch const* PatchIndex::ownerOfPort(unsigned long long portId) const {
 
 ConnectionView PatchIndex::outgoingConnections(unsigned long long portId) const {
     auto const& output = tables->graph.outputs.slotFor(portId);
-    if (output.link == detail::kNone) return {};
+    if (!output.outgoing.exists()) return {};
     std::uint32_t const owner = output.owner != 0 ? output.owner : tables->innerOwners.at(portId);
-    return tables->view(tables->graph.records[owner].parent, output.link);
+    return tables->view(tables->graph.records[owner].parent, output.outgoing);
 }
 
 Connection const* PatchIndex::incomingConnection(unsigned long long portId) const {
@@ -229,7 +201,7 @@ Connection const* PatchIndex::incomingConnection(unsigned long long portId) cons
     std::uint32_t const owner = graph.ownerOfPort(portId);
     if (owner == detail::kNone || graph.records[owner].parent == detail::kNone) return nullptr;
     auto const& input = graph.inputs.slotFor(portId);
-    std::uint32_t position = input.link;
+    std::uint32_t position = input.incoming;
     if (owner != input.owner) {
         auto const known = tables->incomingToOutputs.find(portId);
         position = known == tables->incomingToOutputs.end() ? detail::kNone : known->second;

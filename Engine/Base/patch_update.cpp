@@ -31,7 +31,7 @@ public:
         : tables(updated), graph(updated.graph), next(newRoot) {}
 
     bool run() {
-        bool const isWasteful = tables.unusedPositions > tables.positions.size() / 2 + 1000 ||
+        bool const isWasteful = tables.groups.isWasteful() ||
                                 tables.freeRecords.size() > graph.records.size() / 2 + 1000;
         if (!tables.hasUniqueIds || !tables.incomingToOutputs.empty() || isWasteful) return false;
         if (next.id != tables.root.id || !startMarks()) return false;
@@ -193,8 +193,7 @@ private:
     // Identifiers stay unique.
     bool checkIds() const {
         Ids seen;
-        auto const isFree = [](HashTable<PortSlot<Port>> const& table, PortPlan const& plan,
-                               unsigned long long id) {
+        auto const isFree = [](auto const& table, PortPlan const& plan, unsigned long long id) {
             return table.slotFor(id).isFree() || plan.erased.count(id) != 0;
         };
         for (PortPlan const* const plan : {&inputs, &outputs}) {
@@ -229,9 +228,7 @@ private:
             appendOnce(*patch->connections, record, places);
         members.reserve(3 * places.size());
         // Three memberships each, and at worst a group for each of them.
-        std::size_t const further = 6 * places.size();
-        requireCountable(tables.positions.size() + further);
-        reserveFor(tables.positions, further);
+        tables.groups.reserveFor(6 * places.size());
     }
 
     void apply() noexcept {
@@ -240,7 +237,7 @@ private:
             graph.patches.erase(graph.records[record].patch->id);
         }
         for (unsigned long long const id : outputs.erased)
-            dropGroup(graph.outputs.slotFor(id).link);
+            tables.groups.drop(graph.outputs.slotFor(id).outgoing);
         applyErasures(graph.inputs, inputs);
         applyErasures(graph.outputs, outputs);
         for (Refresh const& now : refreshed) {
@@ -255,11 +252,13 @@ private:
         graph.records[0].patch = &tables.root;
     }
 
-    static void applyErasures(HashTable<PortSlot<Port>>& table, PortPlan const& plan) noexcept {
+    template <class Slot>
+    static void applyErasures(HashTable<Slot>& table, PortPlan const& plan) noexcept {
         for (unsigned long long const id : plan.erased) table.erase(id);
     }
 
-    void applyInsertions(HashTable<PortSlot<Port>>& table, PortPlan const& plan) noexcept {
+    template <class Slot>
+    void applyInsertions(HashTable<Slot>& table, PortPlan const& plan) noexcept {
         for (Port const* const port : plan.refreshed) table.slotFor(port->id).port = port;
         for (auto const& [port, owner] : plan.inserted) {
             table.insert({port->id, port, owner});
@@ -283,15 +282,11 @@ private:
     }
 
     void dropGroups(PatchRecord<Patch>& record, Array<Port> const& ports) noexcept {
-        dropGroup(record.incoming);
-        dropGroup(record.outgoing);
-        for (Port const& port : *ports) dropGroup(graph.outputs.slotFor(port.id).link);
-    }
-
-    void dropGroup(std::uint32_t& group) noexcept {
-        if (group == kNone) return;
-        tables.unusedPositions += 1 + tables.positions[group];
-        group = kNone;
+        tables.groups.drop(record.incoming);
+        tables.groups.drop(record.outgoing);
+        for (Port const& port : *ports) {
+            tables.groups.drop(graph.outputs.slotFor(port.id).outgoing);
+        }
     }
 
     template <class Function>
@@ -309,20 +304,21 @@ private:
     void groupConnections() noexcept {
         forEachRegrouped([this](PatchRecord<Patch>& record, Patch const& child) {
             dropGroups(record, child.outputs);
-            for (Port const& port : *child.inputs) graph.inputs.slotFor(port.id).link = kNone;
-        });
-        for (ConnectionPlace const& place : places) tables.addMembers(place, members);
-        PatchTables::count(members);
-        std::size_t end = tables.positions.size();
-        forEachRegrouped([this, &end](PatchRecord<Patch>& record, Patch const& child) {
-            tables.layOut(record.incoming, end);
-            tables.layOut(record.outgoing, end);
-            for (Port const& port : *child.outputs) {
-                tables.layOut(graph.outputs.slotFor(port.id).link, end);
+            for (Port const& port : *child.inputs) {
+                graph.inputs.slotFor(port.id).incoming = kNone;
             }
         });
-        tables.positions.resize(end);
-        tables.fill(members);
+        for (ConnectionPlace const& place : places) tables.addMembers(place, members);
+        ConnectionGroups::count(members);
+        std::size_t end = tables.groups.end();
+        forEachRegrouped([this, &end](PatchRecord<Patch>& record, Patch const& child) {
+            ConnectionGroups::layOut(record.incoming, end);
+            ConnectionGroups::layOut(record.outgoing, end);
+            for (Port const& port : *child.outputs) {
+                ConnectionGroups::layOut(graph.outputs.slotFor(port.id).outgoing, end);
+            }
+        });
+        tables.groups.fill(members, end);
     }
 
     PatchTables& tables;

@@ -110,9 +110,9 @@ public:
 
     // Closed outlines.
 
-    /// `radii` are half the width and half the height, not checked; negative ones turn the outline
-    /// over. Starts at the largest x and runs through the largest y. Afterwards the current point
-    /// is that start.
+    /// `radii` are half the width and half the height, `radius` is both; not checked, negative ones
+    /// turn the outline over. Starts at the largest x and runs through the largest y. Afterwards
+    /// the current point is that start.
     TARN_API PathBuilder& ellipse(FloatVec2 center, FloatVec2 radii);
     TARN_API PathBuilder& circle(FloatVec2 center, double radius);
     /// `origin` is the corner of smallest x and y. `size` is not checked; a negative one turns the

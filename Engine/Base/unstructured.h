@@ -120,9 +120,7 @@ public:
     /// As `value.asUnstructured()`.
     TARN_API Unstructured(Value const& value);
 
-    template <
-        class Source,
-        std::enable_if_t<std::is_same_v<Source, bool> || detail::isCharacter<Source>, int> = 0>
+    template <class Source, std::enable_if_t<detail::isNoDataSource<Source>, int> = 0>
     Unstructured(Source) = delete;
     Unstructured(std::nullptr_t) = delete;
 

@@ -376,11 +376,11 @@ namespace tarn::engine {
 
 /// The text that an editor shows; not made to be read back. Numbers have two decimals, or one from
 /// 1000 on, without trailing zeros: 2.5, 1234.6, 3; or they are "nan" or "inf", behind "-" where
-/// the sign is set. They are rounded as the rounding mode says, and cut after
-/// 127 characters. Components of a vector are joined
-/// by ", ", and a matrix is four lines of four. Truth is "1" or "0", an identifier its number, a
-/// path "Path" or "Empty Path", data "unstructured" unless it is a string. The decimal point that
-/// is trimmed is that of `std::cout`'s locale at the call; nobody may change that locale meanwhile.
+/// the sign is set. They are rounded as the rounding mode says, and cut after 127 characters.
+/// Components of a vector are joined by ", ", and a matrix is four lines of four. Truth is "1" or
+/// "0", an identifier its number, a path "Path" or "Empty Path", data "unstructured" unless it is a
+/// string. The decimal point that is trimmed is that of `std::cout`'s locale at the call; nobody
+/// may change that locale meanwhile.
 TARN_API std::string to_string(Value const& value);
 
 /// Appends `to_string(value)` to `text`. Numbers and vectors of them need no string of their own:

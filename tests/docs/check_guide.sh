@@ -33,7 +33,7 @@ done
 [ "$programs" -ge 9 ]
 
 headers=0
-for header in "$root"/examples/*/*.h; do
+for header in "$root"/examples/*.h "$root"/examples/*/*.h; do
     name=${header#"$root/examples/"}
     {
         printf '#include "%s"\n#include <Engine/Base/base.h>\n#include <Engine/Document/document.h>\n' "$name"

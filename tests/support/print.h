@@ -111,6 +111,22 @@ inline void PrintTo(Value const& value, std::ostream* stream) {
     value.visit(tests::ContentPrinter{stream});
 }
 
+inline void PrintTo(Optional<Value> const& value, std::ostream* stream) {
+    if (value) {
+        PrintTo(*value, stream);
+    } else {
+        *stream << "nothing";
+    }
+}
+
+inline void PrintTo(TypeInfo const& info, std::ostream* stream) {
+    *stream << info.type << ", subtype " << int(info.subtype);
+    for (Optional<Value> const* bound : {&info.min, &info.max, &info.extra}) {
+        *stream << ", ";
+        PrintTo(*bound, stream);
+    }
+}
+
 }  // namespace tarn::engine
 
 #endif

@@ -1,5 +1,4 @@
-// Engine/Base/detail/hash_table.h: slots by 64-bit keys, whatever keys a document chooses. Not
-// installed.
+// Engine/Base/detail/hash_table.h: slots by 64-bit keys, whatever keys a document chooses.
 //
 //     HashTable<Slot> table(slots);
 //     if (!table.slotFor(id).isFree()) { use(table.slotFor(id)); }

@@ -1,4 +1,4 @@
-// Engine/Base/detail/immortal.h: a static that nobody outlives. Not installed.
+// Engine/Base/detail/immortal.h: a static that nobody outlives.
 //
 //     static Immortal<std::string> const text(std::string("-0"));
 //     return text.value;

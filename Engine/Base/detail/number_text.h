@@ -14,6 +14,7 @@ namespace tarn::engine::detail {
 /// that end it. What is no finite number is "nan" or "inf" behind its sign, on every platform.
 void appendNumber(std::string& text, double number);
 
+/// All its digits, behind a sign where it is negative.
 void appendInteger(std::string& text, std::uint64_t magnitude, bool isNegative);
 
 }  // namespace tarn::engine::detail

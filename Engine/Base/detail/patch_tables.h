@@ -1,8 +1,9 @@
-// Engine/Base/detail/patch_tables.h: what the indexes of graphs know. Not installed.
+// Engine/Base/detail/patch_tables.h: what the indexes of graphs know.
 
 #ifndef TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
 #define TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
 
+#include <Engine/Base/detail/connection_groups.h>
 #include <Engine/Base/detail/hash_table.h>
 #include <Engine/Base/patch.h>
 #include <Engine/Base/patch_index.h>
@@ -21,13 +22,21 @@ struct PatchSlot {
 };
 
 template <class AnyPort>
-struct PortSlot {
+struct InputSlot {
     std::uint64_t key = 0;
     AnyPort const* port = nullptr;
     std::uint32_t owner = kNone;
-    /// For an input the position of its incoming connection, for an output its group of outgoing
-    /// ones; `kNone` where there is none.
-    std::uint32_t link = kNone;
+    /// The position of the connection that leads to it, or `kNone`.
+    std::uint32_t incoming = kNone;
+    bool isFree() const { return port == nullptr; }
+};
+
+template <class AnyPort>
+struct OutputSlot {
+    std::uint64_t key = 0;
+    AnyPort const* port = nullptr;
+    std::uint32_t owner = kNone;
+    ConnectionGroup outgoing = {};
     bool isFree() const { return port == nullptr; }
 };
 
@@ -36,9 +45,8 @@ struct PatchRecord {
     /// Null for a record that is free.
     AnyPatch const* patch = nullptr;
     std::uint32_t parent = kNone;
-    /// Groups of connections to and from the patch; `kNone` where there are none.
-    std::uint32_t incoming = kNone;
-    std::uint32_t outgoing = kNone;
+    ConnectionGroup incoming = {};
+    ConnectionGroup outgoing = {};
     /// What the last updates have seen of it.
     std::uint32_t mark = 0;
 };
@@ -64,8 +72,8 @@ struct Graph {
     explicit Graph(AnyPatch const& root)
         : records(inSearchOrder(root)),
           patches(patchSlots()),
-          inputs(portSlots(&AnyPatch::inputs)),
-          outputs(portSlots(&AnyPatch::outputs), inputs.hashFunction()) {}
+          inputs(portSlots<InputSlot<AnyPort>>(&AnyPatch::inputs)),
+          outputs(portSlots<OutputSlot<AnyPort>>(&AnyPatch::outputs), inputs.hashFunction()) {}
 
     static std::vector<PatchRecord<AnyPatch>> inSearchOrder(AnyPatch const& root) {
         requireLists(root);
@@ -97,10 +105,10 @@ struct Graph {
         return slots;
     }
 
-    template <class List>
-    std::vector<PortSlot<AnyPort>> portSlots(List AnyPatch::*ports) {
+    template <class Slot, class List>
+    std::vector<Slot> portSlots(List AnyPatch::*ports) {
         auto const listOf = [&](std::size_t i) { return (records[i].patch->*ports).get(); };
-        std::vector<PortSlot<AnyPort>> slots;
+        std::vector<Slot> slots;
         slots.reserve(records.size());
         for (std::uint32_t i = 0; i < records.size(); ++i) {
             if (i + 2 * kAhead < records.size()) detail::prefetch(listOf(i + 2 * kAhead));
@@ -135,8 +143,8 @@ struct Graph {
     std::vector<PatchRecord<AnyPatch>> records;
     HashTable<PatchSlot> patches;
     std::size_t portCount = 0;  // Repeated ones included.
-    HashTable<PortSlot<AnyPort>> inputs;
-    HashTable<PortSlot<AnyPort>> outputs;
+    HashTable<InputSlot<AnyPort>> inputs;
+    HashTable<OutputSlot<AnyPort>> outputs;
 };
 
 /// A connection, and where it stands.
@@ -169,20 +177,14 @@ struct PatchTables {
     }
 
     /// The connections of a group in the list of `parent`.
-    ConnectionView view(std::uint32_t parent, std::uint32_t group) const {
-        if (group == kNone) return {};
-        std::vector<Connection> const& list = *graph.records[parent].patch->connections;
-        return {list.data(), &positions[group] + 1, positions[group]};
+    ConnectionView view(std::uint32_t parent, ConnectionGroup group) const {
+        if (!group.exists()) return {};
+        return groups.view(*graph.records[parent].patch->connections, group);
     }
 
     Patch root;
     Graph<Patch, Port> graph;
-    /// Groups of connections behind one another: how many there are, then their positions in the
-    /// list of their parent.
-    std::vector<std::uint32_t> positions;
-    /// How many of the positions are of groups that are no longer there, and which records are
-    /// free.
-    std::size_t unusedPositions = 0;
+    ConnectionGroups groups;
     std::vector<std::uint32_t> freeRecords;
     /// Whether every patch but the root has an identifier of its own that is not 0, and every port
     /// one that no other has. Then no answer depends on an order.
@@ -200,24 +202,14 @@ struct PatchTables {
 private:
     friend class PatchUpdate;
 
-    /// A connection's membership in a group.
-    struct Member {
-        std::uint32_t* group;
-        std::uint32_t position;
-    };
+    using Member = ConnectionGroups::Member;
 
     void lookAtIds();
     void groupConnections();
     std::vector<ConnectionPlace> placesOfConnections() const;
     void findMembers(std::vector<ConnectionPlace> const& places, std::vector<Member>& members);
     void addMembers(ConnectionPlace const& place, std::vector<Member>& members);
-    std::uint32_t innerOwner(PortSlot<Port> const& output);
-
-    // The three passes over groups: how large each is, where each begins, and what is in it.
-    static void count(std::vector<Member> const& members);
-    // A group of that size gets its place.
-    void layOut(std::uint32_t& group, std::size_t& end) const;
-    void fill(std::vector<Member> const& members);
+    std::uint32_t innerOwner(OutputSlot<Port> const& output);
 };
 
 }  // namespace tarn::engine::detail

@@ -1,4 +1,4 @@
-// Engine/Base/detail/prefetch.h: a word to the processor about what comes next. Not installed.
+// Engine/Base/detail/prefetch.h: a word to the processor about what comes next.
 //
 //     prefetch(&list[i + 6]);
 

@@ -1,4 +1,4 @@
-// Engine/Base/detail/radix_point.h: the C library's decimal point. Not installed.
+// Engine/Base/detail/radix_point.h: the C library's decimal point.
 //
 //     RadixPoint const radix;
 //     bool plain = radix.text[0] == '.' && radix.text[1] == '\0';

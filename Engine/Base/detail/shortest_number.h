@@ -1,4 +1,4 @@
-// Engine/Base/detail/shortest_number.h: numbers as short as they can be written. Not installed.
+// Engine/Base/detail/shortest_number.h: numbers as short as they can be written.
 //
 //     std::string text = "r=";
 //     appendShortest(text, 0.1);  // "r=0.1"

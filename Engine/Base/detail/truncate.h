@@ -1,5 +1,4 @@
-// Engine/Base/detail/truncate.h: from doubles to integers without undefined behaviour. Not
-// installed.
+// Engine/Base/detail/truncate.h: from doubles to integers without undefined behaviour.
 //
 //     long long i = truncate<long long>(-2.9);  // -2
 

@@ -1,4 +1,4 @@
-// Engine/Base/detail/utf8.h: the characters of a text. Not installed.
+// Engine/Base/detail/utf8.h: the characters of a text.
 //
 //     if (utf8Length(text) == 0) text.remove_prefix(1);  // A byte that begins none.
 

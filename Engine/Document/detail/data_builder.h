@@ -1,4 +1,4 @@
-// Engine/Document/detail/data_builder.h: data from the events of a JSON text. Not installed.
+// Engine/Document/detail/data_builder.h: data from the events of a JSON text.
 //
 //     DataBuilder builder(DataBuilder::Strictness::Lenient);
 //     builder.open(false), builder.add(1), builder.close();

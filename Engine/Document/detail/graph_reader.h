@@ -1,4 +1,4 @@
-// Engine/Document/detail/graph_reader.h: reads graphs of browser-based node editors. Not installed.
+// Engine/Document/detail/graph_reader.h: reads graphs of browser-based node editors.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_GRAPH_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_GRAPH_READER_H

@@ -1,5 +1,4 @@
 // Engine/Document/detail/identifiers.h: whether each identifier of a graph stands for one thing.
-// Not installed.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_IDENTIFIERS_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_IDENTIFIERS_H

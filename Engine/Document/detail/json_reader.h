@@ -1,5 +1,5 @@
 // Engine/Document/detail/json_reader.h: what readers of documents share: the events of a JSON text,
-// and where they come from. Not installed.
+// and where they come from.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_JSON_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_JSON_READER_H

@@ -1,5 +1,4 @@
-// Engine/Document/detail/kinds.h: the built-in kinds that have a part in the form of documents. Not
-// installed.
+// Engine/Document/detail/kinds.h: the built-in kinds that have a part in the form of documents.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_KINDS_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_KINDS_H

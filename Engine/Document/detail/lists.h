@@ -1,5 +1,4 @@
-// Engine/Document/detail/lists.h: lists of records that are read one after the other. Not
-// installed.
+// Engine/Document/detail/lists.h: lists of records that are read one after the other.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H

@@ -1,5 +1,5 @@
 // Engine/Document/detail/node_graph.h: a graph as browser-based node editors export it, and the
-// patches that it becomes. Not installed.
+// patches that it becomes.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H

@@ -1,4 +1,4 @@
-// Engine/Document/detail/own_reader.h: reads documents of our own form. Not installed.
+// Engine/Document/detail/own_reader.h: reads documents of our own form.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_OWN_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_OWN_READER_H

@@ -1,5 +1,5 @@
 // Engine/Document/detail/texts.h: what documents have for texts and numbers that JSON cannot
-// express. Not installed.
+// express.
 //
 //     std::string name = "\x1a" "ff";
 //     bool isRight = decodeText(name);  // The byte 0xff.

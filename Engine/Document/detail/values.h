@@ -1,4 +1,4 @@
-// Engine/Document/detail/values.h: the values of ports from their form in documents. Not installed.
+// Engine/Document/detail/values.h: the values of ports from their form in documents.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_VALUES_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_VALUES_H
