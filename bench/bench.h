@@ -1,9 +1,8 @@
 // bench/bench.h: operations, done by us and by each of our peers, every one in a process of its
 // own.
 //
-//     operation("copy numbers").ours(on(numbers<Value>, copy)).peer("QVariant",
-//     on(numbers<QVariant>, copy))
-//         .atMost(1.15);
+//     operation("copy numbers").ours(on(numbers<Value>, copy)).peer("std::any",
+//     twins).atMost(1.15);
 
 #ifndef TARN_BENCH_BENCH_H
 #define TARN_BENCH_BENCH_H

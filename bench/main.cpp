@@ -84,6 +84,8 @@ void requireKnownPeers() {
         bool isKnown = operation.comparedWith.empty();
         for (auto const& entry : operation.entries) isKnown |= entry.who == operation.comparedWith;
         agree(isKnown, ("the peer to compare with: " + operation.name).c_str());
+        // A target of an operation that is not there makes an empty one.
+        agree(!operation.entries.empty(), ("what is done: " + operation.name).c_str());
     }
 }
 

@@ -10,7 +10,19 @@ namespace {
 
 constexpr std::size_t kDeepest = 1000;
 
-// What the library carries and this program does not show.
+Document requireUsable(Optional<Patch> root, DocumentInfo info, DocumentError const& error) {
+    if (!root) {
+        std::ostringstream line;
+        line << error;
+        throw InputError(line.str());
+    }
+    refuseWhatIsNotShown(*root);
+    return {std::move(*root), std::move(info)};
+}
+
+}  // namespace
+
+// Without recursion: how deep the graph is, is what is asked here.
 void refuseWhatIsNotShown(Patch const& root) {
     std::vector<std::pair<Patch const*, std::size_t>> pending{{&root, 1}};
     while (!pending.empty()) {
@@ -29,30 +41,18 @@ void refuseWhatIsNotShown(Patch const& root) {
     }
 }
 
-Document checked(Optional<Patch> root, DocumentInfo info, DocumentError const& error) {
-    if (!root) {
-        std::ostringstream line;
-        line << error;
-        throw InputError(line.str());
-    }
-    refuseWhatIsNotShown(*root);
-    return {std::move(*root), std::move(info)};
-}
-
-}  // namespace
-
 Document openDocument(std::string const& fileName) {
     DocumentError error;
     DocumentInfo info;
     Optional<Patch> root = loadDocument(fileName, &error, &info);
-    return checked(std::move(root), std::move(info), error);
+    return requireUsable(std::move(root), std::move(info), error);
 }
 
 Document parseDocument(std::string const& text) {
     DocumentError error;
     DocumentInfo info;
     Optional<Patch> root = readDocument(text, &error, &info);
-    return checked(std::move(root), std::move(info), error);
+    return requireUsable(std::move(root), std::move(info), error);
 }
 
 std::string jsonText(Json const& json) {

@@ -25,8 +25,11 @@ struct Document {
     tarn::engine::DocumentInfo info;
 };
 
-// Throws an InputError for what cannot be used: also for graphs of more than a thousand levels,
-// over which the program recurses, and of ports without a type.
+// Throws an InputError for what the library carries and this program does not show: more than a
+// thousand levels, over which it recurses, and ports without a type.
+void refuseWhatIsNotShown(tarn::engine::Patch const& root);
+
+// Throws an InputError for what cannot be used, or is not shown.
 Document openDocument(std::string const& fileName);
 Document parseDocument(std::string const& text);
 

@@ -2,6 +2,8 @@
 
 #include "animation/kinds.h"
 
+#include <Engine/Base/patch_index.h>
+
 #include <algorithm>
 #include <map>
 #include <set>
@@ -14,34 +16,53 @@ namespace {
 // Wider lists of columns are no help to a reader.
 constexpr std::size_t kMostColumns = 12;
 
-void visitFrom(Patch const& patch, std::size_t level,
-               std::function<void(Patch const&, std::size_t)> const& visit) {
-    visit(patch, level);
-    for (Patch const& child : *patch.children) visitFrom(child, level + 1, visit);
-}
+// Of the bytes of a character in UTF-8, one behind the first.
+bool isContinuation(char byte) { return (static_cast<unsigned char>(byte) & 0xc0) == 0x80; }
 
 }  // namespace
-
-void forEachPatch(Patch const& root,
-                  std::function<void(Patch const& patch, std::size_t level)> const& visit) {
-    visitFrom(root, 1, visit);
-}
 
 std::string cutToBytes(std::string text, std::size_t longest) {
     if (text.size() <= longest) return text;
     std::size_t end = longest - 3;
-    while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xc0) == 0x80) --end;
+    while (end > 0 && isContinuation(text[end])) --end;
     return text.substr(0, end) + "...";
+}
+
+std::size_t columnsOf(std::string const& text) {
+    std::size_t columns = 0;
+    for (char const c : text) {
+        if (isContinuation(c)) continue;
+        columns += static_cast<unsigned char>(c) < 0xe0
+                       ? 1
+                       : 2;  // East Asian letters, of three bytes and more, are wide.
+    }
+    return columns;
+}
+
+std::string shortened(std::string const& text, std::size_t longest) {
+    if (columnsOf(text) <= longest) return text;
+    std::string result;
+    std::size_t columns = 0;
+    for (std::size_t i = 0; i < text.size();) {
+        std::size_t end = i + 1;
+        while (end < text.size() && isContinuation(text[end])) ++end;
+        std::string const character = text.substr(i, end - i);
+        columns += columnsOf(character);
+        if (columns >= longest) break;
+        result += character;
+        i = end;
+    }
+    return result + "\u2026";
 }
 
 std::vector<ShownOutput> shownOutputs(Document const& document, EvalPatch const& root) {
     std::vector<ShownOutput> result;
     for (EvalPort const& output : *root.outputs) result.push_back({output.name, &output});
     if (!result.empty()) return result;
+    PatchIndex const index(document.root);
     for (EvalPatch const& child : *root.children) {
         for (EvalPort const& output : *child.outputs) {
-            bool const connected =
-                !findOutgoingConnectionsFromPort(document.root, output.id).empty();
+            bool const connected = !index.outgoingConnections(output.id).empty();
             if (connected || result.size() == kMostColumns) continue;
             result.push_back({std::to_string(child.id) + " " + output.name, &output});
         }

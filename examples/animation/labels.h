@@ -10,14 +10,15 @@
 #include <Engine/Base/patch.h>
 
 #include <cstddef>
-#include <functional>
 #include <string>
 #include <vector>
 
-// Every patch with its level, which is 1 for the root, each before its children.
-void forEachPatch(
-    tarn::engine::Patch const& root,
-    std::function<void(tarn::engine::Patch const& patch, std::size_t level)> const& visit);
+// Calls `visit(patch, level)` for every patch, each before its children; the root's level is 1.
+template <class AnyPatch, class Visit>
+void forEachPatch(AnyPatch const& root, Visit const& visit, std::size_t level = 1) {
+    visit(root, level);
+    for (AnyPatch const& child : *root.children) forEachPatch(child, visit, level + 1);
+}
 
 // A column of a table takes no more bytes.
 constexpr std::size_t kWidestCell = 40;
@@ -26,6 +27,10 @@ constexpr std::size_t kLongestText = 1000;
 
 // The string, cut between two characters and ended with "..." where it has more bytes.
 std::string cutToBytes(std::string text, std::size_t longest = kWidestCell);
+// The same by columns of a fixed-width face, with an ellipsis.
+std::string shortened(std::string const& text, std::size_t longest);
+// How many of them the string takes.
+std::size_t columnsOf(std::string const& text);
 
 // An output whose values are shown.
 struct ShownOutput {

@@ -84,3 +84,5 @@ std::string Element::markup() const {
     if (!hasContent) return start + "/>";
     return start + ">" + content + "</" + name + ">";
 }
+
+std::string paragraph(std::string const& text) { return Element("p").text(text).markup() + "\n"; }

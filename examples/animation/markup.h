@@ -1,7 +1,7 @@
 // SVG and HTML: elements, and numbers, paths and characters as they take them.
 //
 //     Path const circle = PathBuilder().circle({0, 0}, 5.0).build();
-//     std::cout << Element("path").set("class", "outline").set("d", pathData(circle)).markup();
+//     std::cout << Element("path").set("d", pathData(circle)).markup();
 
 #ifndef ANIMATION_MARKUP_H
 #define ANIMATION_MARKUP_H
@@ -26,8 +26,7 @@ std::string escaped(std::string const& text);
 
 // An element with its attributes and its content, in the order in which they are given.
 //
-//     Element("a").set("href", "#top").text("Up & away").markup();  // <a href="#top">Up &amp;
-//     away</a>
+//     Element("a").set("href", "#b").text("A & B").markup();  // <a href="#b">A &amp; B</a>
 class Element {
 public:
     explicit Element(std::string const& elementName)
@@ -60,5 +59,8 @@ private:
     std::string content;
     bool hasContent = false;
 };
+
+// A paragraph on a line of its own.
+std::string paragraph(std::string const& text);
 
 #endif

@@ -12,12 +12,9 @@ Scene::Scene(Document const& document, EvalPatch const& root) {
     for (ShownOutput const& output : shownOutputs(document, root)) {
         if (output.port->typeInfo.type == Type::Path) paths.push_back(output);
     }
-    findLayers(root);
-}
-
-void Scene::findLayers(EvalPatch const& patch) {
-    if (patch.builtin == kLayerKind) layers.push_back(&patch);
-    for (EvalPatch const& child : *patch.children) findLayers(child);
+    forEachPatch(root, [&](EvalPatch const& patch, std::size_t) {
+        if (patch.builtin == kLayerKind) layers.push_back(&patch);
+    });
 }
 
 std::vector<Drawn> Scene::now() const {

@@ -37,8 +37,6 @@ public:
     std::vector<Drawn> now() const;
 
 private:
-    void findLayers(tarn::engine::EvalPatch const& patch);
-
     std::vector<ShownOutput> paths;
     std::vector<tarn::engine::EvalPatch const*> layers;
 };

@@ -214,7 +214,7 @@ std::string Drawing::box(Box const& box) const {
     return drawn.markup() + "\n";
 }
 
-std::string Drawing::graph(Level const& level, std::string const& attributes) const {
+std::string Drawing::graph(Level const& level, std::string const& label) const {
     std::unordered_map<unsigned long long, Anchor> outputs;
     std::unordered_map<unsigned long long, Anchor> inputs;
     for (Box const& drawn : level.boxes) {
@@ -247,9 +247,11 @@ std::string Drawing::graph(Level const& level, std::string const& attributes) co
         }
     }
     Element picture("svg");
-    picture.set("class", "graph")
-        .setMarkup(attributes)
-        .set("width", level.width)
+    picture.set("class", "graph");
+    if (!label.empty()) {
+        picture.set("role", "group").set("aria-label", label).set("aria-describedby", "graph-keys");
+    }
+    picture.set("width", level.width)
         .set("height", level.height)
         .setView(0, 0, level.width, level.height)
         .add("\n")
@@ -297,7 +299,7 @@ std::string pictureText(Document const& document, long long frame) {
         .add("\n")
         .add(Element("rect").set("class", "paper").set("width", level.width).set("height", height))
         .add("\n")
-        .add(Drawing(document.root).graph(level, ""));
+        .add(Drawing(document.root).graph(level));
     if (isDrawn) {
         Element stage("rect");
         stage.set("class", "stage")

@@ -1,7 +1,7 @@
 // Graphs and scenes as SVG.
 //
 //     Drawing drawing(document.root);
-//     std::string const svg = drawing.graph(layOut(document.root).front(), "");
+//     std::string const svg = drawing.graph(layOut(document.root).front());
 
 #ifndef REPORT_DRAWING_H
 #define REPORT_DRAWING_H
@@ -40,9 +40,9 @@ public:
     explicit Drawing(tarn::engine::Patch const& root, Marks const* changes = nullptr)
         : index(root), marks(changes) {}
 
-    // One level: boxes with their ports, and the connections between them. `attributes` go into the
-    // opening tag.
-    std::string graph(Level const& level, std::string const& attributes) const;
+    // One level: boxes with their ports, and the connections between them. `label` names it for
+    // screen readers, where the page has the keys that it can be used with.
+    std::string graph(Level const& level, std::string const& label = "") const;
 
     // What there is to say of a patch or port, in parts: the first is its name.
     std::vector<std::string> describe(tarn::engine::Patch const& patch) const;

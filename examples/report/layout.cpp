@@ -204,32 +204,6 @@ void placeAll(std::vector<Level*> const& levels) {
 
 }  // namespace
 
-std::size_t columnsOf(std::string const& text) {
-    std::size_t columns = 0;
-    for (char const c : text) {
-        auto const byte = static_cast<unsigned char>(c);
-        if ((byte & 0xc0) == 0x80) continue;
-        columns += byte < 0xe0 ? 1 : 2;  // East Asian letters, of three bytes and more, are wide.
-    }
-    return columns;
-}
-
-std::string shortened(std::string const& text, std::size_t longest) {
-    if (columnsOf(text) <= longest) return text;
-    std::string result;
-    std::size_t columns = 0;
-    for (std::size_t i = 0; i < text.size();) {
-        std::size_t end = i + 1;
-        while (end < text.size() && (static_cast<unsigned char>(text[end]) & 0xc0) == 0x80) ++end;
-        std::string const character = text.substr(i, end - i);
-        columns += columnsOf(character);
-        if (columns >= longest) break;
-        result += character;
-        i = end;
-    }
-    return result + "\u2026";
-}
-
 std::string headingOf(Patch const& patch) { return shortened(nameOf(patch), kLongestLabel); }
 
 std::string labelOf(Port const& port) {

@@ -41,11 +41,6 @@ constexpr double kRowHeight = 18.0;
 constexpr double kCharacterWidth = 6.65;  // Of the fixed-width face at 11 pixels.
 constexpr std::size_t kLongestLabel = 32;
 
-// The text of at most `longest` characters, cut with an ellipsis.
-std::string shortened(std::string const& text, std::size_t longest);
-// How many columns a fixed-width face takes for it.
-std::size_t columnsOf(std::string const& text);
-
 // What a patch is called where it is drawn: its name, cut to `kLongestLabel`.
 std::string headingOf(tarn::engine::Patch const& patch);
 // "radius Number".

@@ -6,8 +6,8 @@
 #include "report/film.h"
 #include "report/plots.h"
 #include "report/sections.h"
+#include "report/template.h"
 
-#include <map>
 #include <sstream>
 
 using namespace tarn::engine;
@@ -17,7 +17,7 @@ namespace {
 std::string paragraphs(std::string const& lines) {
     std::istringstream stream(lines);
     std::string text;
-    for (std::string line; std::getline(stream, line);) text += "<p>" + escaped(line) + "</p>\n";
+    for (std::string line; std::getline(stream, line);) text += paragraph(line);
     return text;
 }
 
@@ -40,27 +40,6 @@ std::string dataText(Film const& film, Document const& document) {
     std::string text;
     for (char const c : json) text += c == '<' ? std::string("\\u003c") : std::string(1, c);
     return text;
-}
-
-// The template with its {{NAMES}} filled in; what is from {{#NAME}} to {{/NAME}} stays where that
-// part is not empty.
-std::string fillTemplate(std::string const& page, std::map<std::string, std::string> const& parts) {
-    std::string text;
-    std::size_t done = 0;
-    for (std::size_t open = page.find("{{"); open != std::string::npos;
-         open = page.find("{{", done)) {
-        std::size_t const close = page.find("}}", open);
-        text += page.substr(done, open - done);
-        std::string const name = page.substr(open + 2, close - open - 2);
-        done = close + 2;
-        if (name[0] == '#' && parts.at(name.substr(1)).empty()) {
-            std::string const end = "{{/" + name.substr(1) + "}}";
-            done = page.find(end, done) + end.size();
-        } else if (name[0] != '#' && name[0] != '/') {
-            text += parts.at(name);
-        }
-    }
-    return text + page.substr(done);
 }
 
 }  // namespace
@@ -93,17 +72,19 @@ std::string pageText(Document const& document, std::string const& fileName, long
          {"VIEW", stageText(film)},
          {"SCENE", film.bounds.isEmpty ? "" : scenePaths(film.first) + "\n"},
          {"LAST_FRAME", std::to_string(shown - 1)},
-         {"CUT_SHORT", shown == frames ? std::string()
-                                       : "<p>The page keeps the first " + std::to_string(shown) +
-                                             " of " + std::to_string(frames) +
-                                             " frames: more would be too large.</p>\n"},
+         {"CUT_SHORT",
+          shown == frames
+              ? ""
+              : paragraph("The page keeps the first " + std::to_string(shown) + " of " +
+                          std::to_string(frames) + " frames: more would be too large.")},
          {"LEGEND", legendText(marks != nullptr ? marks->shown : document.root)},
          {"LEVELS", levels},
          {"PLOTS", plots.str()},
          {"CONSTANT", constant == 0 ? ""
-                                    : "<p>Not shown: " + counted(constant, "output", "outputs") +
-                                          (constant == 1 ? " that never changes.</p>\n"
-                                                         : " that never change.</p>\n")},
+                                    : paragraph("Not shown: " +
+                                                counted(constant, "output that never changes",
+                                                        "outputs that never change") +
+                                                ".")},
          {"CURVES", curvesText()},
          {"SHAPES", shapesText()},
          {"ATTRIBUTES", attributesText(document.root)},

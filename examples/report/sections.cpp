@@ -90,10 +90,6 @@ std::unordered_set<std::string> idsIn(std::string const& markup, std::string con
     return ids;
 }
 
-}  // namespace
-
-namespace {
-
 Element zoomButton(char const* factor, std::string const& label, char const* sign) {
     return Element("button")
         .set("type", "button")
@@ -126,8 +122,6 @@ Element captionOf(Level const& level, int depth) {
     return caption;
 }
 
-std::string paragraph(std::string const& text) { return Element("p").text(text).markup() + "\n"; }
-
 }  // namespace
 
 std::string levelsText(Patch const& root, Marks const* marks) {
@@ -157,9 +151,7 @@ std::string levelsText(Patch const& root, Marks const* marks) {
         if (level.boxes.empty()) {
             figure.add(paragraph("There is nothing inside."));
         } else {
-            std::string const graph = drawing.graph(
-                level, "role=\"group\" aria-label=\"Graph of " + escaped(nameOf(group)) +
-                           "\" aria-describedby=\"graph-keys\"");
+            std::string const graph = drawing.graph(level, "Graph of " + nameOf(group));
             figure.add(Element("div").set("class", "scroll").set("tabindex", -1).add(graph))
                 .add("\n")
                 .add(Element("div").set("class", "info").set("aria-hidden", "true").text(""))
