@@ -60,6 +60,9 @@ constexpr bool isNoValueSource =
 template <class T>
 constexpr bool isNoDataSource = std::is_same_v<T, bool> || isCharacter<T>;
 
+// The type of a template's first parameter keeps calls such as `ease<double>(...)` out of it.
+enum class AllDeduced { Yes };
+
 }  // namespace tarn::engine::detail
 
 #endif

@@ -89,11 +89,6 @@ template <>
 TARN_API void easeEach<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double const*, std::size_t,
                                   FloatVec4*);
 
-namespace detail {
-/// As the first parameter of a template it keeps calls such as `ease<double>(...)` out.
-enum class AllDeduced { Yes };
-}  // namespace detail
-
 /// Two ends of different types: make them one, or one of them a `Value`.
 template <detail::AllDeduced = detail::AllDeduced::Yes, class From, class To,
           std::enable_if_t<!std::is_same_v<From, To> && !detail::isOneOf<Value, From, To>, int> = 0>

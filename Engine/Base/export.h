@@ -35,15 +35,18 @@
 #define TARN_API_INLINE
 #endif
 
-/// `TARN_FLATTEN` has everything that a function calls compiled into it. What reads a
-/// union in several steps is a switch over its alternatives in each of them, until the compiler
-/// sees all of the steps at once. `TARN_LIKELY` is a condition that mostly holds. Both
-/// are nothing to compilers that have no such mark.
-#if defined(__GNUC__)
+/// `TARN_FLATTEN` has everything that a function calls compiled into it. What reads a union in
+/// several steps is a switch over its alternatives in each of them, until the compiler sees all of
+/// the steps at once. `TARN_LIKELY` is a condition that mostly holds. Both are nothing to compilers
+/// that have no such mark, and the first where code has to be small.
+#if defined(__GNUC__) && !defined(__OPTIMIZE_SIZE__)
 #define TARN_FLATTEN __attribute__((flatten))
-#define TARN_LIKELY(condition) __builtin_expect(!!(condition), 1)
 #else
 #define TARN_FLATTEN
+#endif
+#if defined(__GNUC__)
+#define TARN_LIKELY(condition) __builtin_expect(!!(condition), 1)
+#else
 #define TARN_LIKELY(condition) (condition)
 #endif
 

@@ -16,29 +16,31 @@ Document requireUsable(Optional<Patch> root, DocumentInfo info, DocumentError co
         line << error;
         throw InputError(line.str());
     }
-    refuseWhatIsNotShown(*root);
+    std::string const reason = whatIsNotShown(*root);
+    if (!reason.empty()) throw InputError(reason);
     return {std::move(*root), std::move(info)};
 }
 
 }  // namespace
 
 // Without recursion: how deep the graph is, is what is asked here.
-void refuseWhatIsNotShown(Patch const& root) {
+std::string whatIsNotShown(Patch const& root) {
     std::vector<std::pair<Patch const*, std::size_t>> pending{{&root, 1}};
     while (!pending.empty()) {
         auto const [patch, level] = pending.back();
         pending.pop_back();
         if (level > kDeepest) {
-            throw InputError("nested deeper than " + std::to_string(kDeepest) + " levels");
+            return "nested deeper than " + std::to_string(kDeepest) + " levels";
         }
         for (auto const& list : {patch->inputs, patch->outputs}) {
             for (Port const& port : *list) {
                 if (port.typeInfo.type <= Type::Unstructured) continue;
-                throw InputError("port " + std::to_string(port.id) + " has no type that is known");
+                return "port " + std::to_string(port.id) + " has no type that is known";
             }
         }
         for (Patch const& child : *patch->children) pending.emplace_back(&child, level + 1);
     }
+    return "";
 }
 
 Document openDocument(std::string const& fileName) {

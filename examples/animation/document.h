@@ -25,9 +25,10 @@ struct Document {
     tarn::engine::DocumentInfo info;
 };
 
-// Throws an InputError for what the library carries and this program does not show: more than a
-// thousand levels, over which it recurses, and ports without a type.
-void refuseWhatIsNotShown(tarn::engine::Patch const& root);
+// What of the graph the library carries and this program does not show: more than a thousand
+// levels, over which it recurses, or ports without a type. Empty where there is nothing of that
+// kind.
+std::string whatIsNotShown(tarn::engine::Patch const& root);
 
 // Throws an InputError for what cannot be used, or is not shown.
 Document openDocument(std::string const& fileName);

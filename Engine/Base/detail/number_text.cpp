@@ -8,10 +8,12 @@
 #include <cstddef>
 #include <cstdio>
 #include <cstring>
-#include <iostream>
 #include <iterator>
-#include <locale>
 #include <string_view>
+#if !defined(TARN_ENGINE_BASE_CLASSIC_LOCALE)
+#include <iostream>
+#include <locale>
+#endif
 
 namespace tarn::engine::detail {
 
@@ -102,12 +104,17 @@ private:
     char* begin = buffer + sizeof buffer;
 };
 
+#if defined(TARN_ENGINE_BASE_CLASSIC_LOCALE)
+// In a program that has no other locale. What locales and streams need is left out then.
+constexpr char decimalPoint() { return '.'; }
+#else
 // That of `std::cout`'s locale. Most often it is the classic one, which is quickly seen.
 char decimalPoint() {
     std::locale const locale = std::cout.getloc();
     if (locale == std::locale::classic()) return '.';
     return std::use_facet<std::numpunct<char>>(locale).decimal_point();
 }
+#endif
 
 // Without the zeros that end it, and without a point with nothing behind it.
 std::string_view trimmed(std::string_view text, char point) {

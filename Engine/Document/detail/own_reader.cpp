@@ -86,8 +86,15 @@ constexpr std::uint32_t setOf(Keys... keys) {
     return ((std::uint32_t(1) << static_cast<unsigned>(keys)) | ...);
 }
 
+// A graph is destroyed level by level on the stack, of which browsers give little.
+#if defined(TARN_ENGINE_DOCUMENT_DEEPEST)
+constexpr std::size_t kDeepest = TARN_ENGINE_DOCUMENT_DEEPEST;
+#else
 constexpr std::size_t kDeepest = 10000;
+#endif
 constexpr long long kVersion = 1;
+
+std::string tooDeep() { return " nest deeper than " + std::to_string(kDeepest) + " levels"; }
 
 bool isNumberOf(Unstructured const& data, long long& number) {
     if (data.type() == Unstructured::Type::Integer) {
@@ -279,13 +286,13 @@ bool OwnReader::onOpen(bool isObject) {
 }
 
 bool OwnReader::openPatch() {
-    if (openPatches.size() == kDeepest) return refuse("patches nest deeper than 10000 levels");
+    if (openPatches.size() == kDeepest) return refuse("patches" + tooDeep());
     openPatches.emplace_back().builtin = kGroupKind;
     return push(Place::Patch);
 }
 
 bool OwnReader::openLayer() {
-    if (openLayers.size() == kDeepest) return refuse("model layers nest deeper than 10000 levels");
+    if (openLayers.size() == kDeepest) return refuse("model layers" + tooDeep());
     openLayers.emplace_back();
     return push(Place::ModelLayer);
 }

@@ -1,0 +1,92 @@
+// What arguments have to be. Whatever is not what it has to be is said in a sentence.
+
+export function describe(x) {
+  if (x === null) return "null";
+  if (Array.isArray(x)) return `an array of ${x.length}`;
+  switch (typeof x) {
+    case "undefined":
+      return "nothing";
+    case "string":
+      return x.length > 40 ? "a long string" : JSON.stringify(x);
+    case "number":
+    case "boolean":
+      return String(x);
+    case "bigint":
+      return `${x}n`;
+    case "object":
+      return `an object (${x.constructor?.name ?? "without a class"})`;
+    default:
+      return `a ${typeof x}`;
+  }
+}
+
+export function mustBe(what, wanted, x) {
+  return new TypeError(`${what} must be ${wanted}, not ${describe(x)}`);
+}
+
+export function number(x, what) {
+  if (typeof x !== "number") throw mustBe(what, "a number", x);
+  return x;
+}
+
+export function string(x, what) {
+  if (typeof x !== "string") throw mustBe(what, "a string", x);
+  return x;
+}
+
+// A BigInt of 64 bits, from one or from a number that is whole and exact.
+function wide(x, what, wanted, least, most) {
+  if (typeof x === "number" && Number.isSafeInteger(x)) x = BigInt(x);
+  if (typeof x !== "bigint") throw mustBe(what, wanted, x);
+  if (x < least || x > most) throw new RangeError(`${what} must be ${wanted}, not ${describe(x)}`);
+  return x;
+}
+
+export function signed64(x, what) {
+  return wide(x, what, "an integer of 64 bits", -(2n ** 63n), 2n ** 63n - 1n);
+}
+
+export function identifier(x, what = "an identifier") {
+  return wide(x, what, "an unsigned integer of 64 bits", 0n, 2n ** 64n - 1n);
+}
+
+// As the two halves that the native functions take.
+export function halves(x, what) {
+  const id = identifier(x, what);
+  return [Number(id & 0xffffffffn), Number(id >> 32n)];
+}
+
+export function enumerator(x, names, what) {
+  if (!Number.isInteger(x) || x < 0 || x >= names) throw mustBe(what, `one of its ${names} enumerators`, x);
+  return x;
+}
+
+// A position in a list; none is its end.
+export function position(x) {
+  if (x === undefined) return -1;
+  if (!Number.isSafeInteger(x) || x < 0) throw mustBe("a position", "a whole number from 0", x);
+  return x;
+}
+
+function isList(x) {
+  return Array.isArray(x) || (ArrayBuffer.isView(x) && !(x instanceof DataView));
+}
+
+// The numbers of a list, or undefined for what is none; counts are those that the list may have.
+export function listOfNumbers(x, counts) {
+  if (!isList(x) || !counts.includes(x.length)) return undefined;
+  const numbers = Array.from(x);
+  return numbers.every((n) => typeof n === "number") ? numbers : undefined;
+}
+
+export function point(x, what) {
+  const numbers = listOfNumbers(x, [2]);
+  if (numbers !== undefined) return numbers;
+  if (x !== null && typeof x === "object" && typeof x.x === "number" && typeof x.y === "number") return [x.x, x.y];
+  throw mustBe(what, "a point: [x, y] or {x, y}", x);
+}
+
+export function instance(x, type, what) {
+  if (!(x instanceof type)) throw mustBe(what, `a ${type.name}`, x);
+  return x;
+}

@@ -1,0 +1,144 @@
+// Documents, and what they compute and draw.
+
+#include "graphs.h"
+#include "native.h"
+#include "wire.h"
+
+#include "animation/evaluator.h"
+#include "animation/scene.h"
+
+#include <Engine/Document/document.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+using namespace tarn::engine;
+using emscripten::val;
+
+namespace web {
+
+namespace {
+
+using Address = std::uintptr_t;
+
+Patch const& patchAt(Address address) { return *reinterpret_cast<Patch const*>(address); }
+
+val errorOf(DocumentError const& error) {
+    val object = val::object();
+    object.set("message", error.message);
+    object.set("pointer", error.pointer);
+    object.set("line", static_cast<double>(error.line));
+    object.set("column", static_cast<double>(error.column));
+    return object;
+}
+
+// Either {root, info} or {error}.
+val read(std::string const& text) {
+    val answer = val::object();
+    DocumentError error;
+    DocumentInfo info;
+    Optional<Patch> root = readDocument(text, &error, &info);
+    if (root) error.message = whatIsNotShown(*root);
+    if (!root || !error.message.empty()) {
+        answer.set("error", errorOf(error));
+        return answer;
+    }
+    val notes = val::array();
+    for (std::string const& note : info.notes) notes.call<void>("push", note);
+    val about = val::object();
+    about.set("form", int(info.form));
+    about.set("framesPerSecond", info.framesPerSecond);
+    about.set("renumberedNodes", static_cast<double>(info.renumberedNodes));
+    about.set("omittedLinks", static_cast<double>(info.omittedLinks));
+    about.set("unusedDefinitions", static_cast<double>(info.unusedDefinitions));
+    about.set("notes", notes);
+    about.set("summary", info.summary());
+    answer.set("info", about);
+    answer.set("root", Root(std::move(*root)));
+    return answer;
+}
+std::string write(Address root, double framesPerSecond) {
+    return writeDocument(patchAt(root), framesPerSecond);
+}
+std::string kindName(unsigned low, unsigned high) { return kindToString(idOf(low, high)); }
+val kindOfName(std::string const& name) {
+    Optional<unsigned long long> const kind = stringToKind(name);
+    return kind ? val(std::to_string(*kind)) : val::null();
+}
+
+// A document with its evaluator, which refers to it.
+struct Evaluation {
+    explicit Evaluation(Patch root)
+        : document{std::move(root), {}}, evaluator(document), scene(document, evaluator.root()) {}
+
+    Document document;
+    Evaluator evaluator;
+    Scene scene;
+};
+struct EvaluationHandle {
+    std::shared_ptr<Evaluation> held;
+};
+
+std::string notShown(Address root) { return whatIsNotShown(patchAt(root)); }
+EvaluationHandle makeEvaluator(Address root) {
+    return {std::make_shared<Evaluation>(patchAt(root))};
+}
+void evaluate(EvaluationHandle& evaluation, double frame) {
+    evaluation.held->evaluator.evaluate(static_cast<long long>(frame));
+}
+EvalPort const* findPort(EvalPatch const& root, bool isInput, unsigned long long id) {
+    std::vector<EvalPatch const*> pending{&root};
+    while (!pending.empty()) {
+        EvalPatch const& patch = *pending.back();
+        pending.pop_back();
+        for (EvalPort const& port : isInput ? *patch.inputs : *patch.outputs) {
+            if (port.id == id) return &port;
+        }
+        for (EvalPatch const& child : *patch.children) pending.push_back(&child);
+    }
+    return nullptr;
+}
+val portValues(EvaluationHandle const& evaluation, bool isInput, unsigned low, unsigned high) {
+    EvalPort const* const port =
+        findPort(evaluation.held->evaluator.root(), isInput, idOf(low, high));
+    if (port == nullptr) return val::null();
+    Writer out;
+    out.count(port->values.size());
+    for (Value const& value : port->values) out.value(value);
+    return bytesOf(out.bytes);
+}
+val drawn(EvaluationHandle const& evaluation) {
+    val list = val::array();
+    for (Drawn const& outline : evaluation.held->scene.now()) {
+        val object = val::object();
+        object.set("name", outline.name);
+        object.set("path", bytesOf(Writer().path(outline.path).bytes));
+        object.set("svgPathData", outline.data);
+        object.set("isLayer", outline.isLayer);
+        object.set("color", bytesOf(Writer().value(outline.color).bytes));
+        object.set("width", outline.width);
+        list.call<void>("push", object);
+    }
+    return list;
+}
+
+}  // namespace
+
+EMSCRIPTEN_BINDINGS(documents) {
+    emscripten::class_<EvaluationHandle>("Evaluation");
+    native<&read>("readDocument");
+    native<&write>("writeDocument");
+    native<&kindName>("kindToString");
+    native<&kindOfName>("stringToKind");
+    native<&notShown>("whatIsNotShown");
+    native<&makeEvaluator>("makeEvaluator");
+    native<&evaluate>("evaluate");
+    native<&portValues>("portValues");
+    native<&drawn>("drawn");
+}
+
+}  // namespace web

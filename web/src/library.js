@@ -1,0 +1,12 @@
+// Everything that the module exports.
+
+export * from "./graphs.js";
+export {
+  bounds, ease, EasingFunction, easingFunctionNames, interpolate, Path, PathBuilder, pathFromSvgPathData,
+  PathInstruction, pathInstructionToString, scaled, stringToEasingFunction, stringToPathInstruction, svgPathData,
+  translated,
+} from "./paths.js";
+export {
+  castValueToType, portNameForTypeInfo, stringToType, Type, typeIsResource, typeShouldCopyAcrossDeletedConnections,
+  typeToString, Unstructured, UnstructuredType, Value,
+} from "./values.js";
