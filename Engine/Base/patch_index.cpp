@@ -80,6 +80,7 @@ void PatchTables::groupConnections() {
         ConnectionGroups::layOut(record.outgoing, end);
     }
     for (auto& slot : graph.outputs) ConnectionGroups::layOut(slot.outgoing, end);
+    requireCountable(end);
     groups.fill(members, end);
 }
 

@@ -53,15 +53,14 @@ public:
     }
 
     /// The group, if it was counted, gets the place at `end`, which then is the end behind it.
-    static void layOut(ConnectionGroup& group, std::size_t& end) {
+    static void layOut(ConnectionGroup& group, std::size_t& end) noexcept {
         if (!group.exists()) return;
-        std::size_t const begin = end;
+        auto const begin = static_cast<std::uint32_t>(end);
         end += 1 + group.size();
-        requireCountable(end);
-        group.place(static_cast<std::uint32_t>(begin));
+        group.place(begin);
     }
 
-    /// After all groups were laid out, up to `end`.
+    /// After all groups were laid out, up to `end`, which is to be countable.
     void fill(std::vector<Member> const& members, std::size_t end) {
         numbers.resize(end);
         for (std::size_t i = 0; i < members.size(); ++i) {

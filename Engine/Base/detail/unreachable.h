@@ -9,10 +9,9 @@
 #include <Engine/Base/assertion.h>
 
 /// The condition reads "0": it is the place itself that must not be reached, and not an expression
-/// that turned out to be false. The function is the one that this stands in.
+/// that turned out to be false. The function is the one that this stands in, in this namespace.
 #define TARN_ENGINE_BASE_UNREACHABLE(module) TARN_ENGINE_BASE_UNREACHABLE_AT(module, __LINE__)
 /// The same with a line of its own.
-#define TARN_ENGINE_BASE_UNREACHABLE_AT(module, line)                                              \
-    ::tarn::engine::assertionFailed("0", __func__, module, line)
+#define TARN_ENGINE_BASE_UNREACHABLE_AT(module, line) assertionFailed("0", __func__, module, line)
 
 #endif
