@@ -347,6 +347,18 @@ TEST_F(DocumentRoad, EvaluatesCirclesOfConnectionsWithTheFrameBefore) {
                               "frame  2\n0      1\n1      2\n2      3\n3      4\n");
 }
 
+TEST_F(DocumentRoad, EvaluatesGraphsWhoseConnectionsLeadNowhere) {
+    std::string const file =
+        write("nowhere.json", R"({"identifiers":"any","root":{"id":1,"children":[
+            {"id":2,"kind":"add","inputs":[{"id":21,"type":"int","default":3}],
+             "outputs":[{"id":23,"type":"int"}]}],
+            "connections":[{"from":[5,6],"to":[2,21]},{"from":[2,23],"to":[7,8]}]}})");
+    Outcome const outcome = run(file + " --frames 1");
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.errors, "");
+    EXPECT_NE(outcome.output.find("2 connections\n"), std::string::npos) << outcome.output;
+}
+
 // Whatever stands in a file, the answer is a document or one line.
 TEST_F(DocumentRoad, SurvivesDamagedDocuments) {
     tests::Random random(77);

@@ -1,15 +1,17 @@
 /** Identifiers and other integers of 64 bits; numbers where they are whole and exact. */
 export type Integer = bigint | number;
+/** Some numbers. */
+export type Numbers =
+  | readonly number[] | Float64Array | Float32Array | Int8Array | Int16Array | Int32Array | Uint8Array | Uint8ClampedArray
+  | Uint16Array | Uint32Array;
 /** [x, y] or {x, y}. */
-export type Point = ArrayLike<number> | { readonly x: number; readonly y: number };
-/** What data is made from. Integers of JavaScript's numbers are integers, all others floating-point numbers. */
-export type Data =
-  | null | number | bigint | string | Unstructured | Value | ArrayBufferView | readonly Data[]
-  | { readonly [key: string]: Data | undefined } | ReadonlyMap<string, Data>;
-/** What a value is made from: of an array 2, 3, 4 or 16 numbers. */
-export type ValueLike =
-  | Value | number | bigint | boolean | string | readonly number[] | Float64Array | Float32Array | Path | Unstructured
-  | { readonly [key: string]: Data | undefined };
+export type Point = Numbers | { readonly x: number; readonly y: number };
+/** What data is made from: also typed arrays, plain objects and Maps of such. */
+export type Data = undefined | null | number | bigint | boolean | string | readonly Data[] | object;
+/** What a value is made from: of an array 2, 3, 4 or 16 numbers, of other plain objects data. */
+export type ValueLike = number | bigint | boolean | string | Numbers | object;
+/** What curves ease; both ends are of one type. */
+export type Eased = number | bigint | Numbers | Value;
 
 export declare const Type: {
   readonly Float: 0; readonly Vec2: 1; readonly Vec3: 2; readonly Vec4: 3; readonly Mat4: 4; readonly Boolean: 5;
@@ -105,7 +107,7 @@ export interface PathElement {
 }
 /** A vector path. Never changes. */
 export declare class Path {
-  constructor(elements?: Iterable<{ readonly instruction: PathInstruction; readonly points?: ArrayLike<Point> }>);
+  constructor(elements?: Iterable<{ readonly instruction: PathInstruction; readonly points?: readonly Point[] }>);
   readonly length: number;
   readonly elements: readonly PathElement[];
   equals(other: Path): boolean;
@@ -146,14 +148,15 @@ export declare function easingFunctionNames(): string[];
 export declare function stringToEasingFunction(name: string): EasingFunction | null;
 export declare function ease(easingFunction: EasingFunction, start: number, end: number, t: number): number;
 export declare function ease(easingFunction: EasingFunction, start: bigint, end: bigint, t: number): bigint;
-export declare function ease(
-  easingFunction: EasingFunction, start: ArrayLike<number>, end: ArrayLike<number>, t: number): Float64Array;
-export declare function ease(easingFunction: EasingFunction, start: Value, end: ValueLike, t: number): Value;
-export declare function ease(easingFunction: EasingFunction, start: ValueLike, end: Value, t: number): Value;
+export declare function ease(easingFunction: EasingFunction, start: Numbers, end: Numbers, t: number): Float64Array;
+export declare function ease(easingFunction: EasingFunction, start: Value, end: Eased, t: number): Value;
+export declare function ease(easingFunction: EasingFunction, start: Eased, end: Value, t: number): Value;
 /** For every progress; of vectors the components, one point after another. */
 export declare function ease(
-  easingFunction: EasingFunction, start: number | ArrayLike<number>, end: number | ArrayLike<number>,
-  t: ArrayLike<number>): Float64Array;
+  easingFunction: EasingFunction, start: number | Numbers, end: number | Numbers, t: Numbers): Float64Array;
+export declare function ease(
+  easingFunction: EasingFunction, start: number | Numbers, end: number | Numbers, t: number | Numbers):
+  number | Float64Array;
 
 export interface Port {
   readonly id: bigint;
@@ -181,7 +184,7 @@ export interface NewPort {
   readonly typeInfo?: TypeInfo;
   /** That of the type unless it is given. */
   readonly defaultValue?: ValueLike;
-  readonly attributes?: Data;
+  readonly attributes?: object;
 }
 export type NewConnection = { readonly [end in keyof Connection]: Integer };
 export interface NewModelLayer {
@@ -194,7 +197,7 @@ export interface NewPatch {
   readonly builtin?: Integer;
   readonly name?: string;
   readonly descriptor?: string;
-  readonly attributes?: Data;
+  readonly attributes?: object;
   readonly modelLayer?: NewModelLayer;
   readonly inputs?: readonly NewPort[];
   readonly outputs?: readonly NewPort[];
@@ -246,7 +249,7 @@ export interface PatchInEdit {
   name: string;
   descriptor: string;
   get attributes(): Unstructured;
-  set attributes(attributes: Data);
+  set attributes(attributes: object);
   get modelLayer(): ModelLayer;
   set modelLayer(layer: NewModelLayer);
 }
@@ -260,7 +263,7 @@ export interface PortInEdit {
   get defaultValue(): Value;
   set defaultValue(value: ValueLike);
   get attributes(): Unstructured;
-  set attributes(attributes: Data);
+  set attributes(attributes: object);
 }
 export declare class PatchEdit {
   constructor(index: PatchIndex);
@@ -299,8 +302,9 @@ export declare class DocumentError extends SyntaxError {
   readonly column: number;
 }
 export declare const DocumentForm: { readonly Own: 0; readonly NodeGraph: 1 };
+export type DocumentForm = (typeof DocumentForm)[keyof typeof DocumentForm];
 export interface DocumentInfo {
-  readonly form: 0 | 1;
+  readonly form: DocumentForm;
   readonly framesPerSecond: number;
   readonly renumberedNodes: number;
   readonly omittedLinks: number;
@@ -326,7 +330,7 @@ export interface Drawn {
 }
 /** What a document computes and draws, frame by frame. */
 export declare class Evaluator {
-  constructor(root: Patch);
+  constructor(root: Patch, framesPerSecond?: number);
   evaluate(frame: number): this;
   inputValues(portId: Integer): readonly Value[] | null;
   outputValues(portId: Integer): readonly Value[] | null;

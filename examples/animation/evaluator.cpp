@@ -29,6 +29,20 @@ void Evaluator::evaluate(long long frame) { run(*top, frame); }
 
 // The lists of the evaluation form never change their lengths here: pointers into them last.
 std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch& evaluated) {
+    // The first connection to a port and the first port of an identifier count, as in the queries.
+    std::unordered_map<unsigned long long, unsigned long long> incoming;
+    for (Connection const& c : *patch.connections) incoming.emplace(c.toPortId, c.fromPortId);
+    std::unordered_map<unsigned long long, EvalPort const*> outputs;
+    for (EvalPort const& port : *evaluated.outputs) outputs.emplace(port.id, &port);
+    for (EvalPatch const& child : *evaluated.children) {
+        for (EvalPort const& port : *child.outputs) outputs.emplace(port.id, &port);
+    }
+    auto const sourceOf = [&](Port const& input) -> EvalPort const* {
+        auto const connection = incoming.find(input.id);
+        if (connection == incoming.end()) return nullptr;
+        auto const source = outputs.find(connection->second);
+        return source == outputs.end() ? nullptr : source->second;
+    };
     auto level = std::make_shared<Level>(Level{&evaluated, {}});
     for (std::size_t const i : order(patch)) {
         Patch const& child = patch.children->at(i);
@@ -37,9 +51,7 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
         // A patch of unknown kind hands its inputs' defaults on: nothing takes their place.
         for (Port const& input : *child.inputs) {
             if (child.builtin == kUnknownKind) break;
-            Optional<Connection> const incoming = findIncomingConnectionToPort(patch, input.id);
-            step.sources.push_back(incoming ? findOutputPort(evaluated, incoming->fromPortId)
-                                            : nullptr);
+            step.sources.push_back(sourceOf(input));
         }
         if (!child.children->empty()) step.inside = plan(child, evaluatedChild);
         level->steps.push_back(std::move(step));
@@ -47,7 +59,8 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
     return level;
 }
 
-// The positions of the children, sources first; those in a circle last, as they stand.
+// The positions of the children, sources first; those in a circle last, as they stand. Connections
+// whose ends are no children do not count.
 std::vector<std::size_t> Evaluator::order(Patch const& patch) {
     std::vector<Patch> const& children = *patch.children;
     std::unordered_map<unsigned long long, std::size_t> positions;
@@ -56,9 +69,11 @@ std::vector<std::size_t> Evaluator::order(Patch const& patch) {
     std::vector<std::vector<std::size_t>> followers(children.size());
     std::vector<std::size_t> waitingFor(children.size(), 0);
     for (Connection const& connection : *patch.connections) {
-        std::size_t const to = positions.at(connection.toPatchId);
-        followers[positions.at(connection.fromPatchId)].push_back(to);
-        ++waitingFor[to];
+        auto const from = positions.find(connection.fromPatchId);
+        auto const to = positions.find(connection.toPatchId);
+        if (from == positions.end() || to == positions.end()) continue;
+        followers[from->second].push_back(to->second);
+        ++waitingFor[to->second];
     }
 
     std::set<std::size_t> ready;

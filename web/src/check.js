@@ -12,9 +12,9 @@ export function describe(x) {
     case "boolean":
       return String(x);
     case "bigint":
-      return `${x}n`;
+      return x >= -(2n ** 70n) && x <= 2n ** 70n ? `${x}n` : "a very large integer";
     case "object":
-      return `an object (${x.constructor?.name ?? "without a class"})`;
+      return `an object (${typeof x.constructor?.name === "string" ? x.constructor.name : "without a class"})`;
     default:
       return `a ${typeof x}`;
   }
@@ -68,21 +68,29 @@ export function position(x) {
   return x;
 }
 
-function isList(x) {
-  return Array.isArray(x) || (ArrayBuffer.isView(x) && !(x instanceof DataView));
-}
+const typedArray = Object.getPrototypeOf(Uint8Array.prototype);
+const tagOf = Object.getOwnPropertyDescriptor(typedArray, Symbol.toStringTag).get;
 
-// The numbers of a list, or undefined for what is none; counts are those that the list may have.
+/** What kind of typed array it is, of this page or of another: "Float64Array"; undefined for everything else. */
+export const typedArrayKind = (x) => tagOf.call(x);
+
+export const isList = (x) => Array.isArray(x) || typedArrayKind(x) !== undefined;
+
+// The numbers of a list, or undefined for what is none; counts are those that the list may have, if not any.
 export function listOfNumbers(x, counts) {
-  if (!isList(x) || !counts.includes(x.length)) return undefined;
+  if (!isList(x)) return undefined;
   const numbers = Array.from(x);
-  return numbers.every((n) => typeof n === "number") ? numbers : undefined;
+  const isOfCount = counts === undefined || counts.includes(numbers.length);
+  return isOfCount && numbers.every((n) => typeof n === "number") ? numbers : undefined;
 }
 
 export function point(x, what) {
   const numbers = listOfNumbers(x, [2]);
   if (numbers !== undefined) return numbers;
-  if (x !== null && typeof x === "object" && typeof x.x === "number" && typeof x.y === "number") return [x.x, x.y];
+  if (x !== null && typeof x === "object" && !isList(x)) {
+    const { x: px, y: py } = x;
+    if (typeof px === "number" && typeof py === "number") return [px, py];
+  }
   throw mustBe(what, "a point: [x, y] or {x, y}", x);
 }
 

@@ -29,8 +29,8 @@ Patch const& patchAt(Address address) { return *reinterpret_cast<Patch const*>(a
 
 val errorOf(DocumentError const& error) {
     val object = val::object();
-    object.set("message", error.message);
-    object.set("pointer", error.pointer);
+    object.set("message", bytesOf(error.message));
+    object.set("pointer", bytesOf(error.pointer));
     object.set("line", static_cast<double>(error.line));
     object.set("column", static_cast<double>(error.column));
     return object;
@@ -48,7 +48,7 @@ val read(std::string const& text) {
         return answer;
     }
     val notes = val::array();
-    for (std::string const& note : info.notes) notes.call<void>("push", note);
+    for (std::string const& note : info.notes) notes.call<void>("push", bytesOf(note));
     val about = val::object();
     about.set("form", int(info.form));
     about.set("framesPerSecond", info.framesPerSecond);
@@ -56,13 +56,13 @@ val read(std::string const& text) {
     about.set("omittedLinks", static_cast<double>(info.omittedLinks));
     about.set("unusedDefinitions", static_cast<double>(info.unusedDefinitions));
     about.set("notes", notes);
-    about.set("summary", info.summary());
+    about.set("summary", bytesOf(info.summary()));
     answer.set("info", about);
     answer.set("root", Root(std::move(*root)));
     return answer;
 }
-std::string write(Address root, double framesPerSecond) {
-    return writeDocument(patchAt(root), framesPerSecond);
+val write(Address root, double framesPerSecond) {
+    return bytesOf(writeDocument(patchAt(root), framesPerSecond));
 }
 std::string kindName(unsigned low, unsigned high) { return kindToString(idOf(low, high)); }
 val kindOfName(std::string const& name) {
@@ -72,8 +72,10 @@ val kindOfName(std::string const& name) {
 
 // A document with its evaluator, which refers to it.
 struct Evaluation {
-    explicit Evaluation(Patch root)
-        : document{std::move(root), {}}, evaluator(document), scene(document, evaluator.root()) {}
+    Evaluation(Patch root, DocumentInfo info)
+        : document{std::move(root), std::move(info)},
+          evaluator(document),
+          scene(document, evaluator.root()) {}
 
     Document document;
     Evaluator evaluator;
@@ -84,8 +86,10 @@ struct EvaluationHandle {
 };
 
 std::string notShown(Address root) { return whatIsNotShown(patchAt(root)); }
-EvaluationHandle makeEvaluator(Address root) {
-    return {std::make_shared<Evaluation>(patchAt(root))};
+EvaluationHandle makeEvaluator(Address root, double framesPerSecond) {
+    DocumentInfo info;
+    info.framesPerSecond = framesPerSecond;
+    return {std::make_shared<Evaluation>(patchAt(root), std::move(info))};
 }
 void evaluate(EvaluationHandle& evaluation, double frame) {
     evaluation.held->evaluator.evaluate(static_cast<long long>(frame));
@@ -115,7 +119,7 @@ val drawn(EvaluationHandle const& evaluation) {
     val list = val::array();
     for (Drawn const& outline : evaluation.held->scene.now()) {
         val object = val::object();
-        object.set("name", outline.name);
+        object.set("name", bytesOf(outline.name));
         object.set("path", bytesOf(Writer().path(outline.path).bytes));
         object.set("svgPathData", outline.data);
         object.set("isLayer", outline.isLayer);

@@ -9,9 +9,12 @@
 
 #include <Engine/Base/base.h>
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
+#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -24,6 +27,9 @@ namespace {
 
 using Bytes = std::string;
 using Address = std::uintptr_t;
+
+// As in graphs.js and for documents.
+constexpr std::size_t kDeepest = 1000;
 
 Patch const& patchAt(Address address) { return *reinterpret_cast<Patch const*>(address); }
 Address addressOf(Patch const* patch) { return reinterpret_cast<Address>(patch); }
@@ -99,21 +105,108 @@ val indexOutgoingFromPatch(PatchIndex const& index, unsigned low, unsigned high)
     return connections(index.outgoingConnectionsFromPatch(idOf(low, high)));
 }
 
-PatchEdit makeEdit(PatchIndex const& index) { return PatchEdit(index); }
-Address editPatch(PatchEdit& edit, unsigned low, unsigned high) {
-    return addressOf(edit.patch(idOf(low, high)));
+// An edit, and how deep patches are in it: browsers give less stack than systems, and a graph is
+// destroyed level by level.
+class Edit {
+public:
+    explicit Edit(PatchIndex const& index)
+        : changes(index), before(std::make_unique<PatchIndex>(index)) {}
+
+    PatchEdit changes;
+
+    // Whether a patch of so many levels may stand there.
+    bool fits(unsigned long long parent, std::size_t levels) const {
+        return depthOf(parent) + levels <= kDeepest;
+    }
+    static std::size_t levelsOf(Patch const& added) {
+        std::size_t levels = 0;
+        std::vector<std::pair<Patch const*, std::size_t>> pending{{&added, 1}};
+        while (!pending.empty()) {
+            auto const [patch, level] = pending.back();
+            pending.pop_back();
+            levels = std::max(levels, level);
+            for (Patch const& child : *patch->children) pending.emplace_back(&child, level + 1);
+        }
+        return levels;
+    }
+    // Those of a patch in the edit. What was removed from it counts as if it were there.
+    std::size_t levelsOf(unsigned long long id) const {
+        std::size_t levels = 0;
+        std::vector<std::pair<unsigned long long, std::size_t>> pending{{id, 1}};
+        while (!pending.empty()) {
+            auto const [top, level] = pending.back();
+            pending.pop_back();
+            levels = std::max(levels, level);
+            if (Patch const* const patch = before->findPatch(top)) {
+                for (Patch const& child : *patch->children) {
+                    if (parents.count(child.id) == 0) pending.emplace_back(child.id, level + 1);
+                }
+            }
+            auto const further = children.find(top);
+            if (further == children.end()) continue;
+            for (unsigned long long const child : further->second) {
+                if (parents.at(child) == top) pending.emplace_back(child, level + 1);
+            }
+        }
+        return levels;
+    }
+
+    void wasMoved(unsigned long long id, unsigned long long parent) {
+        parents[id] = parent;
+        children[parent].push_back(id);
+    }
+    void wasAdded(Patch const& added, unsigned long long parent) {
+        std::vector<std::pair<Patch const*, unsigned long long>> pending{{&added, parent}};
+        while (!pending.empty()) {
+            auto const [patch, above] = pending.back();
+            pending.pop_back();
+            wasMoved(patch->id, above);
+            for (Patch const& child : *patch->children) pending.emplace_back(&child, patch->id);
+        }
+    }
+
+    Root commit() {
+        before = nullptr;  // An index that shares tables is updated slowly.
+        return Root(changes.commit());
+    }
+    bool isDone() const { return before == nullptr; }
+
+private:
+    std::size_t depthOf(unsigned long long id) const {
+        std::size_t depth = 1;
+        for (;; ++depth) {
+            auto const moved = parents.find(id);
+            if (moved != parents.end()) {
+                id = moved->second;
+            } else if (Patch const* const parent = before->parentOf(id)) {
+                id = parent->id;
+            } else {
+                return depth;
+            }
+        }
+    }
+
+    std::unique_ptr<PatchIndex> before;
+    // Of the patches that were added or moved.
+    std::unordered_map<unsigned long long, unsigned long long> parents;
+    std::unordered_map<unsigned long long, std::vector<unsigned long long>> children;
+};
+
+Edit makeEdit(PatchIndex const& index) { return Edit(index); }
+Address editPatch(Edit& edit, unsigned low, unsigned high) {
+    return addressOf(edit.changes.patch(idOf(low, high)));
 }
-Port* portOf(PatchEdit& edit, bool isInput, unsigned long long id) {
-    return isInput ? edit.inputPort(id) : edit.outputPort(id);
+Port* portOf(Edit& edit, bool isInput, unsigned long long id) {
+    return isInput ? edit.changes.inputPort(id) : edit.changes.outputPort(id);
 }
-val editPort(PatchEdit& edit, bool isInput, unsigned low, unsigned high) {
+val editPort(Edit& edit, bool isInput, unsigned low, unsigned high) {
     return optionalPort(portOf(edit, isInput, idOf(low, high)));
 }
 
 // The field of a patch that `Reader` finds in the bytes; false where there is no such patch.
-bool setPatchField(PatchEdit& edit, unsigned low, unsigned high, std::string const& field,
+bool setPatchField(Edit& edit, unsigned low, unsigned high, std::string const& field,
                    Bytes const& content) {
-    Patch* const patch = edit.patch(idOf(low, high));
+    Patch* const patch = edit.changes.patch(idOf(low, high));
     if (patch == nullptr) return false;
     Reader in(content);
     if (field == "builtin") patch->builtin = in.integer();
@@ -123,8 +216,8 @@ bool setPatchField(PatchEdit& edit, unsigned low, unsigned high, std::string con
     if (field == "modelLayer") patch->modelLayer = in.modelLayer();
     return true;
 }
-bool setPortField(PatchEdit& edit, bool isInput, unsigned low, unsigned high,
-                  std::string const& field, Bytes const& content) {
+bool setPortField(Edit& edit, bool isInput, unsigned low, unsigned high, std::string const& field,
+                  Bytes const& content) {
     Port* const port = portOf(edit, isInput, idOf(low, high));
     if (port == nullptr) return false;
     Reader in(content);
@@ -136,40 +229,56 @@ bool setPortField(PatchEdit& edit, bool isInput, unsigned low, unsigned high,
     return true;
 }
 
-// A negative position is the end.
+// A negative position is the end, and so is one that no list has.
 std::size_t placeOf(double position) {
-    return position < 0 ? PatchEdit::kEnd : static_cast<std::size_t>(position);
+    bool const isPlace = position >= 0 && position < static_cast<double>(PatchEdit::kEnd);
+    return isPlace ? static_cast<std::size_t>(position) : PatchEdit::kEnd;
 }
-bool addPort(PatchEdit& edit, bool isInput, unsigned low, unsigned high, Bytes const& port,
+bool addPort(Edit& edit, bool isInput, unsigned low, unsigned high, Bytes const& port,
              double position) {
     Port added = Reader(port).port();
     unsigned long long const patch = idOf(low, high);
-    return isInput ? edit.addInputPort(patch, std::move(added), placeOf(position))
-                   : edit.addOutputPort(patch, std::move(added), placeOf(position));
+    return isInput ? edit.changes.addInputPort(patch, std::move(added), placeOf(position))
+                   : edit.changes.addOutputPort(patch, std::move(added), placeOf(position));
 }
-bool removePort(PatchEdit& edit, bool isInput, unsigned low, unsigned high) {
+bool removePort(Edit& edit, bool isInput, unsigned low, unsigned high) {
     unsigned long long const id = idOf(low, high);
-    return isInput ? edit.removeInputPort(id) : edit.removeOutputPort(id);
+    return isInput ? edit.changes.removeInputPort(id) : edit.changes.removeOutputPort(id);
 }
-bool addPatch(PatchEdit& edit, unsigned low, unsigned high, Address patch, double position) {
-    return edit.addPatch(idOf(low, high), patchAt(patch), placeOf(position));
+// What graphs.js is answered where a patch is added or moved.
+constexpr int kRefused = 0;
+constexpr int kDone = 1;
+constexpr int kTooDeep = 2;
+
+int addPatch(Edit& edit, unsigned low, unsigned high, Address patch, double position) {
+    Patch const& added = patchAt(patch);
+    unsigned long long const parent = idOf(low, high);
+    if (!edit.isDone() && !edit.fits(parent, Edit::levelsOf(added))) return kTooDeep;
+    if (!edit.changes.addPatch(parent, added, placeOf(position))) return kRefused;
+    edit.wasAdded(added, parent);
+    return kDone;
 }
-bool removePatch(PatchEdit& edit, unsigned low, unsigned high) {
-    return edit.removePatch(idOf(low, high));
+bool removePatch(Edit& edit, unsigned low, unsigned high) {
+    return edit.changes.removePatch(idOf(low, high));
 }
-bool movePatch(PatchEdit& edit, unsigned low, unsigned high, unsigned parentLow,
-               unsigned parentHigh, double position) {
-    return edit.movePatch(idOf(low, high), idOf(parentLow, parentHigh), placeOf(position));
+int movePatch(Edit& edit, unsigned low, unsigned high, unsigned parentLow, unsigned parentHigh,
+              double position) {
+    unsigned long long const id = idOf(low, high);
+    unsigned long long const parent = idOf(parentLow, parentHigh);
+    if (!edit.isDone() && !edit.fits(parent, edit.levelsOf(id))) return kTooDeep;
+    if (!edit.changes.movePatch(id, parent, placeOf(position))) return kRefused;
+    edit.wasMoved(id, parent);
+    return kDone;
 }
-bool connect(PatchEdit& edit, Bytes const& connection) {
-    return edit.connect(Reader(connection).connection());
+bool connect(Edit& edit, Bytes const& connection) {
+    return edit.changes.connect(Reader(connection).connection());
 }
-bool disconnect(PatchEdit& edit, Bytes const& connection) {
-    return edit.disconnect(Reader(connection).connection());
+bool disconnect(Edit& edit, Bytes const& connection) {
+    return edit.changes.disconnect(Reader(connection).connection());
 }
-std::string freshPatchId(PatchEdit& edit) { return std::to_string(edit.freshPatchId()); }
-std::string freshPortId(PatchEdit& edit) { return std::to_string(edit.freshPortId()); }
-Root commit(PatchEdit& edit) { return Root(edit.commit()); }
+std::string freshPatchId(Edit& edit) { return std::to_string(edit.changes.freshPatchId()); }
+std::string freshPortId(Edit& edit) { return std::to_string(edit.changes.freshPortId()); }
+Root commit(Edit& edit) { return edit.commit(); }
 
 // For each change its kind, its patch's identifier, both addresses and its text.
 val changes(Address before, Address after) {
@@ -183,16 +292,13 @@ val changes(Address before, Address after) {
     }
     return bytesOf(out.bytes);
 }
-std::string changesText(Address before, Address after) {
-    return to_string(patchChanges(patchAt(before), patchAt(after)));
-}
 
 }  // namespace
 
 EMSCRIPTEN_BINDINGS(graphs) {
     emscripten::class_<Root>("Root");
     emscripten::class_<PatchIndex>("Index");
-    emscripten::class_<PatchEdit>("Edit");
+    emscripten::class_<Edit>("Edit");
     native<&makeRoot>("makeRoot");
     native<&rootAddress>("rootAddress");
     native<&patchRecord>("patchRecord");
@@ -227,7 +333,6 @@ EMSCRIPTEN_BINDINGS(graphs) {
     native<&freshPortId>("freshPortId");
     native<&commit>("commit");
     native<&changes>("patchChanges");
-    native<&changesText>("patchChangesText");
 }
 
 }  // namespace web

@@ -1,15 +1,15 @@
 // Patches, their index, edits, changes, documents and what they compute.
 
 import * as check from "./check.js";
-import { native } from "./native.js";
+import { native, release } from "./native.js";
 import { Path } from "./paths.js";
 import { bytesOf, fromBytes, Type, typeInfoBytes, Unstructured, Value, valueOf } from "./values.js";
-import { Reader, skipData, skipValue, Writer } from "./wire.js";
+import { Reader, skipData, skipValue, textOf, Writer } from "./wire.js";
 
 const inspect = Symbol.for("nodejs.util.inspect.custom");
 
 // What is in the library's memory goes with the object that has it; `free` lets go of it at once.
-const forgotten = new FinalizationRegistry((handle) => handle.delete());
+const forgotten = new FinalizationRegistry(release);
 
 class Held {
   #handle;
@@ -27,7 +27,7 @@ class Held {
   free() {
     if (this.#handle === undefined) return;
     forgotten.unregister(this);
-    this.#handle.delete();
+    release(this.#handle);
     this.#handle = undefined;
   }
 }
@@ -80,7 +80,7 @@ function list(x, what) {
 function writeAttributes(out, attributes) {
   const data = attributes instanceof Unstructured ? attributes : new Unstructured(attributes ?? {});
   if (!data.isMap()) throw check.mustBe("attributes", "an object", attributes);
-  out.raw(data[bytesOf]);
+  out.raw(bytesOf(data));
 }
 
 function writePort(out, port) {
@@ -88,7 +88,7 @@ function writePort(out, port) {
   out.integer(check.identifier(id, "a port's id")).integer(check.identifier(tag, "a tag"));
   typeInfoBytes(typeInfo, out);
   const value = defaultValue === undefined ? Value.defaultValue(typeInfo.type ?? Type.Float) : valueOf(defaultValue);
-  out.raw(value[bytesOf]).text(check.string(name, "a port's name"));
+  out.raw(bytesOf(value)).text(check.string(name, "a port's name"));
   writeAttributes(out, attributes);
 }
 
@@ -300,7 +300,7 @@ const portFields = {
   tag: (out, x) => out.integer(check.identifier(x, "a tag")),
   name: (out, x) => out.text(check.string(x, "a name")),
   typeInfo: (out, x) => typeInfoBytes(x, out),
-  defaultValue: (out, x) => out.raw(valueOf(x)[bytesOf]),
+  defaultValue: (out, x) => out.raw(bytesOf(valueOf(x))),
   attributes: writeAttributes,
 };
 
@@ -368,21 +368,23 @@ export class PatchEdit {
   }
   addPatch(parentId, patch, position) {
     const added = patch instanceof Patch ? patch : new Patch(patch);
-    const at = check.position(position);
-    return native.addPatch(this.#held.handle, ...check.halves(parentId), addressOf(added), at);
+    const inputs = [...check.halves(parentId), addressOf(added), check.position(position)];
+    return isDone(native.addPatch(this.#held.handle, ...inputs));
   }
   removePatch(id) {
     return native.removePatch(this.#held.handle, ...check.halves(id));
   }
   movePatch(id, parentId, position) {
-    const at = check.position(position);
-    return native.movePatch(this.#held.handle, ...check.halves(id), ...check.halves(parentId), at);
+    const inputs = [...check.halves(id), ...check.halves(parentId), check.position(position)];
+    return isDone(native.movePatch(this.#held.handle, ...inputs));
   }
   connect(connection) {
-    return native.connect(this.#held.handle, written((out) => writeConnection(out, connection)));
+    const bytes = written((out) => writeConnection(out, connection));
+    return native.connect(this.#held.handle, bytes);
   }
   disconnect(connection) {
-    return native.disconnect(this.#held.handle, written((out) => writeConnection(out, connection)));
+    const bytes = written((out) => writeConnection(out, connection));
+    return native.disconnect(this.#held.handle, bytes);
   }
   freshPatchId() {
     return BigInt(native.freshPatchId(this.#held.handle));
@@ -396,6 +398,12 @@ export class PatchEdit {
   free() {
     this.#held.free();
   }
+}
+
+// As in graphs.cpp.
+function isDone(answer) {
+  if (answer === 2) throw new RangeError(`patches must not be nested deeper than ${deepest} levels`);
+  return answer === 1;
 }
 
 function gone(id) {
@@ -419,9 +427,13 @@ export function patchChanges(before, after) {
   }));
 }
 
+// In one line, whatever the keys of a document are.
+const shown = (pointer) =>
+  pointer.replace(/[\u0000-\u001f\u007f]/g, (c) => `\\x${c.charCodeAt(0).toString(16).padStart(2, "0")}`);
+
 export class DocumentError extends SyntaxError {
   constructor({ message, pointer, line, column }) {
-    super(line > 0 ? `line ${line}, column ${column}: ${pointer === "" ? "" : `${pointer}: `}${message}` : message);
+    super(line > 0 ? `line ${line}, column ${column}: ${pointer === "" ? "" : `${shown(pointer)}: `}${message}` : message);
     this.name = "DocumentError";
     Object.assign(this, { pointer, line, column });
   }
@@ -430,17 +442,19 @@ export class DocumentError extends SyntaxError {
 export const DocumentForm = Object.freeze({ Own: 0, NodeGraph: 1 });
 
 export function readDocumentWithInfo(text) {
-  const isBytes = text instanceof Uint8Array;
-  const { root, info, error } = native.readDocument(isBytes ? text : encoded(check.string(text, "a document")));
-  if (error !== undefined) throw new DocumentError(error);
-  return { root: rootFrom(root), info: Object.freeze(info) };
+  const isBytes = check.typedArrayKind(text) === "Uint8Array";
+  if (!isBytes && typeof text !== "string") throw check.mustBe("a document", "a string or a Uint8Array", text);
+  const { root, info, error } = native.readDocument(isBytes ? new Uint8Array(text) : new TextEncoder().encode(text));
+  if (error !== undefined) {
+    throw new DocumentError({ ...error, message: textOf(error.message), pointer: textOf(error.pointer) });
+  }
+  const notes = Object.freeze(info.notes.map(textOf));
+  return { root: rootFrom(root), info: Object.freeze({ ...info, notes, summary: textOf(info.summary) }) };
 }
-// Characters that are half of one become U+FFFD.
-const encoded = (text) => new TextEncoder().encode(text);
 
 export const readDocument = (text) => readDocumentWithInfo(text).root;
 export const writeDocument = (root, framesPerSecond = 60) =>
-  native.writeDocument(addressOf(patchOf(root)), check.number(framesPerSecond, "frames per second"));
+  textOf(native.writeDocument(addressOf(patchOf(root)), check.number(framesPerSecond, "frames per second")));
 
 export const kindToString = (builtin) => native.kindToString(...check.halves(builtin, "a builtin"));
 export function stringToKind(name) {
@@ -451,10 +465,11 @@ export function stringToKind(name) {
 export class Evaluator {
   #held;
 
-  constructor(root) {
+  constructor(root, framesPerSecond = 60) {
     const reason = native.whatIsNotShown(addressOf(patchOf(root)));
     if (reason !== "") throw new RangeError(reason);
-    this.#held = new Held(native.makeEvaluator(addressOf(root)), "evaluator");
+    const rate = check.number(framesPerSecond, "frames per second");
+    this.#held = new Held(native.makeEvaluator(addressOf(root), rate), "evaluator");
   }
   evaluate(frame) {
     if (!Number.isSafeInteger(frame)) throw check.mustBe("a frame", "a whole number", frame);
@@ -473,7 +488,7 @@ export class Evaluator {
   }
   drawn() {
     return native.drawn(this.#held.handle).map(({ name, path, svgPathData, isLayer, color, width }) => Object.freeze({
-      name, path: new Path(fromBytes, path), svgPathData, isLayer, color: new Value(fromBytes, color).vec4, width,
+      name: textOf(name), path: new Path(fromBytes, path), svgPathData, isLayer, color: new Value(fromBytes, color).vec4, width,
     }));
   }
   free() {

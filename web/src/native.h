@@ -14,7 +14,8 @@
 
 namespace web {
 
-// Bytes of an answer, as a Uint8Array of its own.
+// Bytes of an answer, as a Uint8Array of its own. Texts are answered so too: embind would take a
+// mark at their beginning away, and invent characters where bytes are none.
 inline emscripten::val bytesOf(std::string const& bytes) {
     auto const* const first = reinterpret_cast<unsigned char const*>(bytes.data());
     return emscripten::val(emscripten::typed_memory_view(bytes.size(), first))

@@ -2,7 +2,7 @@
 
 import * as check from "./check.js";
 import { native } from "./native.js";
-import { bytesOf, fromBytes, held, Value, valueOf } from "./values.js";
+import { bytesOf, fromBytes, held, remember, Value, valueOf } from "./values.js";
 import { Reader, Writer } from "./wire.js";
 
 const inspect = Symbol.for("nodejs.util.inspect.custom");
@@ -24,29 +24,27 @@ function pathBytes(elements) {
   const out = new Writer().count(list.length);
   for (const element of list) {
     if (element === null || typeof element !== "object") throw check.mustBe("an element", "{instruction, points}", element);
-    const points = Array.from(element.points ?? [], (p) => check.point(p, "a point of an element"));
-    out.byte(instructionOf(element.instruction)).count(points.length);
+    const { instruction, points: given = [] } = element;
+    if (!check.isList(given)) throw check.mustBe("an element's points", "an array of points", given);
+    const points = Array.from(given, (p) => check.point(p, "a point of an element"));
+    out.byte(instructionOf(instruction)).count(points.length);
     for (const [x, y] of points) out.number(x).number(y);
   }
   return out.bytes();
 }
 
 export class Path {
-  #bytes;
   #elements;
 
   constructor(elements = [], bytes = undefined) {
-    this.#bytes = elements === fromBytes ? bytes : pathBytes(elements);
-  }
-  get [bytesOf]() {
-    return this.#bytes;
+    remember(this, elements === fromBytes ? bytes : pathBytes(elements));
   }
   get length() {
-    return new Reader(this.#bytes).count();
+    return new Reader(bytesOf(this)).count();
   }
   get elements() {
     if (this.#elements === undefined) {
-      const reader = new Reader(this.#bytes);
+      const reader = new Reader(bytesOf(this));
       this.#elements = Object.freeze(Array.from({ length: reader.count() }, () => {
         const instruction = reader.byte();
         const points = Array.from({ length: reader.count() }, () => Object.freeze([reader.number(), reader.number()]));
@@ -56,7 +54,7 @@ export class Path {
     return this.#elements;
   }
   equals(other) {
-    return native.pathEquals(this.#bytes, pathOf(other, "what a path is compared with")[bytesOf]);
+    return native.pathEquals(bytesOf(this), bytesOf(pathOf(other, "what a path is compared with")));
   }
   toString() {
     return svgPathData(this);
@@ -69,22 +67,22 @@ held.Path = Path;
 
 const pathOf = (x, what = "a path") => check.instance(x, Path, what);
 
-export const svgPathData = (path) => native.svgPathData(pathOf(path)[bytesOf]);
+export const svgPathData = (path) => native.svgPathData(bytesOf(pathOf(path)));
 export function pathFromSvgPathData(data) {
   const answer = native.pathFromSvgPathData(check.string(data, "SVG path data"));
   if (typeof answer === "number") throw new SyntaxError(`this is no SVG path data from byte ${answer} on`);
   return new Path(fromBytes, answer);
 }
 export function bounds(path) {
-  const corners = native.bounds(pathOf(path)[bytesOf]);
+  const corners = native.bounds(bytesOf(pathOf(path)));
   return corners === null ? null : { min: [corners[0], corners[1]], max: [corners[2], corners[3]] };
 }
 export const translated = (path, offset) =>
-  new Path(fromBytes, native.translated(pathOf(path)[bytesOf], ...check.point(offset, "an offset")));
+  new Path(fromBytes, native.translated(bytesOf(pathOf(path)), ...check.point(offset, "an offset")));
 export const scaled = (path, factors) =>
-  new Path(fromBytes, native.scaled(pathOf(path)[bytesOf], ...check.point(factors, "the factors")));
+  new Path(fromBytes, native.scaled(bytesOf(pathOf(path)), ...check.point(factors, "the factors")));
 export function interpolate(a, b, t) {
-  const bytes = native.interpolate(pathOf(a)[bytesOf], pathOf(b)[bytesOf], check.number(t, "progress"));
+  const bytes = native.interpolate(bytesOf(pathOf(a)), bytesOf(pathOf(b)), check.number(t, "progress"));
   return bytes === null ? null : new Path(fromBytes, bytes);
 }
 
@@ -138,7 +136,8 @@ export class PathBuilder {
     return this.#draw(Command.close, []);
   }
   append(path) {
-    this.#commands.byte(Command.append).raw(pathOf(path)[bytesOf]);
+    const bytes = bytesOf(pathOf(path));
+    this.#commands.byte(Command.append).raw(bytes);
     return this.#drawn();
   }
   arcTo(p, verticalFirst) {
@@ -195,19 +194,21 @@ export function ease(easingFunction, start, end, t) {
   }
   if (typeof t === "number") {
     if (kind === "number" && other === "number") return native.easeNumber(curve, start, end, t);
-    const eased = new Value(fromBytes, native.easeValue(curve, valueOf(start)[bytesOf], valueOf(end)[bytesOf], t));
+    const eased = new Value(fromBytes, native.easeValue(curve, bytesOf(valueOf(start)), bytesOf(valueOf(end)), t));
     if (kind === "value" || other === "value") return eased;
     return kind === "bigint" ? eased.integer : eased[`vec${kind}`];
   }
-  const progress = t instanceof Float64Array ? t : progressOf(t);
+  const progress = progressOf(t);
   if (kind === "bigint" || kind === "value" || other === "value") {
     throw new TypeError("a list of progress is for numbers and vectors of numbers");
   }
-  return native.easeMany(curve, valueOf(start)[bytesOf], valueOf(end)[bytesOf], progress);
+  return native.easeMany(curve, bytesOf(valueOf(start)), bytesOf(valueOf(end)), progress);
 }
 
+// A copy, which nobody changes or takes away while it is read.
 function progressOf(t) {
-  const numbers = t !== null && typeof t === "object" && "length" in t ? check.listOfNumbers(t, [t.length]) : undefined;
+  if (check.typedArrayKind(t) === "Float64Array") return new Float64Array(t);
+  const numbers = check.listOfNumbers(t);
   if (numbers === undefined) throw check.mustBe("progress", "a number or a list of numbers", t);
   return Float64Array.from(numbers);
 }

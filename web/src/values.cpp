@@ -42,8 +42,8 @@ val valueVec2(Bytes const& value) { return numbersOf(FloatVec2(valueOf(value)));
 val valueVec3(Bytes const& value) { return numbersOf(FloatVec3(valueOf(value))); }
 val valueVec4(Bytes const& value) { return numbersOf(FloatVec4(valueOf(value))); }
 val valueMat4(Bytes const& value) { return numbersOf(FloatMat4(valueOf(value))); }
-std::string valueString(Bytes const& value) { return std::string(valueOf(value)); }
-std::string valueText(Bytes const& value) { return to_string(valueOf(value)); }
+val valueString(Bytes const& value) { return bytesOf(std::string(valueOf(value))); }
+val valueText(Bytes const& value) { return bytesOf(to_string(valueOf(value))); }
 val valuePath(Bytes const& value) { return bytesOf(Writer().path(Path(valueOf(value))).bytes); }
 val valueData(Bytes const& value) {
     return bytesOf(Writer().data(valueOf(value).asUnstructured()).bytes);
@@ -76,10 +76,10 @@ double dataNumber(Bytes const& data) { return dataOf(data).asFloat(); }
 bool dataTruth(Bytes const& data) { return dataOf(data).asBool(); }
 std::string dataInteger(Bytes const& data) { return std::to_string(dataOf(data).asInteger()); }
 std::string dataIdentifier(Bytes const& data) { return std::to_string(dataOf(data).asId()); }
-std::string dataString(Bytes const& data) { return dataOf(data).asString(); }
-std::string dataText(Bytes const& data, double maxBytes, double maxDepth) {
-    return dataOf(data).toText(static_cast<std::size_t>(maxBytes),
-                               static_cast<std::size_t>(maxDepth));
+val dataString(Bytes const& data) { return bytesOf(dataOf(data).asString()); }
+val dataText(Bytes const& data, double maxBytes, double maxDepth) {
+    return bytesOf(dataOf(data).toText(static_cast<std::size_t>(maxBytes),
+                                       static_cast<std::size_t>(maxDepth)));
 }
 bool dataEquals(Bytes const& a, Bytes const& b) { return dataOf(a) == dataOf(b); }
 double dataNumberAt(Bytes const& data, double otherwise) {

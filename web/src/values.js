@@ -2,14 +2,21 @@
 
 import * as check from "./check.js";
 import { native } from "./native.js";
-import { Kind, nullPayload, Reader, skipData, Writer } from "./wire.js";
+import { Kind, nullPayload, Reader, skipData, textOf, wellFormed, Writer } from "./wire.js";
 
 const inspect = Symbol.for("nodejs.util.inspect.custom");
 
 /** Makes an object of a class from bytes that the library wrote. */
 export const fromBytes = Symbol("from bytes");
-/** The bytes of such an object. */
-export const bytesOf = Symbol("bytes");
+// The bytes of each value, data and path. Nobody else can reach them, so they never change.
+const contents = new WeakMap();
+
+export const remember = (object, bytes) => contents.set(object, bytes);
+export function bytesOf(object) {
+  const bytes = contents.get(object);
+  if (bytes === undefined) throw check.mustBe("this", "a Value, an Unstructured or a Path", object);
+  return bytes;
+}
 
 export const Type = Object.freeze({
   Float: 0, Vec2: 1, Vec3: 2, Vec4: 3, Mat4: 4, Boolean: 5, Int: 6, Image: 7, Video: 8, Sound: 9, Path: 10, String: 11,
@@ -29,9 +36,10 @@ export const typeShouldCopyAcrossDeletedConnections = (type) =>
 // Other classes that a value holds; paths.js adds its own.
 export const held = { Path: undefined };
 
+// Of this page or of another.
 const plain = (x) => {
   const prototype = Object.getPrototypeOf(x);
-  return prototype === Object.prototype || prototype === null || x instanceof Map;
+  return prototype === null || Object.getPrototypeOf(prototype) === null || x instanceof Map;
 };
 
 /** Writes data from what JavaScript has for it. Of any depth; what contains itself is a TypeError. */
@@ -55,17 +63,21 @@ function writeData(out, data) {
       else out.byte(Kind.Float).number(value);
     } else if (typeof value === "bigint") {
       out.byte(Kind.Integer).integer(check.signed64(value, "an integer of data"));
+    } else if (typeof value === "boolean") {
+      out.byte(Kind.Integer).integer(value ? 1n : 0n);
     } else if (typeof value === "string") {
       out.byte(Kind.String).text(value);
     } else if (value instanceof Unstructured) {
-      out.raw(value[bytesOf]);
+      out.raw(bytesOf(value));
     } else if (value instanceof Value) {
-      out.raw(value.asUnstructured()[bytesOf]);
-    } else if (ArrayBuffer.isView(value) && !(value instanceof DataView)) {
-      out.byte(Kind.Array).count(value.length);
-      for (const n of value) {
-        if (typeof n === "bigint") out.byte(Kind.Integer).integer(n);
-        else out.byte(Kind.Float).number(n);
+      out.raw(bytesOf(value.asUnstructured()));
+    } else if (check.typedArrayKind(value) !== undefined) {
+      const isFloat = check.typedArrayKind(value).startsWith("Float");
+      const numbers = Array.from(value);
+      out.byte(Kind.Array).count(numbers.length);
+      for (const n of numbers) {
+        if (isFloat) out.byte(Kind.Float).number(check.number(n, "an element"));
+        else out.byte(Kind.Integer).integer(check.signed64(n, "an element"));
       }
     } else if (typeof value === "object" && (Array.isArray(value) || plain(value))) {
       if (inside.has(value)) throw new TypeError("data must not contain itself");
@@ -76,15 +88,15 @@ function writeData(out, data) {
       out.byte(isMap ? Kind.Map : Kind.Array).count(items.length);
       open.push({ items: items.values(), of: value, isMap });
     } else {
-      throw check.mustBe("data", "null, a number, a bigint, a string, an array or an object of such", value);
+      throw check.mustBe("data", "null, a number, a bigint, a boolean, a string, an array or an object of such", value);
     }
   }
 }
 
 function entriesOf(map) {
   const entries = (map instanceof Map ? [...map] : Object.entries(map)).filter(([, value]) => value !== undefined);
-  for (const [key] of entries) check.string(key, "a key of data");
-  return entries;
+  // Keys that become one are one; the last counts.
+  return [...new Map(entries.map(([key, value]) => [wellFormed(check.string(key, "a key of data")), value]))];
 }
 
 const smallest = (i) => (i >= Number.MIN_SAFE_INTEGER && i <= Number.MAX_SAFE_INTEGER ? Number(i) : i);
@@ -124,30 +136,25 @@ function readData(reader) {
 }
 
 export class Unstructured {
-  #bytes;
-
   constructor(data = null, bytes = undefined) {
     if (data === fromBytes) {
-      this.#bytes = bytes;
+      remember(this, bytes);
       return;
     }
     const out = new Writer();
     writeData(out, data);
-    this.#bytes = out.bytes();
+    remember(this, out.bytes());
   }
   static identifier(id) {
     return new Unstructured(fromBytes, new Writer().byte(Kind.UnsignedInteger).integer(check.identifier(id)).bytes());
   }
-  get [bytesOf]() {
-    return this.#bytes;
-  }
 
   get type() {
-    return this.#bytes[0];
+    return bytesOf(this)[0];
   }
   get size() {
     const isList = this.type === Kind.Map || this.type === Kind.Array;
-    return isList ? new Reader(this.#bytes.subarray(1)).count() : 0;
+    return isList ? new Reader(bytesOf(this).subarray(1)).count() : 0;
   }
   isNull() {
     return this.type === Kind.Null;
@@ -169,30 +176,30 @@ export class Unstructured {
   }
 
   asFloat() {
-    return native.dataNumber(this.#bytes);
+    return native.dataNumber(bytesOf(this));
   }
   asInteger() {
-    return BigInt(native.dataInteger(this.#bytes));
+    return BigInt(native.dataInteger(bytesOf(this)));
   }
   asId() {
-    return BigInt(native.dataIdentifier(this.#bytes));
+    return BigInt(native.dataIdentifier(bytesOf(this)));
   }
   asBool() {
-    return native.dataTruth(this.#bytes);
+    return native.dataTruth(bytesOf(this));
   }
   asString() {
-    return native.dataString(this.#bytes);
+    return textOf(native.dataString(bytesOf(this)));
   }
   /** What JavaScript has for it: integers are numbers where those are exact, else bigints. */
   toJS() {
-    return readData(new Reader(this.#bytes));
+    return readData(new Reader(bytesOf(this)));
   }
   toJSON() {
     return this.toJS();
   }
 
   find(...path) {
-    const reader = new Reader(this.#bytes);
+    const reader = new Reader(bytesOf(this));
     let begin = 0;
     for (const step of path) {
       if (typeof step !== "string" && !Number.isInteger(step)) throw check.mustBe("a step", "a key or a position", step);
@@ -201,28 +208,28 @@ export class Unstructured {
       let found = false;
       const size = reader.count();
       for (let i = 0; i < size && !found; ++i) {
-        found = kind === Kind.Map ? reader.text() === step : i === step;
+        found = kind === Kind.Map ? reader.text() === wellFormed(step) : i === step;
         if (!found) skipData(reader);
       }
       if (!found) return null;
       begin = reader.position;
     }
-    const rest = new Reader(this.#bytes.subarray(begin));
+    const rest = new Reader(bytesOf(this).subarray(begin));
     return new Unstructured(fromBytes, rest.part(skipData));
   }
   #at(path) {
     return this.find(...(Array.isArray(path) ? path : [path])) ?? new Unstructured();
   }
   numberAt(path, otherwise) {
-    return native.dataNumberAt(this.#at(path)[bytesOf], check.number(otherwise, "a number to give instead"));
+    return native.dataNumberAt(bytesOf(this.#at(path)), check.number(otherwise, "a number to give instead"));
   }
   integerAt(path, otherwise) {
     const [low, high] = check.halves(BigInt.asUintN(64, check.signed64(otherwise, "an integer to give instead")));
-    return BigInt(native.dataIntegerAt(this.#at(path)[bytesOf], low, high));
+    return BigInt(native.dataIntegerAt(bytesOf(this.#at(path)), low, high));
   }
   boolAt(path, otherwise) {
     if (typeof otherwise !== "boolean") throw check.mustBe("a truth to give instead", "a boolean", otherwise);
-    return native.dataBoolAt(this.#at(path)[bytesOf], otherwise);
+    return native.dataBoolAt(bytesOf(this.#at(path)), otherwise);
   }
   stringAt(path, otherwise) {
     const found = this.#at(path);
@@ -230,7 +237,8 @@ export class Unstructured {
   }
 
   toText(maxBytes = 4096, maxDepth = 16) {
-    return native.dataText(this.#bytes, limit(maxBytes, "a number of bytes"), limit(maxDepth, "a number of levels"));
+    const most = [limit(maxBytes, "a number of bytes"), limit(maxDepth, "a number of levels")];
+    return textOf(native.dataText(bytesOf(this), ...most));
   }
   toString() {
     return this.toText();
@@ -239,7 +247,7 @@ export class Unstructured {
     return `Unstructured(${this.toText()})`;
   }
   equals(other) {
-    return native.dataEquals(this.#bytes, check.instance(other, Unstructured, "what data is compared with")[bytesOf]);
+    return native.dataEquals(bytesOf(this), bytesOf(check.instance(other, Unstructured, "what data is compared with")));
   }
 }
 export const UnstructuredType = Kind;
@@ -258,9 +266,9 @@ function valueBytes(content) {
   if (typeof content === "boolean") return out.byte(Type.Boolean).byte(content ? 1 : 0).bytes();
   if (typeof content === "bigint") return out.byte(Type.Int).integer(check.signed64(content, "an integer")).bytes();
   if (typeof content === "string") return out.byte(Type.String).text(content).bytes();
-  if (content instanceof Value) return content[bytesOf];
-  if (content instanceof held.Path) return out.byte(Type.Path).raw(content[bytesOf]).bytes();
-  if (content instanceof Unstructured) return out.byte(Type.Unstructured).raw(content[bytesOf]).bytes();
+  if (content instanceof Value) return bytesOf(content);
+  if (content instanceof held.Path) return out.byte(Type.Path).raw(bytesOf(content)).bytes();
+  if (content instanceof Unstructured) return out.byte(Type.Unstructured).raw(bytesOf(content)).bytes();
   const numbers = check.listOfNumbers(content, [...vectors.keys()]);
   if (numbers !== undefined) {
     out.byte(vectors.get(numbers.length));
@@ -268,7 +276,7 @@ function valueBytes(content) {
     return out.bytes();
   }
   if (content !== null && typeof content === "object" && plain(content)) {
-    return out.byte(Type.Unstructured).raw(new Unstructured(content)[bytesOf]).bytes();
+    return out.byte(Type.Unstructured).raw(bytesOf(new Unstructured(content))).bytes();
   }
   throw check.mustBe("a value",
     "a number, a bigint, a boolean, a string, 2, 3, 4 or 16 numbers, a Path, an Unstructured or an object", content);
@@ -279,10 +287,8 @@ function resource(type) {
 }
 
 export class Value {
-  #bytes;
-
   constructor(content = 0, bytes = undefined) {
-    this.#bytes = content === fromBytes ? bytes : valueBytes(content);
+    remember(this, content === fromBytes ? bytes : valueBytes(content));
   }
   static Image = resource(Type.Image);
   static Video = resource(Type.Video);
@@ -291,52 +297,49 @@ export class Value {
   static defaultValue(type, qualifier = 0) {
     return new Value(fromBytes, native.valueDefault(typeOf(type), check.enumerator(qualifier, 256, "a qualifier")));
   }
-  get [bytesOf]() {
-    return this.#bytes;
-  }
 
   get type() {
-    return this.#bytes[0] & ~nullPayload;
+    return bytesOf(this)[0] & ~nullPayload;
   }
   get number() {
-    return native.valueNumber(this.#bytes);
+    return native.valueNumber(bytesOf(this));
   }
   get integer() {
-    return BigInt(native.valueInteger(this.#bytes));
+    return BigInt(native.valueInteger(bytesOf(this)));
   }
   get boolean() {
-    return native.valueTruth(this.#bytes);
+    return native.valueTruth(bytesOf(this));
   }
   get id() {
-    return BigInt(native.valueIdentifier(this.#bytes));
+    return BigInt(native.valueIdentifier(bytesOf(this)));
   }
   get vec2() {
-    return native.valueVec2(this.#bytes);
+    return native.valueVec2(bytesOf(this));
   }
   get vec3() {
-    return native.valueVec3(this.#bytes);
+    return native.valueVec3(bytesOf(this));
   }
   get vec4() {
-    return native.valueVec4(this.#bytes);
+    return native.valueVec4(bytesOf(this));
   }
   get mat4() {
-    return native.valueMat4(this.#bytes);
+    return native.valueMat4(bytesOf(this));
   }
   get string() {
-    return native.valueString(this.#bytes);
+    return textOf(native.valueString(bytesOf(this)));
   }
   get path() {
-    return new held.Path(fromBytes, native.valuePath(this.#bytes));
+    return new held.Path(fromBytes, native.valuePath(bytesOf(this)));
   }
   asUnstructured() {
-    return new Unstructured(fromBytes, native.valueData(this.#bytes));
+    return new Unstructured(fromBytes, native.valueData(bytesOf(this)));
   }
   asType(type) {
-    return new Value(fromBytes, native.valueAsType(this.#bytes, typeOf(type)));
+    return new Value(fromBytes, native.valueAsType(bytesOf(this), typeOf(type)));
   }
 
   toString() {
-    return native.valueText(this.#bytes);
+    return textOf(native.valueText(bytesOf(this)));
   }
   [Symbol.toPrimitive](hint) {
     return hint === "string" ? this.toString() : this.number;
@@ -345,7 +348,7 @@ export class Value {
     return `Value(${typeToString(this.type)} ${this})`;
   }
   equals(other) {
-    return native.valueEquals(this.#bytes, check.instance(other, Value, "what a value is compared with")[bytesOf]);
+    return native.valueEquals(bytesOf(this), bytesOf(check.instance(other, Value, "what a value is compared with")));
   }
 }
 
@@ -357,12 +360,12 @@ export function typeInfoBytes(info, out = new Writer()) {
   out.byte(typeOf(info.type ?? Type.Float)).byte(check.enumerator(info.subtype ?? 0, 256, "a subtype"));
   for (const bound of [info.min, info.max, info.extra]) {
     if (bound === undefined || bound === null) out.byte(0);
-    else out.byte(1).raw(valueOf(bound)[bytesOf]);
+    else out.byte(1).raw(bytesOf(valueOf(bound)));
   }
   return out.bytes();
 }
 
 export const castValueToType = (value, typeInfo) =>
-  new Value(fromBytes, native.valueCast(valueOf(value)[bytesOf], typeInfoBytes(typeInfo)));
+  new Value(fromBytes, native.valueCast(bytesOf(valueOf(value)), typeInfoBytes(typeInfo)));
 export const portNameForTypeInfo = (typeInfo, plural = false) =>
   native.portName(typeInfoBytes(typeInfo), Boolean(plural));

@@ -41,6 +41,9 @@ struct OpenForReading {
     }
 };
 
+// Two identifiers, a type without bounds, a default without a payload, no name and no attributes.
+constexpr std::size_t kSmallestPort = 8 + 8 + 5 + 1 + 4 + 5;
+
 // Added to the type of a value that holds no payload, which is not what it reads as.
 constexpr unsigned char kNullPayload = 0x80;
 
@@ -362,7 +365,7 @@ Port Reader::port() {
 }
 
 std::vector<Port> Reader::ports() {
-    std::vector<Port> list(countOf(32));
+    std::vector<Port> list(countOf(kSmallestPort));
     for (Port& element : list) element = port();
     return list;
 }
@@ -391,8 +394,8 @@ ModelLayer Reader::modelLayer() {
     return layer;
 }
 
-Patch Reader::patch() {
-    Patch patch;
+// Apart from the recursion, which then takes little of the stack at each level.
+[[gnu::noinline]] void Reader::patchFields(Patch& patch) {
     patch.id = integer();
     patch.builtin = integer();
     patch.name = text();
@@ -402,9 +405,20 @@ Patch Reader::patch() {
     patch.inputs = arrayOf(ports());
     patch.outputs = arrayOf(ports());
     patch.connections = arrayOf(connections());
-    std::vector<Patch> children(countOf(32));
-    for (Patch& child : children) child = this->patch();
-    patch.children = arrayOf(std::move(children));
+}
+
+void Reader::patch(Patch& patch) {
+    patchFields(patch);
+    std::size_t const count = countOf(32);
+    if (count == 0) return;
+    auto const children = std::make_shared<std::vector<Patch>>(count);
+    for (Patch& child : *children) this->patch(child);
+    patch.children = children;
+}
+
+Patch Reader::patch() {
+    Patch patch;
+    this->patch(patch);
     return patch;
 }
 

@@ -64,6 +64,8 @@ public:
     tarn::engine::Patch patch();
 
 private:
+    void patch(tarn::engine::Patch& patch);
+    void patchFields(tarn::engine::Patch& patch);
     tarn::engine::Unstructured scalarData(tarn::engine::Unstructured::Type kind);
     std::string_view take(std::size_t bytes);
     std::size_t countOf(std::size_t bytesOfEach);

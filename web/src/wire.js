@@ -3,6 +3,10 @@
 const encoder = new TextEncoder();
 const decoder = new TextDecoder("utf-8", { ignoreBOM: true });
 
+export const textOf = (bytes) => decoder.decode(bytes);
+/** As the library has it: half a surrogate pair becomes U+FFFD. */
+export const wellFormed = (text) => decoder.decode(encoder.encode(text));
+
 export class Writer {
   #bytes = new Uint8Array(64);
   #view = new DataView(this.#bytes.buffer);

@@ -1,0 +1,150 @@
+// What is made to break the module: objects that lie, change or are taken away while they are read, and graphs that no editor
+// makes. Every row leaves the library as it was.
+
+import assert from "node:assert/strict";
+import { afterEach, test } from "node:test";
+import vm from "node:vm";
+
+import * as engine from "../../build/web/engine_base.mjs";
+
+const { Patch, PatchEdit, PatchIndex, PathBuilder, Unstructured, Value } = engine;
+
+afterEach(() => assert.equal(`${new Value([1, 2])}`, "1, 2"));
+
+class Lying extends Float64Array {
+  get length() {
+    return 8;
+  }
+  *[Symbol.iterator]() {
+    yield "x";
+  }
+}
+
+function detached(array) {
+  structuredClone(array.buffer, { transfer: [array.buffer] });
+  return array;
+}
+
+test("a builder that refused a path goes on", () => {
+  const builder = new PathBuilder().moveTo([1, 2]);
+  assert.throws(() => builder.append(null), TypeError);
+  assert.throws(() => builder.append({}), TypeError);
+  assert.equal(`${builder.lineTo([3, 4]).build()}`, "M1 2L3 4");
+});
+
+test("points are read once", () => {
+  let reads = 0;
+  const builder = new PathBuilder();
+  builder.moveTo({ get x() { return reads++ === 0 ? 5 : 1n; }, y: 0 });
+  assert.equal(`${builder.build()}`, "M5 0");
+});
+
+test("lists that lie are read as what they hold", () => {
+  for (const list of [new Lying(4), Object.defineProperty(new Float64Array(4), "length", { value: 2 ** 29 })]) {
+    assert.throws(() => new Unstructured(new Lying(4)), TypeError);
+    assert.equal(engine.ease(0, 0, 1, list).length, 4);
+  }
+  assert.equal(engine.ease(0, 0, 1, detached(new Float64Array(4)).length).length, undefined);
+  for (let i = 0; i < 30000; ++i) assert.throws(() => engine.ease(0, 0, 1, detached(new Float64Array(1))), TypeError);
+  for (const length of [-3, 2 ** 32 + 10]) {
+    const bytes = Object.defineProperty(new TextEncoder().encode("{}"), "length", { value: length });
+    assert.throws(() => engine.readDocument(bytes), engine.DocumentError);
+  }
+  assert.throws(() => engine.ease(0, 0, 1, Object.create(Float64Array.prototype)), TypeError);
+});
+
+test("integers of typed arrays are kept or refused", () => {
+  assert.equal(new Unstructured(new Int32Array([1, 2])).toText(), "[1, 2]");
+  assert.throws(() => new Unstructured(new BigUint64Array([2n ** 64n - 1n])), RangeError);
+  assert.throws(() => new Value(1n << 1000000n), { name: "RangeError", message: /a very large integer/ });
+});
+
+test("values never change, and nothing of them can be reached", () => {
+  const value = new Value("abc");
+  assert.deepEqual(Object.getOwnPropertySymbols(Value.prototype).map(String),
+    ["Symbol(Symbol.toPrimitive)", "Symbol(nodejs.util.inspect.custom)"]);
+  assert.deepEqual([Object.keys(value), Object.getOwnPropertySymbols(value)], [[], []]);
+  for (const get of ["number", "string", "path", "type"]) {
+    assert.throws(() => Object.getOwnPropertyDescriptor(Value.prototype, get).get.call(Object.create(Value.prototype)),
+      { name: "TypeError", message: /^this must be a Value/ });
+  }
+});
+
+test("texts keep their marks, and bytes that are none become U+FFFD", () => {
+  for (const text of ["\ufeff" + "a".repeat(30), "x\0\ufeff" + "a".repeat(40), "\ufeffa"]) {
+    assert.equal(new Value(text).string, text);
+    assert.equal(`${new Value(text)}`, text);
+    assert.equal(new Unstructured(text).asString(), text);
+  }
+  const document = '{"root":{"id":1,"inputs":[{"id":1,"type":"string","default":"a\\u001ae2b"}]}}';
+  assert.equal(engine.readDocument(document).inputs[0].defaultValue.string, "a\ufffdb");
+});
+
+test("keys are as the library has them", () => {
+  const data = new Unstructured(new Map([["\ud800", 1], ["\ud801", 2]]));
+  assert.deepEqual([data.size, data.find("\ufffd").asInteger(), data.find("\ud800").asInteger()], [1, 2n, 2n]);
+});
+
+test("objects of other realms are as good", () => {
+  assert.equal(new Unstructured(vm.runInNewContext("({a: [1, new Float64Array([2])]})")).toText(), '{"a": [1, [2.0]]}');
+  assert.equal(`${new Value(vm.runInNewContext("new Float32Array([1, 2])"))}`, "1, 2");
+  const bytes = vm.runInNewContext("Uint8Array.from(text, (c) => c.charCodeAt(0))", { text: '{"root":{"id":5}}' });
+  assert.equal(engine.readDocument(bytes).id, 5n);
+});
+
+test("graphs whose connections lead nowhere are evaluated", () => {
+  const text = '{"identifiers":"any","root":{"id":1,"connections":[{"from":[5,6],"to":[7,8]}]}}';
+  assert.deepEqual(new engine.Evaluator(engine.readDocument(text)).evaluate(0).drawn(), []);
+});
+
+test("evaluators keep to the frames per second", () => {
+  const root = engine.readDocument('{"root":{"id":1,"children":[{"id":2,"kind":"time","outputs":[{"id":3,"type":"float"}]}]}}');
+  assert.equal(new engine.Evaluator(root, 10).evaluate(10).outputValues(3)[0].number, 1);
+  assert.equal(new engine.Evaluator(root).evaluate(60).outputValues(3)[0].number, 1);
+});
+
+test("ports that hold nothing are copied", () => {
+  const ports = Array.from({ length: 40 }, (_, i) => `{"id":${i + 1},"type":"string","defaultType":"null string"}`);
+  const { inputs } = engine.readDocument(`{"root":{"id":1,"inputs":[${ports}]}}`);
+  assert.equal(new Patch({ id: 1, inputs }).inputs.length, 40);
+});
+
+test("edits do not nest patches deeper than graphs may be", () => {
+  const chain = (first, levels) => {
+    let patch = { id: first + levels - 1 };
+    for (let i = first + levels - 2; i >= first; --i) patch = { id: i, children: [patch] };
+    return patch;
+  };
+  const edit = new PatchEdit(new PatchIndex(new Patch(chain(1, 10))));
+  for (let i = 10; i < 1000; ++i) assert.ok(edit.addPatch(i, { id: i + 1 }));
+  assert.throws(() => edit.addPatch(1000, { id: 2000 }), { name: "RangeError", message: /deeper than 1000 levels/ });
+  assert.ok(edit.addPatch(1, chain(3000, 999)));
+  assert.throws(() => edit.addPatch(2, chain(5000, 999)), RangeError);
+  assert.throws(() => edit.movePatch(3000, 2), RangeError);
+  assert.ok(!edit.addPatch(1, { id: 5 }));
+  assert.ok(edit.movePatch(500, 1));
+  assert.ok(edit.addPatch(1000, chain(7000, 400)));
+  const root = edit.commit();
+  assert.equal(root.children.length, 3);
+  assert.ok(!edit.addPatch(1, { id: 9000 }));
+  root.free();
+});
+
+test("positions beyond a list are its end", () => {
+  for (const position of [2, 2 ** 32, Number.MAX_SAFE_INTEGER]) {
+    const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1, children: [{ id: 2 }, { id: 3 }] })));
+    assert.ok(edit.addPatch(1, { id: 4 }, position));
+    assert.deepEqual(edit.commit().children.map(({ id }) => id), [2n, 3n, 4n]);
+  }
+});
+
+test("what is freed while an argument is read is said", () => {
+  const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1 })));
+  const connection = { get fromPatchId() { edit.free(); return 1; }, fromPortId: 1, toPatchId: 1, toPortId: 1 };
+  assert.throws(() => edit.connect(connection), { message: "this edit was freed" });
+});
+
+test("errors of documents are one line", () => {
+  assert.throws(() => engine.readDocument('{"root":{"id":1,"attributes":{},"children":[{"id":"\\n"}]}}'),
+    (error) => !/[\u0000-\u001f]/.test(error.message));
+});
