@@ -76,7 +76,7 @@ TEST_F(ReplaceFile, SavesAndLoadsDocuments) {
     root.name = "saved";
     ASSERT_TRUE(saveDocument(file.string(), root, 24.0));
     DocumentInfo info;
-    EXPECT_TRUE(loadDocument(file.string(), nullptr, &info) == root);
+    EXPECT_EQ(loadDocument(file.string(), nullptr, &info), root);
     EXPECT_EQ(info.framesPerSecond, 24.0);
     EXPECT_EQ(contentsOf(file), writeDocument(root, 24.0));
 }

@@ -961,7 +961,7 @@ TEST(ReadDocument, TakesDefinitionsInsideOthers) {
     };
     // In each of two uses: itself, three pairs with three patches inside, and the inline group.
     EXPECT_EQ(count(*root), 1u + 2 * (1 + 3 * 4 + 1));
-    EXPECT_TRUE(readDocument(writeDocument(*root)) == root);
+    EXPECT_EQ(readDocument(writeDocument(*root)), root);
 }
 
 TEST(ReadDocument, RefusesDefinitionsWithoutEnd) {
@@ -1054,7 +1054,7 @@ TEST(ReadDocument, NestsTenThousandLevels) {
     tests::onStackOf(tests::kStack, [&] {
         Optional<Patch> const root = readDocument(nested(deepest));
         ASSERT_TRUE(root.hasValue());
-        EXPECT_TRUE(readDocument(writeDocument(*root)) == root);
+        EXPECT_EQ(readDocument(writeDocument(*root)), root);
     });
     EXPECT_EQ(errorOf(nested(10001)).substr(0, 13), "line 1, colum");
     EXPECT_NE(errorOf(nested(10001)).find(": patches nest deeper than 10000 levels"),
@@ -1078,7 +1078,7 @@ TEST(ReadDocument, ReadsDataOfAnyDepth) {
             Optional<Patch> const root =
                 readDocument(R"({"root":{"id":1,"attributes":{"a":)" + data + "}}}");
             ASSERT_TRUE(root.hasValue());
-            EXPECT_TRUE(readDocument(writeDocument(*root)) == root);
+            EXPECT_EQ(readDocument(writeDocument(*root)), root);
             EXPECT_TRUE(readDocument(R"({"nodes":[],"a":)" + data + "}").hasValue());
         }
     });

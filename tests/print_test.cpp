@@ -53,4 +53,8 @@ TEST(Print, OfTypesAndPartsIsNoListOfBytes) {
     EXPECT_EQ(PrintToString(FloatVec2{0.5, 1}), "(0.5, 1.0)");
     EXPECT_EQ(PrintToString(PathElement{PathInstruction::lineTo, {{1, 2}}}), "lineTo (1.0, 2.0)");
     EXPECT_EQ(PrintToString(Unstructured()), "data null");
+    EXPECT_EQ(PrintToString(Optional<Value>()), "nothing");
+    EXPECT_EQ(PrintToString(Optional<Type>(Type::Vec2)), "vec2");
+    EXPECT_EQ(PrintToString(TypeInfo{Type::Float, 1, Value(0), {}, Value("mm")}),
+              "float, subtype 1, int 0, nothing, string \"mm\"");
 }

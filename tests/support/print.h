@@ -111,12 +111,9 @@ inline void PrintTo(Value const& value, std::ostream* stream) {
     value.visit(tests::ContentPrinter{stream});
 }
 
-inline void PrintTo(Optional<Value> const& value, std::ostream* stream) {
-    if (value) {
-        PrintTo(*value, stream);
-    } else {
-        *stream << "nothing";
-    }
+template <class T>
+void PrintTo(Optional<T> const& value, std::ostream* stream) {
+    *stream << (value ? testing::PrintToString(*value) : "nothing");
 }
 
 inline void PrintTo(TypeInfo const& info, std::ostream* stream) {
