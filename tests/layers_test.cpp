@@ -12,15 +12,9 @@
 #include <sstream>
 
 using namespace tarn::engine;
+using tests::written;
 
 namespace {
-
-template <class T>
-std::string written(T const& what) {
-    std::ostringstream stream;
-    stream << what;
-    return stream.str();
-}
 
 RenderLayerHierarchy hierarchy(unsigned long long id,
                                std::vector<RenderLayerHierarchy> leading = {},

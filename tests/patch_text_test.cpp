@@ -17,17 +17,6 @@
 using namespace tarn::engine;
 using namespace tests;
 
-namespace {
-
-template <class T>
-std::string written(T const& what) {
-    std::ostringstream stream;
-    stream << what;
-    return stream.str();
-}
-
-}  // namespace
-
 TEST(GraphText, OfPortsAndConnections) {
     Port p = port(12, 34);
     p.typeInfo.type = Type::Vec2;

@@ -1,4 +1,4 @@
-// tests/support/streams.h: streams that show how they were written to.
+// tests/support/streams.h: what is written to streams, and how.
 
 #ifndef TARN_TESTS_SUPPORT_STREAMS_H
 #define TARN_TESTS_SUPPORT_STREAMS_H
@@ -6,8 +6,17 @@
 #include <algorithm>
 #include <locale>
 #include <sstream>
+#include <string>
 
 namespace tests {
+
+/// What `what` is on a stream.
+template <class T>
+std::string written(T const& what) {
+    std::ostringstream stream;
+    stream << what;
+    return stream.str();
+}
 
 /// Counts how often a stream is flushed.
 struct FlushCounter : std::stringbuf {

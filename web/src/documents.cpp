@@ -23,10 +23,6 @@ namespace web {
 
 namespace {
 
-using Address = std::uintptr_t;
-
-Patch const& patchAt(Address address) { return *reinterpret_cast<Patch const*>(address); }
-
 val errorOf(DocumentError const& error) {
     val object = val::object();
     object.set("message", bytesOf(error.message));

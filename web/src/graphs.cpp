@@ -1,7 +1,4 @@
 // Patches, their index, edits and changes.
-//
-// A patch is known by its address: JavaScript keeps the root that it lives in for as long as it has
-// it.
 
 #include "graphs.h"
 #include "native.h"
@@ -26,12 +23,10 @@ namespace web {
 namespace {
 
 using Bytes = std::string;
-using Address = std::uintptr_t;
 
 // As in graphs.js and for documents.
 constexpr std::size_t kDeepest = 1000;
 
-Patch const& patchAt(Address address) { return *reinterpret_cast<Patch const*>(address); }
 Address addressOf(Patch const* patch) { return reinterpret_cast<Address>(patch); }
 
 Root makeRoot(Bytes const& patch) { return Root(Reader(patch).patch()); }

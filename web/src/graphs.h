@@ -5,10 +5,17 @@
 
 #include <Engine/Base/patch.h>
 
+#include <cstdint>
 #include <memory>
 #include <utility>
 
 namespace web {
+
+// A patch as JavaScript knows it: that keeps the root which it lives in for as long as it has it.
+using Address = std::uintptr_t;
+inline tarn::engine::Patch const& patchAt(Address address) {
+    return *reinterpret_cast<tarn::engine::Patch const*>(address);
+}
 
 // A graph in one place, whatever becomes of its owner.
 struct Root {
