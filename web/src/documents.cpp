@@ -7,6 +7,7 @@
 #include "animation/evaluator.h"
 #include "animation/scene.h"
 
+#include <Engine/Base/patch_index.h>
 #include <Engine/Document/document.h>
 
 #include <cstddef>
@@ -71,11 +72,13 @@ struct Evaluation {
     Evaluation(Patch root, DocumentInfo info)
         : document{std::move(root), std::move(info)},
           evaluator(document),
-          scene(document, evaluator.root()) {}
+          scene(document, evaluator.root()),
+          index(evaluator.root()) {}
 
     Document document;
     Evaluator evaluator;
     Scene scene;
+    EvalPatchIndex index;
 };
 struct EvaluationHandle {
     std::shared_ptr<Evaluation> held;
@@ -90,21 +93,10 @@ EvaluationHandle makeEvaluator(Address root, double framesPerSecond) {
 void evaluate(EvaluationHandle& evaluation, double frame) {
     evaluation.held->evaluator.evaluate(static_cast<long long>(frame));
 }
-EvalPort const* findPort(EvalPatch const& root, bool isInput, unsigned long long id) {
-    std::vector<EvalPatch const*> pending{&root};
-    while (!pending.empty()) {
-        EvalPatch const& patch = *pending.back();
-        pending.pop_back();
-        for (EvalPort const& port : isInput ? *patch.inputs : *patch.outputs) {
-            if (port.id == id) return &port;
-        }
-        for (EvalPatch const& child : *patch.children) pending.push_back(&child);
-    }
-    return nullptr;
-}
 val portValues(EvaluationHandle const& evaluation, bool isInput, unsigned low, unsigned high) {
-    EvalPort const* const port =
-        findPort(evaluation.held->evaluator.root(), isInput, idOf(low, high));
+    EvalPatchIndex const& index = evaluation.held->index;
+    unsigned long long const id = idOf(low, high);
+    EvalPort const* const port = isInput ? index.findInputPort(id) : index.findOutputPort(id);
     if (port == nullptr) return val::null();
     Writer out;
     out.count(port->values.size());

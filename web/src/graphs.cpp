@@ -12,6 +12,7 @@
 #include <memory>
 #include <string>
 #include <unordered_map>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -114,41 +115,16 @@ public:
         return depthOf(parent) + levels <= kDeepest;
     }
     static std::size_t levelsOf(Patch const& added) {
-        std::size_t levels = 0;
-        std::vector<std::pair<Patch const*, std::size_t>> pending{{&added, 1}};
-        while (!pending.empty()) {
-            auto const [patch, level] = pending.back();
-            pending.pop_back();
-            levels = std::max(levels, level);
-            for (Patch const& child : *patch->children) pending.emplace_back(&child, level + 1);
-        }
-        return levels;
+        return levelsBelow(added.id, &added, nullptr);
     }
     // Those of a patch in the edit. What was removed from it counts as if it were there.
     std::size_t levelsOf(unsigned long long id) const {
-        std::size_t levels = 0;
-        std::vector<std::pair<unsigned long long, std::size_t>> pending{{id, 1}};
-        while (!pending.empty()) {
-            auto const [top, level] = pending.back();
-            pending.pop_back();
-            levels = std::max(levels, level);
-            if (Patch const* const patch = before->findPatch(top)) {
-                for (Patch const& child : *patch->children) {
-                    if (parents.count(child.id) == 0) pending.emplace_back(child.id, level + 1);
-                }
-            }
-            auto const further = children.find(top);
-            if (further == children.end()) continue;
-            for (unsigned long long const child : further->second) {
-                if (parents.at(child) == top) pending.emplace_back(child, level + 1);
-            }
-        }
-        return levels;
+        return levelsBelow(id, before->findPatch(id), this);
     }
 
     void wasMoved(unsigned long long id, unsigned long long parent) {
         parents[id] = parent;
-        children[parent].push_back(id);
+        children[parent].insert(id);
     }
     void wasAdded(Patch const& added, unsigned long long parent) {
         std::vector<std::pair<Patch const*, unsigned long long>> pending{{&added, parent}};
@@ -167,24 +143,56 @@ public:
     bool isDone() const { return before == nullptr; }
 
 private:
+    // The levels of a patch as it is, or as it is in the edit. Ends with the first that is too
+    // deep: where identifiers repeat, patches that were moved may seem to be in themselves.
+    static std::size_t levelsBelow(unsigned long long id, Patch const* patch, Edit const* edit) {
+        struct Open {
+            unsigned long long id;
+            Patch const* patch;  // Null for one that was added.
+            std::size_t level;
+        };
+        std::size_t levels = 0;
+        std::vector<Open> pending{{id, patch, 1}};
+        while (!pending.empty() && levels <= kDeepest) {
+            Open const top = pending.back();
+            pending.pop_back();
+            levels = std::max(levels, top.level);
+            if (top.patch != nullptr) {
+                for (Patch const& child : *top.patch->children) {
+                    bool const isElsewhere = edit != nullptr && edit->parents.count(child.id) != 0;
+                    if (!isElsewhere) pending.push_back({child.id, &child, top.level + 1});
+                }
+            }
+            if (edit == nullptr) continue;
+            auto const further = edit->children.find(top.id);
+            if (further == edit->children.end()) continue;
+            for (unsigned long long const child : further->second) {
+                if (edit->parents.at(child) != top.id) continue;
+                pending.push_back({child, edit->before->findPatch(child), top.level + 1});
+            }
+        }
+        return levels;
+    }
+
     std::size_t depthOf(unsigned long long id) const {
         std::size_t depth = 1;
-        for (;; ++depth) {
+        for (; depth <= kDeepest; ++depth) {
             auto const moved = parents.find(id);
             if (moved != parents.end()) {
                 id = moved->second;
             } else if (Patch const* const parent = before->parentOf(id)) {
                 id = parent->id;
             } else {
-                return depth;
+                break;
             }
         }
+        return depth;
     }
 
     std::unique_ptr<PatchIndex> before;
     // Of the patches that were added or moved.
     std::unordered_map<unsigned long long, unsigned long long> parents;
-    std::unordered_map<unsigned long long, std::vector<unsigned long long>> children;
+    std::unordered_map<unsigned long long, std::unordered_set<unsigned long long>> children;
 };
 
 Edit makeEdit(PatchIndex const& index) { return Edit(index); }

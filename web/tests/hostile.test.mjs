@@ -130,6 +130,25 @@ test("edits do not nest patches deeper than graphs may be", () => {
   root.free();
 });
 
+test("moves over and over, and among repeated identifiers, come to an end", () => {
+  let chain = { id: 40 };
+  for (let id = 39; id > 2; --id) chain = { id, children: [chain] };
+  const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1, children: [{ id: 2 }, chain] })));
+  for (let id = 40; id > 3; --id) {
+    for (const parent of [2, id - 1, 2, id - 1]) assert.ok(edit.movePatch(id, parent));
+  }
+  assert.ok(edit.movePatch(3, 2));
+  const repeated = new Patch({ id: 1, children: [{ id: 2, children: [{ id: 1 }, { id: 3 }, { id: 3 }] }, { id: 3 }] });
+  const other = new PatchEdit(new PatchIndex(repeated));
+  for (const [id, parent] of [[2, 3], [3, 2], [2, 1], [3, 1]]) {
+    try {
+      assert.equal(typeof other.movePatch(id, parent), "boolean");
+    } catch (error) {
+      assert.equal(error.name, "RangeError");
+    }
+  }
+});
+
 test("positions beyond a list are its end", () => {
   for (const position of [2, 2 ** 32, Number.MAX_SAFE_INTEGER]) {
     const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1, children: [{ id: 2 }, { id: 3 }] })));
