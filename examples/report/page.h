@@ -11,6 +11,24 @@
 
 #include <string>
 
+// What follows from frames. The sections are HTML, and empty where nothing is drawn or changes over
+// time; `data` is what they play, as JSON.
+struct FilmSections {
+    std::string animation;
+    std::string outputs;
+    std::string data;
+};
+FilmSections filmSections(Document const& document, long long frames);
+
+// What follows from the graph alone, as HTML. `changes` is empty without marks, and `attributes`
+// where there are none.
+struct GraphSections {
+    std::string changes;
+    std::string graph;
+    std::string attributes;
+};
+GraphSections graphSections(tarn::engine::Patch const& root, Marks const* marks = nullptr);
+
 // `fileName` is shown as the heading; `frames` are evaluated and played. Where there are `marks`,
 // the changes are listed and marked in the graph.
 std::string pageText(Document const& document, std::string const& fileName, long long frames,

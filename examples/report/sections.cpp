@@ -144,8 +144,9 @@ std::string levelsText(Patch const& root, Marks const* marks) {
                 paragraph("Shown are the first " + std::to_string(level.boxes.size()) + "."));
         }
         if (level.isInRows) {
-            figure.add(paragraph("Graphviz takes too long for this level: its patches are in rows, "
-                                 "in the order of the document."));
+            figure.add(
+                paragraph("To place the patches of this level takes too long: they are in rows, in "
+                          "the order of the document."));
         }
         if (depth == 1) figure.add(rootPortsText(drawing, group));
         if (level.boxes.empty()) {

@@ -1,9 +1,7 @@
-"use strict";
+// What the sections of the page do. Each function is called when its section is in the document, and again when that was
+// replaced.
 
-const data = JSON.parse(document.getElementById("data").textContent);
 const byId = (id) => document.getElementById(id);
-const lastFrame = data.frames.length - 1;
-let frame = 0;
 
 // The points of a path and what belongs to them, from the text of its `d`.
 function handlesOf(d) {
@@ -41,24 +39,27 @@ function showHandles(group, d) {
     }
 }
 
-// Animation
+// Animation and plots
 
-const drawn = byId("drawn");
-// Where nothing is drawn there is no player; plots keep the frame all the same.
-const slider = byId("frame") ?? document.createElement("input");
-const play = byId("play") ?? document.createElement("button");
-const charts = [...document.querySelectorAll(".chart")];
+let film;
+let frame = 0;
+let playing = 0;
+// The elements of the film that is shown.
+let drawn, slider, play, charts;
+let frameChanged;
+
+const lastFrame = () => film.frames.length - 1;
 
 function showScene() {
     if (!drawn) return;
-    const items = data.frames[frame];
+    const items = film.frames[frame];
     while (drawn.children.length < items.length) drawn.append(svgElement("path", {}));
     [...drawn.children].forEach((path, i) => {
         if (i >= items.length) {
             path.removeAttribute("d");
             return;
         }
-        const [d, color, width] = items[i].map((text) => data.texts[text]);
+        const [d, color, width] = items[i].map((text) => film.texts[text]);
         path.setAttribute("d", d);
         path.setAttribute("class", color === undefined ? "outline" : "layer");
         if (color === undefined) {
@@ -70,11 +71,11 @@ function showScene() {
     });
     byId("points").style.display = byId("show-points").checked ? "" : "none";
     if (byId("show-points").checked) {
-        showHandles(byId("points"), items.map(([d]) => data.texts[d]).join(" "));
+        showHandles(byId("points"), items.map(([d]) => film.texts[d]).join(" "));
     }
 }
 
-const plotText = (chart, at) => data.texts[data.plots[chart.dataset.plot][at]];
+const plotText = (chart, at) => film.texts[film.plots[chart.dataset.plot][at]];
 
 function showPlot(chart, at) {
     chart.querySelector(".cursor").setAttribute("d", `M${at} -3V103`);
@@ -84,8 +85,8 @@ function showPlot(chart, at) {
 }
 
 function showFrame(next) {
-    frame = Math.min(Math.max(next, 0), lastFrame);
-    const time = `${frame}, ${(frame / data.framesPerSecond).toFixed(2)} s`;
+    frame = Math.min(Math.max(next, 0), lastFrame());
+    const time = `${frame}, ${(frame / film.framesPerSecond).toFixed(2)} s`;
     slider.value = frame;
     slider.setAttribute("aria-valuetext", time);
     if (drawn) byId("time").textContent = time;
@@ -95,9 +96,9 @@ function showFrame(next) {
         chart.setAttribute("aria-valuetext", `frame ${frame}: ${plotText(chart, frame)}`);
         if (!chart.matches(":hover")) showPlot(chart, frame);
     }
+    frameChanged(frame);
 }
 
-let playing = 0;
 function setPlaying(on) {
     cancelAnimationFrame(playing);
     playing = 0;
@@ -106,8 +107,8 @@ function setPlaying(on) {
     const startFrame = frame;
     const start = performance.now();
     const step = (now) => {
-        const passed = Math.floor(Math.max(now - start, 0) / 1000 * data.framesPerSecond);
-        const next = (startFrame + Math.min(passed, Number.MAX_SAFE_INTEGER - startFrame)) % (lastFrame + 1);
+        const passed = Math.floor(Math.max(now - start, 0) / 1000 * film.framesPerSecond);
+        const next = (startFrame + Math.min(passed, Number.MAX_SAFE_INTEGER - startFrame)) % (lastFrame() + 1);
         if (next !== frame) showFrame(next);
         playing = requestAnimationFrame(step);
     };
@@ -120,45 +121,58 @@ function keyStep(key) {
     return steps[key];
 }
 
-play.addEventListener("click", () => setPlaying(!playing));
-slider.addEventListener("input", () => {
+function goTo(next) {
     setPlaying(false);
-    showFrame(Number(slider.value));
-});
-byId("show-points")?.addEventListener("change", showScene);
-byId("animation")?.addEventListener("keydown", (event) => {
-    if (event.target === slider && event.key === " ") {
-        event.preventDefault();
-        setPlaying(!playing);
-    }
-    if (event.target === play && keyStep(event.key) !== undefined) {
-        event.preventDefault();
-        setPlaying(false);
-        showFrame(frame + keyStep(event.key));
-    }
-});
+    showFrame(next);
+}
 
-// Plots
+function bindPlayer() {
+    play.addEventListener("click", () => setPlaying(!playing));
+    slider.addEventListener("input", () => goTo(Number(slider.value)));
+    byId("show-points")?.addEventListener("change", showScene);
+    byId("animation")?.addEventListener("keydown", (event) => {
+        if (event.target === slider && event.key === " ") {
+            event.preventDefault();
+            setPlaying(!playing);
+        }
+        if (event.target === play && keyStep(event.key) !== undefined) {
+            event.preventDefault();
+            goTo(frame + keyStep(event.key));
+        }
+    });
+}
 
-for (const chart of charts) {
+function bindChart(chart) {
     const frameAt = (event) => {
         const box = chart.getBoundingClientRect();
-        const at = Math.round((event.clientX - box.left) / box.width * lastFrame);
-        return Math.min(Math.max(at, 0), lastFrame);
+        const at = Math.round((event.clientX - box.left) / box.width * lastFrame());
+        return Math.min(Math.max(at, 0), lastFrame());
     };
     chart.addEventListener("pointermove", (event) => showPlot(chart, frameAt(event)));
     chart.addEventListener("pointerleave", () => showPlot(chart, frame));
-    chart.addEventListener("click", (event) => {
-        setPlaying(false);
-        showFrame(frameAt(event));
-    });
+    chart.addEventListener("click", (event) => goTo(frameAt(event)));
     chart.addEventListener("keydown", (event) => {
         if (keyStep(event.key) === undefined) return;
         event.preventDefault();
-        setPlaying(false);
-        showFrame(frame + keyStep(event.key));
+        goTo(frame + keyStep(event.key));
         showPlot(chart, frame);
     });
+}
+
+// The film of the sections Animation and Outputs, from the frame `first` on; `changed` is told every frame that is shown.
+export function showFilm(next, first = 0, changed = () => {}) {
+    const isPlaying = playing !== 0;
+    film = next;
+    frameChanged = changed;
+    drawn = byId("drawn");
+    // Where nothing is drawn there is no player; plots keep the frame all the same.
+    slider = byId("frame") ?? document.createElement("input");
+    play = byId("play") ?? document.createElement("button");
+    charts = [...document.querySelectorAll(".chart")];
+    bindPlayer();
+    charts.forEach(bindChart);
+    showFrame(first);
+    setPlaying(isPlaying);
 }
 
 // Graph
@@ -186,7 +200,7 @@ function setOpen(heading, open) {
 const toggle = (heading) => setOpen(heading, heading.getAttribute("aria-expanded") !== "true");
 
 // One stop of the tab key for each graph; the arrow keys go on from there.
-for (const graph of document.querySelectorAll(".graph")) {
+function bindGraph(graph) {
     const items = [...graph.querySelectorAll("[tabindex]")];
     for (const item of items) item.setAttribute("aria-label", JSON.parse(item.dataset.parts).join("; "));
     let current = items[0];
@@ -243,42 +257,46 @@ for (const graph of document.querySelectorAll(".graph")) {
     });
 }
 
-for (const close of document.querySelectorAll(".close")) {
-    close.addEventListener("click", () => {
-        const heading = document.querySelector(`[data-level="${close.closest("figure").id}"]`);
-        setOpen(heading, false);
-        heading.focus();
-    });
-}
-
-for (const button of document.querySelectorAll(".zoom")) {
-    button.addEventListener("click", () => {
-        const graph = button.closest("figure").querySelector(".graph");
-        const view = graph.viewBox.baseVal;
-        const scale = graph.width.baseVal.value / view.width * Number(button.dataset.factor);
-        graph.setAttribute("width", view.width * Math.min(Math.max(scale, 0.1), 3));
-        graph.setAttribute("height", view.height * Math.min(Math.max(scale, 0.1), 3));
-    });
+export function showGraphs() {
+    for (const graph of document.querySelectorAll(".graph")) bindGraph(graph);
+    for (const close of document.querySelectorAll(".close")) {
+        close.addEventListener("click", () => {
+            const heading = document.querySelector(`[data-level="${close.closest("figure").id}"]`);
+            setOpen(heading, false);
+            heading.focus();
+        });
+    }
+    for (const button of document.querySelectorAll(".zoom")) {
+        button.addEventListener("click", () => {
+            const graph = button.closest("figure").querySelector(".graph");
+            const view = graph.viewBox.baseVal;
+            const scale = graph.width.baseVal.value / view.width * Number(button.dataset.factor);
+            graph.setAttribute("width", view.width * Math.min(Math.max(scale, 0.1), 3));
+            graph.setAttribute("height", view.height * Math.min(Math.max(scale, 0.1), 3));
+        });
+    }
 }
 
 // Changes: each leads to its patch, or to the level that it is in, and opens the groups around it.
 
-for (const link of document.querySelectorAll("#changes a")) {
-    link.addEventListener("click", (event) => {
-        event.preventDefault();
-        const item = byId(link.hash.slice(1));
-        for (let level = item.closest(".level"); level; level = level.parentElement.closest(".level")) {
-            if (level.hidden) setOpen(document.querySelector(`[data-level="${level.id}"]`), true);
-        }
-        item.focus();
-    });
+export function showChanges() {
+    for (const link of document.querySelectorAll("#changes a")) {
+        link.addEventListener("click", (event) => {
+            event.preventDefault();
+            const item = byId(link.hash.slice(1));
+            for (let level = item.closest(".level"); level; level = level.parentElement.closest(".level")) {
+                if (level.hidden) setOpen(document.querySelector(`[data-level="${level.id}"]`), true);
+            }
+            item.focus();
+        });
+    }
 }
 
 // Shapes
 
-for (const picture of document.querySelectorAll("svg.points")) {
-    const group = picture.appendChild(svgElement("g", { "aria-hidden": "true" }));
-    showHandles(group, picture.querySelector(".outline").getAttribute("d"));
+export function showShapes() {
+    for (const picture of document.querySelectorAll("svg.points")) {
+        const group = picture.appendChild(svgElement("g", { "aria-hidden": "true" }));
+        showHandles(group, picture.querySelector(".outline").getAttribute("d"));
+    }
 }
-
-showFrame(0);
