@@ -155,12 +155,7 @@ int compare(Options const& options) {
         Document const before = openDocument(file);
         current = &other;
         Document const after = openDocument(other);
-        Marks marks = marksOf(before.root, after.root);
-        double const rates[] = {before.info.framesPerSecond, after.info.framesPerSecond};
-        if (rates[0] != rates[1]) {
-            marks.frameRates = "changed frames per second " + Unstructured(rates[0]).toText() +
-                               " -> " + Unstructured(rates[1]).toText() + "\n";
-        }
+        Marks const marks = marksOf(before, after);
         if (!options.report.empty()) {
             for (std::string const& input : {file, other}) refuseToReplace(input, options.report);
             std::filesystem::path const fileName = std::filesystem::path(other).filename();

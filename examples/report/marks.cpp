@@ -52,8 +52,16 @@ Patch removedAlone(Patch const& patch, std::unordered_set<Patch const*> const& r
 
 }  // namespace
 
-Marks marksOf(Patch const& before, Patch const& after) {
+Marks marksOf(Document const& documentBefore, Document const& documentAfter) {
+    Patch const& before = documentBefore.root;
+    Patch const& after = documentAfter.root;
     Marks marks;
+    double const rateBefore = documentBefore.info.framesPerSecond;
+    double const rateAfter = documentAfter.info.framesPerSecond;
+    if (rateBefore != rateAfter) {
+        marks.frameRates = "changed frames per second " + Unstructured(rateBefore).toText() +
+                           " -> " + Unstructured(rateAfter).toText() + "\n";
+    }
     marks.changes = patchChanges(before, after);
     PatchIndex const index(after);
     std::unordered_set<Patch const*> gone;

@@ -1,10 +1,12 @@
 // What the report marks in a graph: how a document differs from another one.
 //
-//     Marks const marks = marksOf(before.root, after.root);
+//     Marks const marks = marksOf(before, after);
 //     Drawing const drawing(marks.shown, &marks);
 
 #ifndef REPORT_MARKS_H
 #define REPORT_MARKS_H
+
+#include "animation/document.h"
 
 #include <Engine/Base/patch.h>
 #include <Engine/Base/patch_changes.h>
@@ -23,7 +25,7 @@ struct Marks {
     // The later document, with what was removed behind the other children of its former parent.
     tarn::engine::Patch shown;
     std::vector<tarn::engine::PatchChange> changes;
-    // Both frame rates, where they differ.
+    // A line with both frame rates, where they differ.
     std::string frameRates;
     // By the identifier that the patch is shown with: its kind, and all of its changes in words.
     std::unordered_map<unsigned long long, std::string> kinds;
@@ -34,6 +36,6 @@ struct Marks {
 };
 
 // The changes point into both documents, which have to outlive the marks.
-Marks marksOf(tarn::engine::Patch const& before, tarn::engine::Patch const& after);
+Marks marksOf(Document const& before, Document const& after);
 
 #endif

@@ -19,6 +19,7 @@ namespace {
 
 // Browsers nest elements no deeper than some hundred levels.
 constexpr int kDeepestTree = 64;
+constexpr int kDeepestLevel = 256;
 
 // The root is in no level: its ports are listed.
 std::string rootPortsText(Drawing const& drawing, Patch const& root) {
@@ -139,6 +140,10 @@ std::string levelsText(Patch const& root, Marks const* marks) {
             .set("id", "level-" + std::to_string(group.id));
         if (depth > 1) figure.setMarkup("hidden");
         figure.add("\n").add(captionOf(level, depth)).add("\n");
+        if (depth > kDeepestLevel) {
+            figure.add(paragraph("Nested deeper than this page shows."));
+            return figure.markup() + "\n";
+        }
         if (level.boxes.size() < group.children->size()) {
             figure.add(
                 paragraph("Shown are the first " + std::to_string(level.boxes.size()) + "."));

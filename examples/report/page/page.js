@@ -195,9 +195,15 @@ function setOpen(heading, open) {
     heading.setAttribute("aria-expanded", String(open));
     heading.querySelector(".fold").textContent = open ? "\u2212" : "+";
     byId(heading.dataset.level).hidden = !open;
-    if (open) byId(heading.dataset.level).scrollIntoView({ block: "nearest" });
 }
-const toggle = (heading) => setOpen(heading, heading.getAttribute("aria-expanded") !== "true");
+
+const isOpen = (heading) => heading.getAttribute("aria-expanded") === "true";
+const headingOfLevel = (level) => document.querySelector(`[data-level="${level}"]`);
+
+function toggle(heading) {
+    setOpen(heading, !isOpen(heading));
+    if (isOpen(heading)) byId(heading.dataset.level).scrollIntoView({ block: "nearest" });
+}
 
 // One stop of the tab key for each graph; the arrow keys go on from there.
 function bindGraph(graph) {
@@ -257,11 +263,14 @@ function bindGraph(graph) {
     });
 }
 
-export function showGraphs() {
+export const openLevels = () => [...document.querySelectorAll("[data-level]")].filter(isOpen).map((heading) => heading.dataset.level);
+
+// The section Graph. The levels that are named are open, as far as they are there.
+export function showGraphs(open = []) {
     for (const graph of document.querySelectorAll(".graph")) bindGraph(graph);
     for (const close of document.querySelectorAll(".close")) {
         close.addEventListener("click", () => {
-            const heading = document.querySelector(`[data-level="${close.closest("figure").id}"]`);
+            const heading = headingOfLevel(close.closest("figure").id);
             setOpen(heading, false);
             heading.focus();
         });
@@ -275,6 +284,9 @@ export function showGraphs() {
             graph.setAttribute("height", view.height * Math.min(Math.max(scale, 0.1), 3));
         });
     }
+    for (const heading of open.map(headingOfLevel)) {
+        if (heading) setOpen(heading, true);
+    }
 }
 
 // Changes: each leads to its patch, or to the level that it is in, and opens the groups around it.
@@ -285,7 +297,7 @@ export function showChanges() {
             event.preventDefault();
             const item = byId(link.hash.slice(1));
             for (let level = item.closest(".level"); level; level = level.parentElement.closest(".level")) {
-                if (level.hidden) setOpen(document.querySelector(`[data-level="${level.id}"]`), true);
+                if (level.hidden) setOpen(headingOfLevel(level.id), true);
             }
             item.focus();
         });

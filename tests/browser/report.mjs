@@ -1,36 +1,23 @@
 // The report in a real browser: Debian's chromium, at two sizes and in both colour schemes.
 //
-//     node check.mjs DOCUMENT_ROAD DOCUMENTS FOLDER [CHROMIUM]
+//     node report.mjs DOCUMENT_ROAD DOCUMENTS FOLDER [CHROMIUM]
 //
 // Writes the pages and screenshots of them into FOLDER. Ends non-zero at the first check that fails.
 
-import assert from "node:assert/strict";
 import { execFileSync, spawnSync } from "node:child_process";
 import { readFileSync, writeFileSync } from "node:fs";
-import { createRequire } from "node:module";
 import path from "node:path";
 import { pathToFileURL } from "node:url";
 
-const [program, documents, out, executablePath = "/usr/bin/chromium"] = process.argv.slice(2);
+import { largeDocument } from "./documents.mjs";
+import { check, checkEqual, checkLooks, checks, launch, open, SCHEMES } from "./support.mjs";
+
+const [program, documents, out, executablePath] = process.argv.slice(2);
 const folder = path.resolve(out);
-const require = createRequire(path.join(folder, "package.json"));
-const { chromium } = require("playwright-core");
-const axe = readFileSync(require.resolve("axe-core/axe.min.js"), "utf8");
 
 const FRAMES = 120;
 const SIZES = [{ width: 1280, height: 800 }, { width: 390, height: 844 }];
-const SCHEMES = ["light", "dark"];
 const OPENING_SECONDS = 5;
-
-let checks = 0;
-function check(condition, what) {
-    assert.ok(condition, what);
-    ++checks;
-}
-function checkEqual(actual, expected, what) {
-    assert.deepEqual(actual, expected, what);
-    ++checks;
-}
 
 const run = (...options) => execFileSync(program, options, { encoding: "utf8", maxBuffer: 1 << 28 });
 
@@ -38,118 +25,6 @@ function writePage(file, name) {
     const page = path.join(folder, `${name}.html`);
     run(file, "--frames", "0", "--report", page, "--report-frames", String(FRAMES));
     return pathToFileURL(page).href;
-}
-
-// Opens the page; every console message and every error is a failure, as is anything that it loads.
-async function open(browser, url, options) {
-    const page = await browser.newPage(options);
-    page.on("console", (message) => assert.fail(`console: ${message.type()}: ${message.text()}`));
-    page.on("pageerror", (error) => assert.fail(`error: ${error.message}`));
-    page.on("request", (request) => {
-        const asked = request.url();
-        assert.ok(asked === url || asked.startsWith(url + "#") || asked.startsWith("data:"), `loads ${asked}`);
-    });
-    await page.goto(url);
-    return page;
-}
-
-// Texts that are too faint on what they stand on. axe does not know what is behind the text of a graph, and is not
-// sure of others.
-const faintTexts = () => {
-    const channels = (color) => color.match(/[\d.]+/g).map(Number);
-    const luminance = (color) => channels(color).slice(0, 3)
-        .map((c) => (c / 255 <= 0.04045 ? c / 255 / 12.92 : ((c / 255 + 0.055) / 1.055) ** 2.4))
-        .reduce((sum, c, i) => sum + c * [0.2126, 0.7152, 0.0722][i], 0);
-    const isSeen = (color) => (channels(color)[3] ?? 1) > 0;
-    const found = [];
-    let count = 0;
-    const walker = document.createTreeWalker(document.body, NodeFilter.SHOW_TEXT);
-    while (walker.nextNode()) {
-        const element = walker.currentNode.parentElement;
-        if (!walker.currentNode.data.trim() || element.closest("script, .skip") || !element.checkVisibility()) continue;
-        const colors = [];
-        if (element.closest(".graph")) {
-            const behind = element.closest(".heading")?.querySelector(".bar") ?? element.closest(".patch").querySelector(".body");
-            colors.push(getComputedStyle(element).fill, getComputedStyle(behind).fill);
-        } else {
-            let behind = element;
-            while (!isSeen(getComputedStyle(behind).backgroundColor)) behind = behind.parentElement;
-            colors.push(getComputedStyle(element).color, getComputedStyle(behind).backgroundColor);
-        }
-        const [light, dark] = colors.map(luminance).sort((x, y) => y - x);
-        const contrast = (light + 0.05) / (dark + 0.05);
-        if (!(contrast >= 4.5)) found.push(`${element.textContent}: ${contrast}`);
-        ++count;
-    }
-    return count > 50 ? found : ["nothing was looked at"];
-};
-
-// What is wrong with the places of texts: cut off, or over one another.
-const misplacedTexts = () => {
-    const found = [];
-    const texts = [];
-    const walker = document.createTreeWalker(document.body, NodeFilter.SHOW_TEXT);
-    while (walker.nextNode()) {
-        const node = walker.currentNode;
-        const parent = node.parentElement;
-        if (!node.data.trim() || parent.closest("script, .skip")) continue;
-        if (!parent.checkVisibility({ checkOpacity: true })) continue;
-        const range = document.createRange();
-        range.selectNodeContents(node);
-        // A graph scrolls in its frame: its texts are held against one another alone.
-        const graph = parent.closest(".graph");
-        for (let e = parent; e !== document.body; e = e.parentElement) {
-            const style = getComputedStyle(e);
-            const hides = /hidden|clip/.test(style.overflowX + style.overflowY);
-            if (hides && e.clientWidth > 0 && (e.scrollWidth > e.clientWidth + 1 || e.scrollHeight > e.clientHeight + 1)) {
-                found.push(`is cut off: ${node.data}`);
-            }
-            if (e instanceof SVGElement) break;
-        }
-        for (const box of range.getClientRects()) {
-            if (box.width < 1) continue;
-            texts.push({ text: node.data.trim(), box, graph, scrolls: parent.closest(".now") });
-            if (graph) {
-                const patch = parent.closest(".patch").querySelector(".body").getBoundingClientRect();
-                if (box.left < patch.left || box.right > patch.right) found.push(`leaves its patch: ${node.data}`);
-            } else if (box.left < 0 || box.right > innerWidth + 0.5) {
-                found.push(`leaves the page: ${node.data}`);
-            }
-        }
-    }
-    const shown = texts.filter(({ scrolls }) => !scrolls);
-    for (let i = 0; i < shown.length; ++i) {
-        for (let j = i + 1; j < shown.length; ++j) {
-            const a = shown[i];
-            const b = shown[j];
-            if (a.graph !== b.graph) continue;
-            const width = Math.min(a.box.right, b.box.right) - Math.max(a.box.left, b.box.left);
-            const height = Math.min(a.box.bottom, b.box.bottom) - Math.max(a.box.top, b.box.top);
-            if (width > 2 && height > 6) found.push(`overlap: ${a.text} / ${b.text}`);
-        }
-    }
-    if (document.documentElement.scrollWidth > innerWidth) found.push("the page scrolls sideways");
-    return { found, count: texts.length };
-};
-
-async function checkLooks(page, name, size, scheme) {
-    const paper = await page.evaluate(() => getComputedStyle(document.body).backgroundColor);
-    const brightest = Math.max(...paper.match(/\d+/g).map(Number));
-    checkEqual(brightest < 128 ? "dark" : "light", scheme, `${name} is on ${paper}`);
-    const { found, count } = await page.evaluate(misplacedTexts);
-    checkEqual(found, [], `${name}, ${size.width}, ${scheme}`);
-    check(count > 50, "texts were looked at");
-    checkEqual(await page.evaluate(faintTexts), [], `contrast in ${name}, ${size.width}, ${scheme}`);
-    await page.evaluate(axe);
-    const result = await page.evaluate(() => globalThis.axe.run(document, {
-        runOnly: ["wcag2a", "wcag2aa", "wcag21a", "wcag21aa", "wcag22aa", "best-practice"],
-    }));
-    const wrong = result.violations.map((v) => `${v.id}: ${v.help}: ${v.nodes.map((n) => n.html).slice(0, 3)}`);
-    checkEqual(wrong, [], `accessibility of ${name}, ${size.width}, ${scheme}`);
-    const untold = result.incomplete.filter(({ id }) => id !== "color-contrast").map(({ id }) => id);
-    checkEqual(untold, [], `accessibility of ${name} that axe cannot tell`);
-    check(result.passes.some(({ id }) => id === "color-contrast"), "contrast was looked at");
-    await page.screenshot({ path: path.join(folder, `${name}-${size.width}-${scheme}.png`), fullPage: true });
 }
 
 // The `d` of everything that is drawn, in order.
@@ -363,24 +238,6 @@ async function checkTangled(browser) {
     await page.close();
 }
 
-function largeDocument(patches) {
-    const children = [];
-    const connections = [];
-    for (let i = 0; i < patches; ++i) {
-        const id = i + 2;
-        children.push({
-            id, kind: "add", name: `patch ${id}`, attributes: { place: [i % 50, i / 50] },
-            inputs: [{ id: id * 10, name: "a", type: "float" }, { id: id * 10 + 1, name: "b", type: "vec2" }],
-            outputs: [{ id: id * 10 + 2, name: "sum", type: "vec2" }],
-        });
-        for (const input of [0, 1]) {
-            const from = 2 + Math.floor(i / (2 + input));
-            if (i > 1) connections.push({ from: [from, from * 10 + 2], to: [id, id * 10 + input] });
-        }
-    }
-    return { root: { id: 1, name: "large", children, connections } };
-}
-
 // Two documents: every change is listed, marked in the graph by more than a colour, and leads to its patch.
 async function checkChanges(browser) {
     const before = path.join(documents, "animation.json");
@@ -446,6 +303,25 @@ async function checkNested(browser) {
     await page.close();
 }
 
+// Browsers would tear elements apart that are nested deeper.
+async function checkDeep(browser) {
+    const levels = 900;
+    let text = `{"id": ${levels}, "name": "innermost"}`;
+    for (let id = levels - 1; id > 0; --id) text = `{"id": ${id}, "children": [${text}]}`;
+    const file = path.join(folder, "deep.json");
+    writeFileSync(file, `{"root": ${text}}`);
+    const page = await open(browser, writePage(file, "deep"), { viewport: SIZES[0] });
+    const depths = await page.$$eval(".level", (all) => all.map((level) => {
+        let depth = 0;
+        for (let e = level; e; e = e.parentElement) depth += e.classList.contains("level");
+        return depth;
+    }));
+    checkEqual(depths, Array.from({ length: 257 }, (_, i) => i + 1));
+    const last = page.locator("#level-257");
+    check((await last.textContent()).includes("Nested deeper than this page shows."), "what is left out is said");
+    await page.close();
+}
+
 async function checkLarge(browser) {
     const file = path.join(folder, "large.json");
     writeFileSync(file, JSON.stringify(largeDocument(2000)));
@@ -465,7 +341,7 @@ async function checkLarge(browser) {
     await page.close();
 }
 
-const browser = await chromium.launch({ executablePath, args: ["--no-sandbox"] });
+const browser = await launch(out, executablePath);
 try {
     for (const name of ["animation", "small", "node_graph"]) {
         const url = writePage(path.join(documents, `${name}.json`), name);
@@ -494,6 +370,7 @@ try {
         await page.close();
     }
     await checkNested(browser);
+    await checkDeep(browser);
     await checkChanges(browser);
     await checkOdd(browser);
     await checkTangled(browser);
