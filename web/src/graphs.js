@@ -128,7 +128,8 @@ function writePatch(out, patch, level = 1) {
 }
 
 let rootOf;
-let addressOf;
+/** Where a patch is in the library's memory, for natives. */
+export let addressOf;
 let patchAt;
 
 export class Patch {

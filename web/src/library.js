@@ -1,6 +1,9 @@
 // Everything that the module exports.
 
-export * from "./graphs.js";
+export {
+  DocumentError, DocumentForm, Evaluator, findPatchRecursive, inPortForTag, kindToString, outPortForTag, Patch,
+  patchChanges, PatchChangeKind, PatchEdit, PatchIndex, readDocument, readDocumentWithInfo, stringToKind, writeDocument,
+} from "./graphs.js";
 export {
   bounds, ease, EasingFunction, easingFunctionNames, interpolate, Path, PathBuilder, pathFromSvgPathData,
   PathInstruction, pathInstructionToString, scaled, stringToEasingFunction, stringToPathInstruction, svgPathData,

@@ -1,0 +1,29 @@
+// Texts short enough for an address.
+
+// Nobody's document is larger, and a few letters can stand for more memory than there is.
+const mostBytes = 1 << 24;
+
+async function through(stream, bytes) {
+  const parts = [];
+  let size = 0;
+  for (const reader = new Blob([bytes]).stream().pipeThrough(stream).getReader();;) {
+    const { done, value } = await reader.read();
+    if (done) return new Uint8Array(await new Blob(parts).arrayBuffer());
+    size += value.length;
+    if (size > mostBytes) throw new RangeError("there is too much in the address");
+    parts.push(value);
+  }
+}
+
+/** The text, compressed, in letters that addresses may have. */
+export async function packed(text) {
+  const bytes = await through(new CompressionStream("deflate-raw"), new TextEncoder().encode(text));
+  const letters = Array.from(bytes, (byte) => String.fromCharCode(byte)).join("");
+  return btoa(letters).replaceAll("+", "-").replaceAll("/", "_").replace(/=+$/, "");
+}
+
+/** What was packed; what was not throws. */
+export async function unpacked(letters) {
+  const bytes = Uint8Array.from(atob(letters.replaceAll("-", "+").replaceAll("_", "/")), (letter) => letter.charCodeAt(0));
+  return new TextDecoder().decode(await through(new DecompressionStream("deflate-raw"), bytes));
+}

@@ -1,0 +1,72 @@
+// The report of a document, for the playground.
+
+#include "../src/graphs.h"
+#include "../src/native.h"
+
+#include "animation/labels.h"
+#include "report/graphviz.h"
+#include "report/marks.h"
+#include "report/page.h"
+
+#include <optional>
+#include <string>
+
+using namespace tarn::engine;
+using emscripten::val;
+
+// In a browser JavaScript has the answer (layout.js).
+std::optional<std::string> answerOfDot(std::string const& text) {
+    val const answer = val::module_property("answerOfDot")(text);
+    if (answer.isNull()) return std::nullopt;
+    return answer.as<std::string>();
+}
+
+namespace web {
+
+namespace {
+
+Document documentOf(Address root, double framesPerSecond) {
+    Document document{patchAt(root), {}};
+    document.info.framesPerSecond = framesPerSecond;
+    return document;
+}
+
+val film(Address root, double framesPerSecond, double frames) {
+    FilmSections const sections =
+        filmSections(documentOf(root, framesPerSecond), static_cast<long long>(frames));
+    val answer = val::object();
+    answer.set("animation", bytesOf(sections.animation));
+    answer.set("outputs", bytesOf(sections.outputs));
+    answer.set("data", bytesOf(sections.data));
+    return answer;
+}
+
+val answerOf(GraphSections const& sections) {
+    val answer = val::object();
+    answer.set("changes", bytesOf(sections.changes));
+    answer.set("graph", bytesOf(sections.graph));
+    answer.set("attributes", bytesOf(sections.attributes));
+    return answer;
+}
+val graph(Address root) { return answerOf(graphSections(patchAt(root))); }
+// With what is not as it is `before`.
+val comparedGraph(Address root, double framesPerSecond, Address before,
+                  double framesPerSecondBefore) {
+    Document const from = documentOf(before, framesPerSecondBefore);
+    Document const to = documentOf(root, framesPerSecond);
+    Marks const marks = marksOf(from, to);
+    return answerOf(graphSections(to.root, &marks));
+}
+
+val counts(Address root) { return bytesOf(countsText(documentOf(root, 0.0))); }
+
+}  // namespace
+
+EMSCRIPTEN_BINDINGS(report) {
+    native<&film>("reportFilm");
+    native<&graph>("reportGraph");
+    native<&comparedGraph>("reportComparedGraph");
+    native<&counts>("reportCounts");
+}
+
+}  // namespace web
