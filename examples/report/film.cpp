@@ -5,6 +5,7 @@
 #include "animation/markup.h"
 
 #include <algorithm>
+#include <chrono>
 #include <cmath>
 #include <functional>
 
@@ -82,7 +83,11 @@ void addFrame(Plot& plot, Loop const& values, long long frame) {
 
 }  // namespace
 
-Film filmOf(Document const& document, long long frames) {
+Film filmOf(Document const& document, long long frames, double seconds) {
+    auto const start = std::chrono::steady_clock::now();
+    auto const passed = [&] {
+        return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    };
     Film film;
     Evaluator evaluator(document);
     Scene const scene(document, evaluator.root());
@@ -94,6 +99,7 @@ Film filmOf(Document const& document, long long frames) {
     std::size_t places = 0;
     for (long long frame = 0; frame < frames; ++frame) {
         if (film.texts.bytes() + kBytesOfAPlace * places > kMostBytes) break;
+        if (frame > 0 && passed() > seconds) break;
         evaluator.evaluate(frame);
         for (std::size_t i = 0; i < outputs.size(); ++i) {
             addFrame(film.plots[i], outputs[i].port->values, frame);

@@ -10,6 +10,7 @@
 #include "report/drawing.h"
 
 #include <cstddef>
+#include <limits>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -63,8 +64,10 @@ struct Film {
     std::vector<Drawn> first;
 };
 
-// Ends before `frames` where the page would become too large.
-Film filmOf(Document const& document, long long frames);
+// Ends before `frames` where the page would become too large or so much time has passed, but not
+// before the first.
+Film filmOf(Document const& document, long long frames,
+            double seconds = std::numeric_limits<double>::infinity());
 
 // The plot of an output that stays as it is shows nothing.
 bool isConstant(Plot const& plot);

@@ -1,4 +1,6 @@
 // Graphviz, which finds places for the boxes of a graph.
+//
+//     std::optional<std::string> const places = answerOfDot("digraph { 0 [width=1, height=1]; }");
 
 #ifndef REPORT_GRAPHVIZ_H
 #define REPORT_GRAPHVIZ_H

@@ -41,7 +41,8 @@ std::string animationText(Film const& film, long long frames) {
     std::string cutShort;
     if (shown < frames) {
         cutShort = paragraph("The page keeps the first " + std::to_string(shown) + " of " +
-                             std::to_string(frames) + " frames: more would be too large.");
+                             std::to_string(frames) +
+                             " frames: more would be too large, or take too long.");
     }
     return fillTemplate(page_files::kAnimationHtml, {{"VIEW", viewText(film.bounds)},
                                                      {"SCENE", scenePaths(film.first) + "\n"},
@@ -79,8 +80,8 @@ std::string inScript(std::string const& json) {
 
 }  // namespace
 
-FilmSections filmSections(Document const& document, long long frames) {
-    Film const film = filmOf(document, frames);
+FilmSections filmSections(Document const& document, long long frames, double seconds) {
+    Film const film = filmOf(document, frames, seconds);
     return {animationText(film, frames), outputsText(film), dataText(film, document)};
 }
 

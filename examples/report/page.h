@@ -9,6 +9,7 @@
 #include "animation/document.h"
 #include "report/marks.h"
 
+#include <limits>
 #include <string>
 
 // What follows from frames. The sections are HTML, and empty where nothing is drawn or changes over
@@ -18,7 +19,9 @@ struct FilmSections {
     std::string outputs;
     std::string data;
 };
-FilmSections filmSections(Document const& document, long long frames);
+// Ends with the frames that were computed after so many seconds, one at least.
+FilmSections filmSections(Document const& document, long long frames,
+                          double seconds = std::numeric_limits<double>::infinity());
 
 // What follows from the graph alone, as HTML. `changes` is empty without marks, and `attributes`
 // where there are none.

@@ -27,7 +27,7 @@ const sample = (name) => path.join(documents, `${name}.json`);
 
 async function openPage(browser, viewport, more = {}, state = "") {
     const page = await open(browser, url + state, { viewport, reducedMotion: "reduce", ...more });
-    await page.waitForSelector("[role=tab][aria-selected=true]");
+    await page.waitForSelector("html[data-state=ready]");
     return page;
 }
 
@@ -213,6 +213,16 @@ async function checkShapes(page) {
             checkEqual([await text(page, "shape-error"), await page.getAttribute("#shape-outline", "d")], ["", start]);
         }
     }
+    for (const number of ["inf", "nan", "1e9", "abc"]) {
+        const field = page.locator("#shape-fields input").first();
+        const shape = [await field.inputValue(), await page.getAttribute("#shape-outline", "d")];
+        await field.fill(number);
+        check((await text(page, "shape-error")) !== "", `${number} is no place`);
+        await page.locator("#shape-handles circle").first().focus();
+        await page.keyboard.press("ArrowRight");
+        checkEqual([await field.inputValue(), await page.getAttribute("#shape-outline", "d")], [number, shape[1]], "handles do not move what is nowhere");
+        await field.fill(shape[0]);
+    }
     await page.selectOption("#shape-kind", "circle");
     for (const [i, number] of ["0", "0", "10"].entries()) await page.locator("#shape-fields input").nth(i).fill(number);
     checkEqual(await text(page, "shape-code"), "Path const path = PathBuilder().circle({0, 0}, 10).build();");
@@ -296,17 +306,43 @@ async function checkDocuments(page) {
     await page.focus("#undo");
     await page.keyboard.press("Enter");
     checkEqual(await drawnNow(page), before, "undone twice, by the keyboard");
-    check(await page.locator("#undo").isDisabled(), "there is nothing more to undo");
+    checkEqual(await page.getAttribute("#undo", "aria-disabled"), "true", "there is nothing more to undo");
+    checkEqual(await page.evaluate(() => document.activeElement.id), "undo", "and the button keeps the focus");
     await page.click("#redo");
     await page.click("#redo");
     checkEqual(await drawnNow(page), last, "done again");
-    check(await page.locator("#redo").isDisabled(), "there is nothing more to redo");
-    // What cannot be read stays out.
+    checkEqual(await page.getAttribute("#redo", "aria-disabled"), "true", "there is nothing more to redo");
+    // What cannot be read stays out, and does not outlast the stay in the field.
+    const number = await field.inputValue();
     await field.fill("fast");
     check((await text(page, "input-error")) !== "", "a word is no number");
+    checkEqual(await field.getAttribute("aria-invalid"), "true");
     checkEqual(await drawnNow(page), last, "and changes nothing");
+    await field.blur();
+    checkEqual([await field.inputValue(), await text(page, "input-error"), await field.getAttribute("aria-invalid")], [number, "", null], "what was there comes back");
+    await page.focus("#undo");
+    await page.keyboard.press("Control+z");
+    checkEqual(await drawnNow(page), edited, "undone by the keys");
+    await page.keyboard.press("Control+Shift+z");
+    checkEqual(await drawnNow(page), last, "done again by the keys");
+    // The player is as it was after edits: it plays, and a key is a frame.
+    await page.check("#show-points");
+    await field.fill("2.25");
+    check(await page.isChecked("#show-points"), "points stay");
+    await page.uncheck("#show-points");
+    await page.focus("#play");
+    await page.keyboard.press("Home");
+    await page.keyboard.press("ArrowRight");
+    checkEqual(await page.inputValue("#frame"), "1", "a key is a frame");
+    await page.keyboard.press("Enter");
+    await page.waitForFunction(() => Number(document.getElementById("frame").value) > 5);
+    await field.fill("2");
+    checkEqual(await text(page, "play"), "Pause", "it goes on playing");
+    await page.waitForFunction((hash) => location.hash !== hash, await page.evaluate(() => location.hash));
+    await page.click("#play");
+    checkEqual(await text(page, "play"), "Play");
     await page.click("#undo");
-    checkEqual(await text(page, "input-error"), "");
+    await page.click("#undo");
 
     // Every type of input can be set.
     const patches = await page.$$eval("#input-patch option", (all) => all.map(({ value }) => value));
@@ -378,6 +414,80 @@ async function checkFiles(page) {
     checkEqual(await page.locator("#changes").count(), 0, "compared with nothing");
 }
 
+const port = (id, type, fallback, more = {}) => ({ id, name: `in ${id}`, type, default: fallback, ...more });
+const openText = async (page, name, document) => {
+    const content = typeof document === "string" ? document : JSON.stringify(document);
+    await page.setInputFiles("#document-file", { name, mimeType: "application/json", buffer: Buffer.from(content) });
+    await page.waitForFunction((n) => [document.getElementById("document-name").textContent, document.getElementById("document-error").textContent].some((text) => text.startsWith(n)), name);
+};
+const inputs = (page) => page.$$eval("#inputs label", (all) => all.map((label) => {
+    const field = label.querySelector("input");
+    return [field.value, field.disabled, label.querySelector("[type=range]") !== null];
+}));
+
+// Documents that are not as most are.
+async function checkOdd(browser) {
+    const page = await openPage(browser, SIZES[0], {}, "#show=documents");
+    await openText(page, "odd.json", { root: { id: 1, children: [{ id: 2, kind: "text", name: "odd", inputs: [
+        port(10, "unstructured", { a: { $integer: "9007199254740993" } }), port(11, "unstructured", { b: [1.5, "c"] }),
+        port(12, "string", "two\nlines"), port(13, "float", 300, { min: "-inf", max: "inf" }), port(14, "float", 3, { min: 0, max: 5 }),
+        port(15, "path", [["lineTo", 1, 2]]), port(16, "float", "nan"), port(17, "vec2", [1, "inf"]), port(18, "boolean", true),
+    ] }] } });
+    checkEqual(await text(page, "document-error"), "");
+    const odd = await inputs(page);
+    checkEqual(odd.map(([, isDisabled]) => isDisabled), [true, false, true, false, false, true, false, false, false], "what a field cannot hold cannot be set");
+    checkEqual(odd.map(([, , hasSlider]) => hasSlider), [false, false, false, false, true, false, false, false, false], "sliders have bounds");
+    checkEqual([odd[1][0], odd[3][0], odd[7][0]], ['{"b":[1.5,"c"]}', "300", "1, Infinity"]);
+    // The graph says what was set.
+    const said = () => page.locator('[data-port="14"]').getAttribute("aria-label");
+    check((await said()).includes("default 3"), "the graph says the default");
+    await page.locator("#inputs input").nth(4).fill("4.5");
+    check((await said()).includes("default 4.5"), "and follows an edit");
+    await page.click("#undo");
+    check((await said()).includes("default 3"), "and its undoing");
+    await page.locator("#inputs label:last-child input").fill("__proto__");
+    check((await text(page, "input-error")) !== "", "no truth is called so");
+    await page.locator("#inputs label:last-child input").blur();
+    // A document is opened as one step, which can be undone; a file that is called as a sample is none.
+    await openText(page, "small", { root: { id: 1, name: "mine" } });
+    check((await summary(page)).includes("1 patch"), "a document without children");
+    await page.waitForFunction(() => location.hash.includes("document=%7E") && location.hash.includes("document-name=small"));
+    checkEqual(await page.inputValue("#sample"), "");
+    await page.click("#undo");
+    checkEqual([await text(page, "document-name"), (await inputs(page)).length], ["odd.json", 9], "the former document");
+
+    await openText(page, "repeated.json", { identifiers: "any", root: { id: 1, children: [
+        { id: 2, name: "a", inputs: [port(11, "float", 1), port(11, "float", 2)] }, { id: 2, name: "b", inputs: [port(12, "float", 3)] },
+    ] } });
+    checkEqual(await page.$$eval("#input-patch option", (all) => all.map((o) => o.textContent)), ["a (2)", "b (2)"]);
+    checkEqual((await inputs(page)).map(([value, isDisabled]) => [value, isDisabled]), [["1", true], ["2", true]], "inputs that cannot be told apart");
+    await page.focus("#input-patch");
+    await page.keyboard.press("ArrowDown");
+    checkEqual((await inputs(page)).map(([value]) => value), ["3"], "both patches can be reached");
+
+    // A bad file and a good one: the good one is not taken for the first.
+    const before = await text(page, "document-name");
+    await handTo(page, [{ name: "bad.json", content: "{" }, { name: "good.json", content: readFileSync(sample("small"), "utf8") }]);
+    await page.waitForFunction(() => document.getElementById("document-error").textContent.startsWith("bad.json"));
+    checkEqual([await text(page, "document-name"), await page.inputValue("#compare")], [before, ""]);
+    // The link to the content does not end what is shown.
+    await page.evaluate(() => document.querySelector(".skip").focus());
+    await page.keyboard.press("Enter");
+    checkEqual([await page.evaluate(() => document.activeElement.id), await text(page, "document-name")], ["main", before]);
+    await page.close();
+
+    // What takes long is cut short.
+    const slow = { root: { id: 1, children: [
+        { id: 2, kind: "loop", inputs: [port(20, "int", 1000)], outputs: [{ id: 21, type: "int" }, { id: 22, type: "float" }] },
+        ...Array.from({ length: 300 }, (_, i) => ({ id: 10 + i, kind: "ease", inputs: [port(1000 + 10 * i, "float", 0), port(1001 + 10 * i, "float", 1), port(1002 + 10 * i, "float", 0)], outputs: [{ id: 1005 + 10 * i, type: "float" }] })),
+    ], connections: Array.from({ length: 300 }, (_, i) => ({ from: i === 0 ? [2, 22] : [9 + i, 995 + 10 * i], to: [10 + i, 1002 + 10 * i] })) } };
+    const again = await openPage(browser, SIZES[0], {}, "#show=documents");
+    const start = performance.now();
+    await openText(again, "slow.json", slow);
+    check(performance.now() - start < 15000, "a document that takes long is shown");
+    await again.close();
+}
+
 // A link shows what was set.
 async function checkLinks(browser) {
     const page = await openPage(browser, SIZES[0]);
@@ -404,11 +514,21 @@ async function checkLinks(browser) {
     await show(again, "shapes");
     checkEqual([await again.inputValue("#shape-kind"), await again.locator("#shape-fields input").nth(2).inputValue()], ["ellipse", "44"]);
     await again.close();
+    // The document as it was opened is in the link too.
+    await page.selectOption("#compare", "opened");
+    await page.waitForFunction(() => location.hash.includes("compare=opened") && location.hash.includes("opened=%7E"));
+    const listed = await page.locator("#changes").textContent();
+    check(listed.includes("-> 5.5"), "what was edited since");
+    const third = await openPage(browser, SIZES[0], {}, new URL(page.url()).hash);
+    checkEqual(await third.locator("#changes").textContent(), listed, "the comparison with the document as it was opened");
+    await third.click("#undo");
+    check((await third.locator("#changes").textContent()).includes("the same") || (await third.waitForFunction(() => document.getElementById("changes").textContent.includes("the same"))), "and can be gone back to");
+    await third.close();
     await page.close();
 
     // Addresses that nobody made here.
     for (const state of ["#document=~!!!", "#document=~AAAA", "#document=nothing", "#show=nothing&frame=-5&value-type=x&curve-progress=9&shape=a+b&shape-kind=y",
-        "#frame=1e9&input-patch=77&compare=file&port-min=x&curve-from=%00&other=~x", `#document=${"~".repeat(5000)}`]) {
+        "#frame=0.5", "#frame=1e9&input-patch=77&compare=file&port-min=x&curve-from=%00&other=~x", `#document=${"~".repeat(5000)}`]) {
         const odd = await openPage(browser, SIZES[0], {}, state);
         await show(odd, "documents");
         check((await summary(odd)).includes("40 patches"), `the sample is shown for ${state.slice(0, 20)}`);
@@ -470,6 +590,7 @@ try {
         await checkLooks(page, "playground-used", viewport, "light", FEWEST.curves);
         await page.close();
     }
+    await checkOdd(browser);
     await checkLinks(browser);
     await checkLarge(browser);
 } finally {

@@ -54,7 +54,7 @@ const faintTexts = (fewest) => {
     const walker = document.createTreeWalker(document.body, NodeFilter.SHOW_TEXT);
     while (walker.nextNode()) {
         const element = walker.currentNode.parentElement;
-        if (!walker.currentNode.data.trim() || element.closest("script, .skip, .visually-hidden") || !element.checkVisibility()) continue;
+        if (!walker.currentNode.data.trim() || element.closest("script, .skip") || !element.checkVisibility()) continue;
         const colors = [];
         if (element.closest(".graph")) {
             const behind = element.closest(".heading")?.querySelector(".bar") ?? element.closest(".patch").querySelector(".body");
@@ -80,7 +80,7 @@ const misplacedTexts = () => {
     while (walker.nextNode()) {
         const node = walker.currentNode;
         const parent = node.parentElement;
-        if (!node.data.trim() || parent.closest("script, .skip, .visually-hidden")) continue;
+        if (!node.data.trim() || parent.closest("script, .skip")) continue;
         if (!parent.checkVisibility({ checkOpacity: true })) continue;
         const range = document.createRange();
         range.selectNodeContents(node);
@@ -120,6 +120,20 @@ const misplacedTexts = () => {
     return { found, count: texts.length };
 };
 
+// The rules of axe.
+export async function checkAccessibility(page, what) {
+    await page.evaluate(axe);
+    const result = await page.evaluate(() => globalThis.axe.run(document, {
+        preload: false,
+        runOnly: ["wcag2a", "wcag2aa", "wcag21a", "wcag21aa", "wcag22aa", "best-practice"],
+    }));
+    const wrong = result.violations.map((v) => `${v.id}: ${v.help}: ${v.nodes.map((n) => n.html).slice(0, 3)}`);
+    checkEqual(wrong, [], `accessibility of ${what}`);
+    const untold = result.incomplete.filter(({ id }) => id !== "color-contrast").map(({ id }) => id);
+    checkEqual(untold, [], `accessibility of ${what} that axe cannot tell`);
+    check(result.passes.some(({ id }) => id === "color-contrast"), "contrast was looked at");
+}
+
 // What every page has to be, as it stands in that size and colour scheme, which has more texts than `fewest`; and a screenshot.
 export async function checkLooks(page, name, size, scheme, fewest = 50) {
     const paper = await page.evaluate(() => getComputedStyle(document.body).backgroundColor);
@@ -129,14 +143,6 @@ export async function checkLooks(page, name, size, scheme, fewest = 50) {
     checkEqual(found, [], `${name}, ${size.width}, ${scheme}`);
     check(count > fewest, "texts were looked at");
     checkEqual(await page.evaluate(faintTexts, fewest), [], `contrast in ${name}, ${size.width}, ${scheme}`);
-    await page.evaluate(axe);
-    const result = await page.evaluate(() => globalThis.axe.run(document, {
-        runOnly: ["wcag2a", "wcag2aa", "wcag21a", "wcag21aa", "wcag22aa", "best-practice"],
-    }));
-    const wrong = result.violations.map((v) => `${v.id}: ${v.help}: ${v.nodes.map((n) => n.html).slice(0, 3)}`);
-    checkEqual(wrong, [], `accessibility of ${name}, ${size.width}, ${scheme}`);
-    const untold = result.incomplete.filter(({ id }) => id !== "color-contrast").map(({ id }) => id);
-    checkEqual(untold, [], `accessibility of ${name} that axe cannot tell`);
-    check(result.passes.some(({ id }) => id === "color-contrast"), "contrast was looked at");
+    await checkAccessibility(page, `${name}, ${size.width}, ${scheme}`);
     await page.screenshot({ path: path.join(folder, `${name}-${size.width}-${scheme}.png`), fullPage: true });
 }

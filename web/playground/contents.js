@@ -44,7 +44,7 @@ export const kinds = {
 };
 
 function booleanOf(text) {
-  const found = { true: true, false: false, 1: true, 0: false }[text.trim().toLowerCase()];
+  const found = new Map([["true", true], ["false", false], ["1", true], ["0", false]]).get(text.trim().toLowerCase());
   if (found === undefined) throw new SyntaxError(`"${text}" is neither true nor false`);
   return new Value(found);
 }
@@ -59,7 +59,7 @@ export function endOf(text) {
 }
 
 const cppNumber = (number) =>
-  Number.isFinite(number) ? String(number).replace(/^(-?\d+)$/, "$1.0")
+  Object.is(number, -0) ? "-0.0" : Number.isFinite(number) ? String(number).replace(/^(-?\d+)$/, "$1.0")
     : Number.isNaN(number) ? "NAN" : number < 0 ? "-INFINITY" : "INFINITY";
 
 /** The same in C++. */

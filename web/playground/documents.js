@@ -3,39 +3,48 @@
 import animation from "../../examples/documents/animation.json";
 import nodeGraph from "../../examples/documents/node_graph.json";
 import small from "../../examples/documents/small.json";
-import { openLevels, showChanges, showFilm, showGraphs } from "../../examples/report/page/page.js";
+import { openLevels, showChanges, showFilm, showGraphs, showParts } from "../../examples/report/page/page.js";
+import { halves } from "../src/check.js";
 import { addressOf } from "../src/graphs.js";
 import { PatchEdit, PatchIndex, portNameForTypeInfo, readDocumentWithInfo, Type, writeDocument } from "../src/library.js";
 import { native } from "../src/native.js";
+import { bytesOf } from "../src/values.js";
 import { textOf } from "../src/wire.js";
 import { fields } from "./contents.js";
-import { attempt, byId, choices, element, say } from "./dom.js";
+import { byId, choices, element, messageOf, say } from "./dom.js";
 import { forgetAnswers } from "./layout.js";
 import { packed, unpacked } from "./packed.js";
-import { keep, keepField, stateOf } from "./state.js";
+import { keep, keepField, longest, stateOf } from "./state.js";
 
 const samples = { animation, small, node_graph: nodeGraph };
 const frames = 120;
-// Longer addresses are cut off by programs that they are sent with.
-const longestAddress = 30000;
+// A page that does not answer for longer seems to have ended.
+const longestSeconds = 2;
 
-// The document as it was opened and after each edit, each {root, port}: the input that was set last.
+// What can be undone: each document that was opened, and each edit of it. `root` and `info` are those of the document, `sample` is
+// its name where it is one of ours as it came, `edited` the input that was set, and `open` that one as long as it is being set.
 let versions = [];
 let at = 0;
-let info;
-let fileName = "";
+// In the place of an input: what was edited before the document came here. No input has this identifier.
+const several = 0n;
 let index;
-// The other file, {root, framesPerSecond, name}, or null.
+// The other file, {root, info, name, sample}, or null.
 let otherFile = null;
 let frame = 0;
 
-const root = () => versions[at].root;
+const current = () => versions[at];
+
+// The document as it was opened.
+function opened() {
+  let first = at;
+  while (versions[first].edited !== null) --first;
+  return versions[first];
+}
 
 // What it is compared with, or null.
 function other() {
   const chosen = byId("compare").value;
-  return chosen === "opened" ? { root: versions[0].root, framesPerSecond: info.framesPerSecond }
-    : chosen === "file" ? otherFile : null;
+  return chosen === "opened" ? opened() : chosen === "file" ? otherFile : null;
 }
 
 // Sections
@@ -52,9 +61,12 @@ function setSection(name, bytes) {
 }
 
 function showFrames() {
-  const { animation: player, outputs, data } = native.reportFilm(addressOf(root()), info.framesPerSecond, frames);
+  const { root, info } = current();
+  const { animation: player, outputs, data } = native.reportFilm(addressOf(root), info.framesPerSecond, frames, longestSeconds);
+  const withPoints = byId("show-points")?.checked ?? false;
   setSection("animation", player);
   setSection("outputs", outputs);
+  if (byId("show-points")) byId("show-points").checked = withPoints;
   showFilm(JSON.parse(textOf(data)), frame, (next) => {
     frame = next;
     keep("frame", String(frame));
@@ -63,10 +75,11 @@ function showFrames() {
 
 function showGraph() {
   const open = openLevels();
+  const { root, info } = current();
   const before = other();
   const { changes, graph, attributes } = before === null
-    ? native.reportGraph(addressOf(root()))
-    : native.reportComparedGraph(addressOf(root()), info.framesPerSecond, addressOf(before.root), before.framesPerSecond);
+    ? native.reportGraph(addressOf(root))
+    : native.reportComparedGraph(addressOf(root), info.framesPerSecond, addressOf(before.root), before.info.framesPerSecond);
   if (setSection("graph", graph)) showGraphs(open);
   if (setSection("changes", changes)) showChanges();
   setSection("attributes", attributes);
@@ -76,82 +89,129 @@ function showGraph() {
 
 const patchSelect = () => byId("input-patch");
 const nameOf = (patch) => patch.name || "unnamed";
+// The patches that have inputs, by what they are called in the list of choices, and the identifiers that several inputs have.
+let patches = new Map();
+let repeated = new Set();
 
-function patchesWithInputs(patch, found = []) {
-  if (patch.inputs.length > 0) found.push(patch);
-  for (const child of patch.children) patchesWithInputs(child, found);
-  return found;
+function collectPatches(patch) {
+  if (patch.inputs.length > 0) {
+    const id = String(patch.id);
+    patches.set(patches.has(id) ? `${id}/${patches.size}` : id, patch);
+  }
+  for (const child of patch.children) collectPatches(child);
 }
 
+// A note beside the field says why it cannot be set, where it cannot.
 function fieldOf(port) {
   const { show, read } = fields[port.typeInfo.type];
-  const label = element("label", {}, `${port.name || "unnamed"} ${portNameForTypeInfo(port.typeInfo)} `);
-  const connection = index.incomingConnection(port.id);
-  const field = element("input", { autocomplete: "off", spellcheck: "false", "data-input": port.id });
-  field.value = show(port.defaultValue.asType(port.typeInfo.type));
+  const name = port.name || "unnamed";
+  const label = element("label", {}, `${name} ${portNameForTypeInfo(port.typeInfo)} `);
+  const field = element("input", { autocomplete: "off", spellcheck: "false", "aria-describedby": "input-error" });
   label.append(field);
-  if (connection !== null) {
-    field.disabled = true;
-    label.append(`from ${nameOf(index.ownerOfPort(connection.fromPortId) ?? { name: "" })}`);
-    return [label];
+  const connection = index.incomingConnection(port.id);
+  const value = port.defaultValue;
+  let note = "";
+  try {
+    field.value = show(value);
+    if (connection !== null) note = `from ${nameOf(index.ownerOfPort(connection.fromPortId) ?? { name: "" })}`;
+    else if (repeated.has(port.id)) note = "another input has its identifier";
+    else if (String(bytesOf(read(field.value))) !== String(bytesOf(value))) note = "a field cannot hold it";
+  } catch {
+    note = "a field cannot hold it";
   }
-  const set = (text) => attempt(byId("input-error"), () => setInput(port.id, read(text)));
-  field.addEventListener("input", () => set(field.value));
-  // Each stay in a field is one step to be undone.
-  field.addEventListener("change", () => (versions[at].port = null));
+  if (note !== "") {
+    field.disabled = true;
+    label.append(note);
+    return label;
+  }
+
+  let last = field.value;
+  const set = () => {
+    try {
+      setInput(port.id, read(field.value));
+      last = field.value;
+      field.removeAttribute("aria-invalid");
+      byId("input-error").textContent = "";
+    } catch (error) {
+      field.setAttribute("aria-invalid", "true");
+      byId("input-error").textContent = `${name}: ${messageOf(error)}`;
+    }
+  };
+  // Each stay in a field is one step to be undone, and what could not be read does not outlast it.
+  const leave = () => {
+    current().open = null;
+    if (!field.hasAttribute("aria-invalid")) return;
+    field.value = last;
+    field.removeAttribute("aria-invalid");
+    byId("input-error").textContent = "";
+  };
+  field.addEventListener("input", set);
+  field.addEventListener("change", leave);
+
   const { min, max, type } = port.typeInfo;
-  if (type !== Type.Float || min === null || max === null || !(min.number < max.number)) return [label];
-  const slider = element("input", {
-    type: "range", min: min.number, max: max.number, step: "any", "aria-label": `${port.name || "unnamed"}, by slider`,
-  });
+  const [least, most] = [min, max].map((bound) => (bound === null ? NaN : bound.number));
+  if (type !== Type.Float || !Number.isFinite(most - least) || least >= most) return label;
+  const slider = element("input", { type: "range", min: least, max: most, step: "any", "aria-label": `${name}, by slider` });
   slider.value = field.value;
   slider.addEventListener("input", () => {
     field.value = slider.value;
-    set(field.value);
+    set();
   });
-  slider.addEventListener("change", () => (versions[at].port = null));
+  slider.addEventListener("change", leave);
   field.addEventListener("input", () => (slider.value = field.value));
   label.append(slider);
-  return [label];
+  return label;
 }
 
 function showInputs() {
-  const patch = index.findPatch(BigInt(patchSelect().value || "0"));
-  byId("inputs").replaceChildren(...(patch === null ? [] : patch.inputs.flatMap(fieldOf)));
+  const chosen = patches.get(patchSelect().value);
+  // As it is after the last edit, where it can be told from others.
+  const patch = chosen === undefined || patchSelect().value.includes("/") ? chosen : index.findPatch(chosen.id);
+  byId("inputs").replaceChildren(...(patch?.inputs ?? []).map(fieldOf));
   byId("input-error").textContent = "";
 }
 
-function choosePatch(id) {
-  patchSelect().value = String(id);
-  keep("input-patch", patchSelect().value);
+function choosePatch(key) {
+  if (!patches.has(key)) return;
+  patchSelect().value = key;
+  keep("input-patch", key);
   showInputs();
 }
 
 function showPatches() {
-  const patches = patchesWithInputs(root());
-  choices(patchSelect(), patches.map((patch) => [String(patch.id), `${nameOf(patch)} (${patch.id})`]));
-  const canBeSet = ({ inputs }) => inputs.some(({ id }) => index.incomingConnection(id) === null);
-  const first = patches.find(canBeSet) ?? patches[0];
-  patchSelect().value = stateOf("input-patch", String(first?.id ?? ""));
-  if (patchSelect().value === "" && first !== undefined) patchSelect().value = String(first.id);
+  patches = new Map();
+  collectPatches(current().root);
+  const seen = new Set();
+  repeated = new Set();
+  for (const { inputs } of patches.values()) {
+    for (const { id } of inputs) (seen.has(id) ? repeated : seen).add(id);
+  }
+  choices(patchSelect(), [...patches].map(([key, patch]) => [key, `${nameOf(patch)} (${patch.id})`]));
+  const canBeSet = ([, { inputs }]) => inputs.some(({ id }) => index.incomingConnection(id) === null);
+  const [first] = [...patches].find(canBeSet) ?? [...patches][0] ?? [""];
+  const kept = stateOf("input-patch", "");
+  patchSelect().value = patches.has(kept) ? kept : first;
   showInputs();
 }
 
-// Edits
+// Versions
 
 let keeping = 0;
 let comparing = 0;
 
-function showEdit() {
-  index.update(root());
+// What follows from the current version; the graph shows what inputs are, but for the one that was set it is as it was.
+function showVersion(edited) {
+  const { root, sample } = current();
+  index.update(root);
   showFrames();
-  byId("undo").disabled = at === 0;
-  byId("redo").disabled = at === versions.length - 1;
-  if (other() !== null) {
-    // The graph is as it was but for its marks, which may wait until nobody types.
-    clearTimeout(comparing);
-    comparing = setTimeout(showGraph, 150);
+  for (const [id, isThere] of [["undo", at > 0], ["redo", at < versions.length - 1]]) {
+    byId(id).setAttribute("aria-disabled", String(!isThere));
   }
+  byId("sample").value = sample ?? "";
+  showParts(edited, JSON.parse(textOf(native.reportInput(addressOf(root), ...halves(edited)))));
+  clearTimeout(comparing);
+  // To draw large graphs takes longer than from one key to the next.
+  if (other() !== null) comparing = setTimeout(showGraph, 400);
   clearTimeout(keeping);
   keeping = setTimeout(keepDocuments, 300);
 }
@@ -159,156 +219,184 @@ function showEdit() {
 function setInput(portId, value) {
   const edit = new PatchEdit(index);
   edit.inputPort(portId).defaultValue = value;
-  const edited = edit.commit();
+  const root = edit.commit();
   edit.free();
-  if (versions[at].port === portId) --at;
-  versions.splice(at + 1, versions.length, { root: edited, port: portId });
-  ++at;
-  showEdit();
+  const before = [versions, at];
+  const kept = versions.slice(0, current().open === portId ? at : at + 1);
+  versions = [...kept, { ...current(), root, sample: null, edited: portId, open: portId }];
+  at = kept.length;
+  try {
+    showVersion(portId);
+  } catch (error) {
+    [versions, at] = before;
+    throw error;
+  }
 }
 
 function step(by) {
+  if (versions[at + by] === undefined) return;
+  const { edited } = versions[Math.max(at, at + by)];
   at += by;
-  versions[at].port = null;
-  showEdit();
-  showInputs();
+  current().open = null;
+  if (edited === null || edited === several) {
+    showDocument();
+  } else {
+    showVersion(edited);
+    choosePatch(String(index.ownerOfPort(edited)?.id ?? ""));
+    showInputs();
+  }
   say(by < 0 ? "Undone" : "Done again");
 }
 
-// Keeps a document in the address: by its name where it is one of ours, else itself. Whether that was possible.
-async function keepDocument(key, { root: kept, framesPerSecond, name, isAsRead }) {
-  const isSample = isAsRead && Object.hasOwn(samples, name);
-  const text = isSample ? name : `~${await packed(writeDocument(kept, framesPerSecond))}`;
-  const isShort = text.length <= longestAddress;
-  keep(key, isShort ? text : null);
-  keep(`${key}-name`, isSample || !isShort ? null : name);
-  return isShort;
+// Keeping
+
+let keepings = 0;
+
+// A document as the address has it: by its name where it is one of ours, else itself.
+async function addressText({ root, info, sample }) {
+  return sample ?? `~${await packed(writeDocument(root, info.framesPerSecond))}`;
 }
 
 async function keepDocuments() {
-  const { framesPerSecond } = info;
-  let areShort = await keepDocument("document", { root: root(), framesPerSecond, name: fileName, isAsRead: at === 0 });
-  if (otherFile !== null) areShort = (await keepDocument("other", { ...otherFile, isAsRead: true })) && areShort;
-  byId("document-kept").textContent = areShort ? "" : "This is too large for the address: a link would not show it.";
+  const turn = ++keepings;
+  const isCompared = byId("compare").value === "opened" && current().edited !== null;
+  const texts = await Promise.all([current(), otherFile, isCompared ? opened() : null].map((document) => document && addressText(document)));
+  // Another document came meanwhile.
+  if (turn !== keepings) return;
+  const [documentName, otherName] = [current(), otherFile].map((document) => (document?.sample === null ? document.name : null));
+  for (const [i, key] of ["document", "other", "opened"].entries()) keep(key, texts[i]);
+  keep("document-name", documentName);
+  keep("other-name", otherName);
+  const isKept = texts.every((text) => text === null || text.length <= longest);
+  byId("document-kept").textContent = isKept ? "" : "This is too large for the address: a link would not show it.";
 }
 
 // Opening
 
-function show(read, name) {
-  versions = [{ root: read.root, port: null }];
-  at = 0;
-  info = read.info;
-  fileName = name;
-  index = new PatchIndex(root());
+function showDocument() {
+  const { root, info, name } = current();
+  index = new PatchIndex(root);
   forgetAnswers();
   byId("document-name").textContent = name;
-  const lines = `${textOf(native.reportCounts(addressOf(root())))}${info.summary}`.split("\n").filter((line) => line !== "");
+  const lines = `${textOf(native.reportCounts(addressOf(root)))}${info.summary}`.split("\n").filter((line) => line !== "");
   byId("document-notes").replaceChildren(...lines.map((line) => element("p", {}, line)));
-  byId("undo").disabled = true;
-  byId("redo").disabled = true;
-  byId("sample").value = Object.hasOwn(samples, name) ? name : "";
   showPatches();
-  showFrames();
+  showVersion(several);
   showGraph();
 }
 
 const longestError = 300;
 
-// What cannot be read gives one line, and changes nothing.
-function open(bytes, name, use) {
-  let read;
+function sayError(name, error) {
+  const line = `${name}: ${messageOf(error)}`;
+  const half = longestError / 2;
+  byId("document-error").textContent = line.length > longestError ? `${line.slice(0, half)} … ${line.slice(-half)}` : line;
+}
+
+// The document in the bytes, or null; what cannot be read gives one line.
+function read(bytes, name, sample = null) {
   try {
-    read = readDocumentWithInfo(bytes);
-  } catch ({ message }) {
-    const line = `${name}: ${message}`;
-    const half = longestError / 2;
-    byId("document-error").textContent = line.length > longestError ? `${line.slice(0, half)} … ${line.slice(-half)}` : line;
-    return;
+    return { ...readDocumentWithInfo(bytes), name, sample };
+  } catch (error) {
+    sayError(name, error);
+    return null;
   }
-  byId("document-error").textContent = "";
-  use(read, name);
 }
 
-function openDocument(bytes, name) {
-  open(bytes, name, (read) => {
-    keep("input-patch", null);
-    show(read, name);
-    keepDocuments();
-  });
+function open(document) {
+  if (document === null) return;
+  keep("input-patch", null);
+  const before = [versions, at];
+  versions = [...versions.slice(0, at + 1), { ...document, edited: null, open: null }];
+  at = versions.length - 1;
+  try {
+    showDocument();
+  } catch (error) {
+    sayError(document.name, error);
+    [versions, at] = before;
+    if (versions.length > 0) showDocument();
+  }
 }
 
-function takeOther(bytes, name) {
-  open(bytes, name, ({ root: read, info: { framesPerSecond } }) => {
-    otherFile = { root: read, framesPerSecond, name };
-    const option = byId("compare").querySelector("[value=file]");
-    option.disabled = false;
-    option.textContent = name;
-  });
+function takeOther(document) {
+  if (document === null) return;
+  otherFile = document;
+  const option = byId("compare").querySelector("[value=file]");
+  option.disabled = false;
+  option.textContent = document.name;
 }
 
-function compareWithFile(bytes, name) {
-  const before = otherFile;
-  takeOther(bytes, name);
-  if (otherFile === before) return;
+function compareWithFile(document) {
+  takeOther(document);
+  if (document === null) return;
   byId("compare").value = "file";
   byId("compare").dispatchEvent(new Event("input"));
-  keepDocuments();
 }
 
-async function readFile(file, use) {
-  let bytes;
-  try {
-    bytes = new Uint8Array(await file.arrayBuffer());
-  } catch ({ message }) {
-    // A folder, or a file that is gone by now.
-    byId("document-error").textContent = `${file.name}: ${message}`;
-    return;
+let reading = 0;
+
+// Calls `use` with each of the files, one after the other, up to one that cannot be read; with none where others were chosen since.
+async function readFiles(files, uses) {
+  const turn = ++reading;
+  byId("document-error").textContent = "";
+  for (const [i, file] of files.entries()) {
+    let document = null;
+    try {
+      const bytes = new Uint8Array(await file.arrayBuffer());
+      if (turn !== reading) return;
+      document = read(bytes, file.name);
+    } catch (error) {
+      // A folder, or a file that is gone by now.
+      sayError(file.name, error);
+    }
+    if (document === null) return;
+    uses[i](document);
   }
-  use(bytes, file.name);
 }
 
-// What the address has under the key, and its name.
+// What the address has under the key, or null.
 async function kept(key, otherwise) {
   const text = stateOf(key, otherwise);
-  if (Object.hasOwn(samples, text)) return [samples[text], text];
+  if (text === "") return null;
+  if (Object.hasOwn(samples, text)) return read(samples[text], text, text);
   try {
-    return [await unpacked(text.slice(1)), stateOf(`${key}-name`, "a document")];
+    return read(await unpacked(text.slice(1)), stateOf(`${key}-name`, "a document"));
   } catch {
     byId("document-error").textContent = "The address has no document that can be read.";
     return null;
   }
 }
 
-export async function start() {
-  byId("sample").append(...Object.keys(samples).map((name) => element("option", { value: name }, name)));
-  frame = Number(stateOf("frame", "0")) || 0;
-  if (stateOf("other", "") !== "") {
-    const found = await kept("other");
-    if (found !== null) takeOther(...found);
-  }
-  // The file comes first, since the choice is shown with it.
-  keepField(byId("compare"), "", showGraph);
-  const found = await kept("document", "animation");
-  if (found !== null) open(...found, show);
-  if (versions.length === 0) show(readDocumentWithInfo(animation), "animation");
-
+function listen() {
   byId("sample").addEventListener("input", ({ target: { value } }) => {
-    openDocument(samples[value], value);
+    ++reading;
+    byId("document-error").textContent = "";
+    open(read(samples[value], value, value));
   });
-  for (const [id, use] of [["document-file", openDocument], ["compare-file", compareWithFile]]) {
-    byId(id).addEventListener("change", async ({ target }) => {
-      const file = target.files[0];
+  for (const [id, use] of [["document-file", open], ["compare-file", compareWithFile]]) {
+    byId(id).addEventListener("change", ({ target }) => {
+      const files = [...target.files];
       // The same file can be chosen again, with what it has by then.
-      if (file !== undefined) await readFile(file, use);
       target.value = "";
+      readFiles(files, [use]);
     });
   }
   patchSelect().addEventListener("input", () => choosePatch(patchSelect().value));
   byId("undo").addEventListener("click", () => step(-1));
   byId("redo").addEventListener("click", () => step(1));
+  addEventListener("keydown", (event) => {
+    // Fields undo what is typed in them.
+    const isElsewhere = byId("documents").hidden || event.target.matches("input:not([type=range])");
+    if (isElsewhere || !(event.ctrlKey || event.metaKey)) return;
+    const by = { z: event.shiftKey ? 1 : -1, y: 1 }[event.key.toLowerCase()];
+    if (by === undefined) return;
+    event.preventDefault();
+    step(by);
+  });
   byId("save").addEventListener("click", () => {
-    const url = URL.createObjectURL(new Blob([writeDocument(root(), info.framesPerSecond)], { type: "application/json" }));
-    element("a", { href: url, download: `${fileName.replace(/\.json$/, "")}.json` }).click();
+    const { root, info, name } = current();
+    const url = URL.createObjectURL(new Blob([writeDocument(root, info.framesPerSecond)], { type: "application/json" }));
+    element("a", { href: url, download: `${name.replace(/\.json$/, "")}.json` }).click();
     setTimeout(() => URL.revokeObjectURL(url), 1000);
   });
   // A patch of the graph that is clicked or reached has its inputs shown.
@@ -316,15 +404,41 @@ export async function start() {
     byId("report-graph").addEventListener(kind, ({ target }) => {
       const port = target.closest(".patch")?.querySelector("[data-port]");
       const patch = port ? index.ownerOfPort(BigInt(port.dataset.port)) : null;
-      if (patch !== null && patch.inputs.length > 0 && String(patch.id) !== patchSelect().value) choosePatch(patch.id);
+      if (patch !== null && String(patch.id) !== patchSelect().value) choosePatch(String(patch.id));
     });
   }
-  addEventListener("dragover", (event) => event.preventDefault());
-  addEventListener("drop", (event) => {
-    event.preventDefault();
-    const [file, second] = event.dataTransfer.files;
-    if (file === undefined) return;
-    byId("tab-documents").click();
-    readFile(file, openDocument).then(() => second && readFile(second, compareWithFile));
+  const hasFiles = (event) => event.dataTransfer.types.includes("Files");
+  addEventListener("dragover", (event) => {
+    if (hasFiles(event)) event.preventDefault();
   });
+  addEventListener("drop", (event) => {
+    if (!hasFiles(event)) return;
+    event.preventDefault();
+    byId("tab-documents").click();
+    readFiles([...event.dataTransfer.files].slice(0, 2), [open, compareWithFile]);
+  });
+}
+
+export async function start() {
+  byId("sample").append(...Object.keys(samples).map((name) => element("option", { value: name }, name)));
+  frame = Number(stateOf("frame", "0")) || 0;
+  takeOther(await kept("other", ""));
+  const before = await kept("opened", "");
+  const document = (await kept("document", "animation")) ?? read(animation, "animation", "animation");
+  // Both are there before the choice between them.
+  versions = [{ ...(before ?? document), name: document.name, edited: null, open: null }];
+  if (before !== null) versions.push({ ...document, edited: several, open: null });
+  at = versions.length - 1;
+  keepField(byId("compare"), "", () => {
+    showGraph();
+    keepDocuments();
+  });
+  if (byId("compare").selectedOptions[0].disabled) byId("compare").value = "";
+  try {
+    showDocument();
+  } catch (error) {
+    sayError(document.name, error);
+    open(read(animation, "animation", "animation"));
+  }
+  listen();
 }

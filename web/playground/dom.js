@@ -1,5 +1,7 @@
 // What all subjects need of the page.
 
+import { hasEnded } from "../src/native.js";
+
 export const byId = (id) => document.getElementById(id);
 
 export function element(name, attributes = {}, ...content) {
@@ -20,9 +22,18 @@ export function choices(select, entries) {
   select.replaceChildren(...entries.map(([value, text]) => element("option", { value }, text)));
 }
 
-/** Says something that is not shown. */
+let saying = 0;
+
+/** Says what was done, for a moment. */
 export function say(text) {
+  clearTimeout(saying);
   byId("said").textContent = text;
+  saying = setTimeout(() => (byId("said").textContent = ""), 3000);
+}
+
+/** What went wrong, in one line. */
+export function messageOf(error) {
+  return hasEnded() ? "There is not enough memory for this. Reload the page to go on." : error.message;
 }
 
 /** Calls `update`; what it throws is shown in the place for errors, and what was shown before stays. */
@@ -31,7 +42,7 @@ export function attempt(place, update) {
     update();
     place.textContent = "";
   } catch (error) {
-    place.textContent = error.message;
+    place.textContent = messageOf(error);
   }
 }
 

@@ -4,6 +4,7 @@ import dagre from "dagre";
 
 // More would take seconds, and those who wait for them see nothing else.
 const mostBoxes = 300;
+const mostLines = 1000;
 const longestMilliseconds = 2000;
 const pixelsPerInch = 72;
 
@@ -38,7 +39,7 @@ export function answerOfDot(text) {
     const rows = graph.split("\n");
     const boxes = rows.map((row) => box.exec(row)).filter((found) => found !== null);
     const lines = rows.map((row) => line.exec(row)).filter((found) => found !== null);
-    if (boxes.length > mostBoxes || performance.now() - started > longestMilliseconds) {
+    if (boxes.length > mostBoxes || lines.length > mostLines || performance.now() - started > longestMilliseconds) {
       answer = null;
       break;
     }

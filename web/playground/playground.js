@@ -54,5 +54,11 @@ setNative(await createNative({ wasmBinary, answerOfDot }));
 values.start();
 curves.start();
 shapes.start();
-await documents.start();
 show(byId(`tab-${stateOf("show", "values")}`) ?? tabs[0]);
+// Elsewhere the link would go into the address.
+document.querySelector(".skip").addEventListener("click", (event) => {
+  event.preventDefault();
+  byId("main").focus();
+});
+await documents.start();
+document.documentElement.dataset.state = "ready";

@@ -4,9 +4,12 @@
 #include "../src/native.h"
 
 #include "animation/labels.h"
+#include "report/drawing.h"
 #include "report/graphviz.h"
 #include "report/marks.h"
 #include "report/page.h"
+
+#include <Engine/Base/patch_index.h>
 
 #include <optional>
 #include <string>
@@ -31,9 +34,9 @@ Document documentOf(Address root, double framesPerSecond) {
     return document;
 }
 
-val film(Address root, double framesPerSecond, double frames) {
+val film(Address root, double framesPerSecond, double frames, double seconds) {
     FilmSections const sections =
-        filmSections(documentOf(root, framesPerSecond), static_cast<long long>(frames));
+        filmSections(documentOf(root, framesPerSecond), static_cast<long long>(frames), seconds);
     val answer = val::object();
     answer.set("animation", bytesOf(sections.animation));
     answer.set("outputs", bytesOf(sections.outputs));
@@ -58,6 +61,15 @@ val comparedGraph(Address root, double framesPerSecond, Address before,
     return answerOf(graphSections(to.root, &marks));
 }
 
+// What the graph says of an input, as JSON; null where there is none.
+val input(Address root, unsigned low, unsigned high) {
+    PatchIndex const index(patchAt(root));
+    Port const* const port = index.findInputPort(idOf(low, high));
+    Json parts;
+    if (port != nullptr) parts = Drawing(patchAt(root)).describe(*port, true);
+    return bytesOf(jsonText(parts));
+}
+
 val counts(Address root) { return bytesOf(countsText(documentOf(root, 0.0))); }
 
 }  // namespace
@@ -66,6 +78,7 @@ EMSCRIPTEN_BINDINGS(report) {
     native<&film>("reportFilm");
     native<&graph>("reportGraph");
     native<&comparedGraph>("reportComparedGraph");
+    native<&input>("reportInput");
     native<&counts>("reportCounts");
 }
 

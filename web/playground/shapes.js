@@ -67,17 +67,29 @@ const shape = () => shapes[byId("shape-kind").value];
 const namesOf = ({ handles }) => handles.flatMap(({ names }) => names);
 const pathOf = ({ draw }, numbers) => draw(new PathBuilder(), numbers).build();
 
+// What can be seen and drawn.
+const farthest = 1e6;
+
 function numbers() {
-  return fields.map((field) => numberOf(field.value));
+  return fields.map(({ value }) => {
+    const number = numberOf(value);
+    if (!(Math.abs(number) <= farthest)) throw new RangeError(`"${value}" is not within ${farthest} of 0`);
+    return number;
+  });
 }
 
-const parameters = () => Object.fromEntries(namesOf(shape()).map((name, i) => [name, Number(fields[i].value)]));
+function parameters() {
+  const values = numbers();
+  return Object.fromEntries(namesOf(shape()).map((name, i) => [name, values[i]]));
+}
+
+const keepFields = () => keep("shape", fields.map(({ value }) => value.trim()).join(" "));
 
 function setParameters(changed) {
   namesOf(shape()).forEach((name, i) => {
     if (changed[name] !== undefined) fields[i].value = Math.round(changed[name] * 100) / 100;
   });
-  keep("shape", fields.map(({ value }) => value).join(" "));
+  keepFields();
   update();
 }
 
@@ -108,13 +120,19 @@ function update() {
       const [x, y] = shape().handles[i].of(places);
       handle.setAttribute("cx", x);
       handle.setAttribute("cy", y);
+      handle.setAttribute("aria-valuenow", Math.round(x));
       handle.setAttribute("aria-valuetext", `${shortly(x)}, ${shortly(y)}`);
     });
   });
 }
 
-function moveHandle(i, x, y) {
-  setParameters(shape().handles[i].to(x, y, parameters()));
+// The handle's place changes by so much.
+function moveHandle(i, dx, dy) {
+  attempt(byId("shape-error"), () => {
+    const now = parameters();
+    const [x, y] = shape().handles[i].of(now);
+    setParameters(shape().handles[i].to(x + dx, y + dy, now));
+  });
 }
 
 function makeHandles() {
@@ -126,17 +144,23 @@ function makeHandles() {
   byId("shape-handles").replaceChildren(...shape().handles.map(({ names }, i) => {
     const label = names.length === 1 ? names[0] : names[0].replace(/ x$/, "").replace("width", "size");
     const handle = svgElement("circle", { r: 7, tabindex: 0, role: "slider", "aria-label": label, "aria-valuenow": 0, "aria-valuemin": -120, "aria-valuemax": 120 });
-    handle.addEventListener("pointerdown", (event) => handle.setPointerCapture(event.pointerId));
+    let last;
+    handle.addEventListener("pointerdown", (event) => {
+      handle.setPointerCapture(event.pointerId);
+      last = placeOf(event);
+    });
     handle.addEventListener("pointermove", (event) => {
-      if (event.buttons !== 0) moveHandle(i, ...placeOf(event));
+      if (event.buttons === 0 || last === undefined) return;
+      const [x, y] = placeOf(event);
+      moveHandle(i, x - last[0], y - last[1]);
+      last = [x, y];
     });
     handle.addEventListener("keydown", (event) => {
       const [dx, dy] = { ArrowLeft: [-1, 0], ArrowRight: [1, 0], ArrowUp: [0, -1], ArrowDown: [0, 1] }[event.key] ?? [0, 0];
       if (dx === 0 && dy === 0) return;
       event.preventDefault();
       const far = event.shiftKey ? 10 : 1;
-      const [x, y] = shape().handles[i].of(parameters());
-      moveHandle(i, x + far * dx, y + far * dy);
+      moveHandle(i, far * dx, far * dy);
     });
     return handle;
   }));
@@ -146,10 +170,10 @@ function makeFields(values) {
   const holder = byId("shape-fields");
   while (holder.children.length > 1) holder.lastElementChild.remove();
   fields = namesOf(shape()).map((name, i) => {
-    const field = element("input", { autocomplete: "off", inputmode: "decimal" });
+    const field = element("input", { autocomplete: "off", inputmode: "decimal", "aria-describedby": "shape-error" });
     field.value = values[i];
     field.addEventListener("input", () => {
-      keep("shape", fields.map(({ value }) => value).join(" "));
+      keepFields();
       update();
     });
     holder.append(element("label", {}, `${name} `, field));

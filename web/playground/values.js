@@ -8,12 +8,19 @@ import { keepField } from "./state.js";
 // What to show of a value of that type: its text, or for data the data.
 const shown = (value) => (value.type === Type.Unstructured ? value.asUnstructured().toText(400) : value.toString());
 
+// The least integer has no literal of its own.
+const cppInteger = (integer) => (integer === -(2n ** 63n) ? "-9223372036854775807LL - 1" : `${integer}LL`);
+const cppString = (string) =>
+  JSON.stringify(string).replace(/\\u00([01][0-9a-f])|\u007f/g, (_, code = "7f") => `\\${parseInt(code, 16).toString(8).padStart(3, "0")}`);
+// JSON of JavaScript has no 64-bit integers.
+const wholeNumber = (_, content) => (typeof content === "bigint" ? Number(content) : content);
+
 function code(value) {
   const content = {
-    [Type.Float]: () => cppOf(value.number), [Type.Int]: () => `${value.integer}LL`, [Type.Boolean]: () => String(value.boolean),
+    [Type.Float]: () => cppOf(value.number), [Type.Int]: () => cppInteger(value.integer), [Type.Boolean]: () => String(value.boolean),
     [Type.Vec2]: () => cppOf(value.vec2), [Type.Vec3]: () => cppOf(value.vec3), [Type.Vec4]: () => cppOf(value.vec4),
-    [Type.String]: () => JSON.stringify(value.string), [Type.Image]: () => `Value::Image(${value.id}u)`,
-    [Type.Unstructured]: () => `Unstructured(fromJson(nlohmann::json::parse(R"(${JSON.stringify(value.asUnstructured())})")))`,
+    [Type.String]: () => cppString(value.string), [Type.Image]: () => `Value::Image(${value.id}u)`,
+    [Type.Unstructured]: () => `Unstructured(fromJson(nlohmann::json::parse(R"json(${JSON.stringify(value.asUnstructured().toJS(), wholeNumber)})json")))`,
   }[value.type]();
   return `Value const value = ${content};\nstd::cout << value.asType(Type::Vec4);  // ${value.asType(Type.Vec4)}`;
 }
@@ -21,16 +28,20 @@ function code(value) {
 function update() {
   attempt(byId("value-error"), () => {
     const value = kinds[byId("value-type").value].read(byId("value-content").value);
-    byId("value-readings").replaceChildren(...typeNames.map((name) => {
+    const readings = typeNames.map((name) => {
       const type = Type[name];
       const heading = element("th", { scope: "row", class: `t-${typeToString(type)}` }, typeToString(type));
       return element("tr", {}, heading, element("td", {}, shown(value.asType(type))));
-    }));
+    });
     const bound = (id) => (byId(id).value.trim() === "" ? null : numberOf(byId(id).value));
     const port = { type: Type[byId("port-type").value], min: bound("port-min"), max: bound("port-max") };
+    const ofPort = shown(castValueToType(value, port).asType(port.type));
+    const inCpp = code(value);
+    // All of it, or nothing where something cannot be read.
+    byId("value-readings").replaceChildren(...readings);
     byId("port-name").textContent = portNameForTypeInfo(port);
-    byId("port-value").textContent = shown(castValueToType(value, port).asType(port.type));
-    byId("value-code").textContent = code(value);
+    byId("port-value").textContent = ofPort;
+    byId("value-code").textContent = inCpp;
   });
 }
 

@@ -3,6 +3,7 @@
 export let native;
 
 let isEnded = false;
+export const hasEnded = () => isEnded;
 
 function ended(cause) {
   isEnded = true;

@@ -85,7 +85,7 @@ function showPlot(chart, at) {
 }
 
 function showFrame(next) {
-    frame = Math.min(Math.max(next, 0), lastFrame());
+    frame = Math.min(Math.max(Math.round(next), 0), lastFrame());
     const time = `${frame}, ${(frame / film.framesPerSecond).toFixed(2)} s`;
     slider.value = frame;
     slider.setAttribute("aria-valuetext", time);
@@ -124,6 +124,15 @@ function keyStep(key) {
 function goTo(next) {
     setPlaying(false);
     showFrame(next);
+}
+
+// What listens already.
+const bound = new WeakSet();
+
+function isNew(element) {
+    if (bound.has(element)) return false;
+    bound.add(element);
+    return true;
 }
 
 function bindPlayer() {
@@ -169,16 +178,20 @@ export function showFilm(next, first = 0, changed = () => {}) {
     slider = byId("frame") ?? document.createElement("input");
     play = byId("play") ?? document.createElement("button");
     charts = [...document.querySelectorAll(".chart")];
-    bindPlayer();
-    charts.forEach(bindChart);
+    if (isNew(play)) bindPlayer();
+    charts.filter(isNew).forEach(bindChart);
     showFrame(first);
-    setPlaying(isPlaying);
+    setPlaying(isPlaying && play.isConnected);
 }
 
 // Graph
 
+// The patch or port that each place for information is about.
+const shownIn = new WeakMap();
+
 function showInfo(item) {
     const info = item.closest("figure").querySelector(":scope > .info");
+    shownIn.set(info, item);
     info.replaceChildren(...JSON.parse(item.dataset.parts).map((line) => {
         const paragraph = document.createElement("p");
         paragraph.textContent = line;
@@ -261,6 +274,16 @@ function bindGraph(graph) {
         else return;
         event.preventDefault();
     });
+}
+
+// Says something else of an input, if it is drawn.
+export function showParts(portId, parts) {
+    const isInput = (item) => JSON.parse(item.dataset.parts)[0] === parts?.[0];
+    const item = [...document.querySelectorAll(`[data-port="${portId}"]`)].find(isInput);
+    if (item === undefined) return;
+    item.dataset.parts = JSON.stringify(parts);
+    item.setAttribute("aria-label", parts.join("; "));
+    if (shownIn.get(item.closest("figure").querySelector(":scope > .info")) === item) showInfo(item);
 }
 
 export const openLevels = () => [...document.querySelectorAll("[data-level]")].filter(isOpen).map((heading) => heading.dataset.level);
