@@ -292,6 +292,33 @@ TEST(PathShapes, Circle) {
     EXPECT_EQ(builder.currentPoint, (FloatVec2{1, 0}));
 }
 
+// The figures of docs/paths.md.
+TEST(PathShapes, ACircleIsAsFarOffAsDocumented) {
+    Path const circle = PathBuilder().circle({0, 0}, 1).build();
+    FloatVec2 from = circle.elements.front().points[0];
+    double outside = 0.0;
+    double inside = 0.0;
+    for (std::size_t i = 1; i <= 4; ++i) {
+        Points const& p = circle.elements[i].points;
+        for (int step = 0; step <= 100000; ++step) {
+            double const t = step / 100000.0;
+            double const s = 1 - t;
+            auto const at = [&](double a, double b, double c, double d) {
+                return s * s * s * a + 3 * s * s * t * b + 3 * s * t * t * c + t * t * t * d;
+            };
+            double const x = at(from.x, p[0].x, p[1].x, p[2].x);
+            double const y = at(from.y, p[0].y, p[1].y, p[2].y);
+            outside = std::max(outside, std::hypot(x, y) - 1);
+            inside = std::max(inside, 1 - std::hypot(x, y));
+        }
+        from = p[2];
+    }
+    EXPECT_GT(outside, 2.725e-4);
+    EXPECT_LE(outside, 2.726e-4);
+    EXPECT_GT(inside, 4e-10);
+    EXPECT_LE(inside, 5e-10);
+}
+
 TEST(PathShapes, EllipseIsFourArcs) {
     struct Row {
         char const* what;

@@ -298,7 +298,7 @@ TEST(PathFromSvgPathData, TurnsArcsIntoCurves) {
                 double const x = at(from.x, p[0].x, p[1].x, p[2].x);
                 double const y = at(from.y, p[0].y, p[1].y, p[2].y);
                 EXPECT_LE(std::abs(std::hypot(x - row.centre.x, y - row.centre.y) - row.radius),
-                          2.8e-4 * row.radius);
+                          2.726e-4 * row.radius);
                 nearestToMiddle =
                     std::min(nearestToMiddle, std::hypot(x - row.middle.x, y - row.middle.y));
             }

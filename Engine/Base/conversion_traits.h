@@ -35,7 +35,7 @@ constexpr bool isCharacter = std::is_integral_v<T> && !isSignedInteger<T> &&
 template <class T>
 constexpr bool isWideInteger = isOneOf<T, long, unsigned long> && sizeof(long) == sizeof(long long);
 
-// What a `Value` refuses to be read as, since a promotion of its truth value would answer.
+// What a `Value` refuses to be read as, since it would convert to `bool` and be promoted.
 template <class T>
 constexpr bool isNarrowNumber = std::is_arithmetic_v<T> && !isWideInteger<T> &&
                                 !isOneOf<T, bool, double, long long, unsigned long long>;
@@ -49,7 +49,7 @@ constexpr bool
                                        std::is_pointer_v<decltype(+std::declval<T const&>())>>> =
         true;
 
-// What a `Value` refuses to be made from, since its truth value would be stored.
+// What a `Value` refuses to be made from, since it would convert to `bool` and be stored as that.
 template <class T>
 constexpr bool isNoValueSource =
     isUnsignedInteger<T> || isCharacter<T> || std::is_same_v<T, long double> ||

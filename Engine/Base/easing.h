@@ -39,7 +39,7 @@ enum class EasingFunction : std::int32_t {
 /// position. A new list at every call.
 TARN_API std::vector<std::string> easingFunctionNames();
 
-/// The curve of that name, byte by byte; empty for any other text.
+/// The curve of that name, byte by byte; empty for any other string.
 TARN_API Optional<EasingFunction> stringToEasingFunction(std::string const& name);
 
 /// Writes the name that an editor shows; "EasingFunction(77)" for what is no enumerator.

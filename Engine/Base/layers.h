@@ -20,7 +20,7 @@ struct ModelLayer {
     /// The layer, and those beneath it.
     unsigned long long id = 0;
     std::vector<ModelLayer> children = {};
-    /// Compared and copied, but not part of the debug text.
+    /// Compared and copied, but not part of the debug output.
     std::vector<ModelLayer> additionalLayers = {};
 
     /// The same identifiers in the same trees.
@@ -40,7 +40,7 @@ struct RenderLayer {
 };
 
 /// A layer with those that are drawn ahead of it and those nested in it. 8 MiB of stack are enough
-/// for 10,000 levels of everything here; the text of n levels has about n * n / 2 dashes.
+/// for 10,000 levels of everything here; the output of n levels has about n * n / 2 dashes.
 struct RenderLayerHierarchy {
     /// The layer, those drawn ahead of it, and those nested in it.
     RenderLayer layer = {};
@@ -79,7 +79,7 @@ struct StrokeSettings {
     TARN_API bool operator!=(StrokeSettings const& other) const;
 };
 
-/// The worker behind the hierarchy's text. Each line is a dash, `prefix`, "v" where `marked`, and
+/// The worker behind the hierarchy's output. Each line is a dash, `prefix`, "v" where `marked`, and
 /// the layer; leading layers come first and are marked, children follow with one dash more.
 TARN_API void _helper(std::ostream& stream, RenderLayerHierarchy const& hierarchy,
                       std::string prefix, bool marked);

@@ -1,4 +1,4 @@
-// Engine/Base/patch.h: the graph of patches, its evaluation form, its queries and its debug text.
+// Engine/Base/patch.h: the graph of patches, its evaluation form, its queries and its debug output.
 //
 //     Patch const* patch = findPatchRecursive(root, 7);
 //     for (Connection const& c : findOutgoingConnectionsFromPort(root, portId)) { follow(c); }
@@ -132,13 +132,13 @@ namespace tarn::engine {
 
 /// A node of the graph: its ports, its children and the connections between the children's ports.
 /// Copies share the lists. 8 MiB of stack are enough for 10,000 levels of everything here, queries
-/// and debug text included.
+/// and debug output included.
 struct Patch {
     /// Never 0 in a document: that means no patch.
     unsigned long long id = 0;
     /// The number of the built-in kind; the evaluator owns the table.
     unsigned long long builtin = 0;
-    /// A second text; compared, but neither printed nor evaluated.
+    /// A second string; compared, but neither printed nor evaluated.
     std::string descriptor = {};
     ModelLayer modelLayer = {};
     std::string name = {};
@@ -257,7 +257,7 @@ TARN_API EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long
 TARN_API Port const* outPortForTag(Patch const& patch, unsigned long long tag);
 TARN_API EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag);
 
-// Debug text, for people; nothing reads it back.
+// Debug output, for people; nothing parses it.
 
 /// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line. Numbers
 /// follow the stream's flags here and below.
@@ -266,9 +266,9 @@ TARN_API std::ostream& operator<<(std::ostream& stream, Port const& port);
 /// "[connection:12->34]", the ids of the ports, without an end of line.
 TARN_API std::ostream& operator<<(std::ostream& stream, Connection const& connection);
 
-/// The patch, its ports, its children's whole texts and its connections. Deliberate: only a
+/// The patch, its ports, its children's whole output and its connections. Deliberate: only a
 /// patch without ports closes its bracket, and nesting is not indented. Every line end is
-/// flushed: print to a string stream where the text is long.
+/// flushed: print to a string stream where the output is long.
 TARN_API std::ostream& operator<<(std::ostream& stream, Patch const& patch);
 
 // Implementation

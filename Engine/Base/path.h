@@ -33,10 +33,10 @@ enum class PathInstruction : unsigned char {
 /// "moveTo" to "close". An enumerator out of range is an assertion failure.
 TARN_API std::string pathInstructionToString(PathInstruction instruction);
 
-/// The inverse, byte by byte. Any other text is an assertion failure, with the condition `0`.
+/// The inverse, byte by byte. Any other string is an assertion failure, with the condition `0`.
 TARN_API PathInstruction stringToPathInstruction(std::string const& name);
 
-/// The same, empty for any other text.
+/// The same, empty for any other string.
 TARN_API Optional<PathInstruction> parsePathInstruction(std::string const& name);
 
 /// Writes the name; "PathInstruction(77)" for what is no enumerator.
@@ -103,9 +103,10 @@ public:
     /// it was, not the end of `path`.
     TARN_API PathBuilder& append(Path path);
 
-    /// A quarter of an ellipse with its axes along x and y, as one cubic curve (at most 2.8e-4 of
-    /// the radius off). `verticalFirst`: leave along y and arrive along x; otherwise the reverse.
-    /// Afterwards the current point is p.
+    /// A quarter of an ellipse with its axes along x and y, as one cubic curve. It is at
+    /// most 2.726e-4 of the radius outside of the ellipse, since the control factor is 0.552284749.
+    /// `verticalFirst`: leave along y and arrive along x; otherwise the reverse. Afterwards the
+    /// current point is p.
     TARN_API PathBuilder& arcTo(FloatVec2 p, bool verticalFirst);
 
     // Closed outlines.

@@ -16,16 +16,16 @@
 
 namespace tarn::engine {
 
-/// The text of a `d` attribute: M, L, C, Q and Z, with absolute coordinates. Each number is the
+/// The string of a `d` attribute: M, L, C, Q and Z, with absolute coordinates. Each number is the
 /// shortest that reads back to the same double, in every locale. SVG has no NaN, which is written
 /// as 0, and no infinity, which is written as the largest double. Elements with fewer points than
 /// their instruction wants are left out, their further points are not written, and a path that
 /// begins without a `moveTo` begins with "M0 0". Linear.
 TARN_API std::string svgPathData(Path const& path);
 
-/// The path of such a text, of all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
+/// The path of such a string, of all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
 /// relative. It consists of `moveTo`, `lineTo`, `curveTo`, `quadCurveTo` and `close` alone: arcs
-/// become up to four cubic curves each, off by at most 2.8e-4 of the radius, and what is drawn
+/// become up to four cubic curves each, as close as `PathBuilder::arcTo` is, and what is drawn
 /// after a close begins with a `moveTo`. No data is the empty path.
 ///
 /// Empty where the data is faulty, also where it only ends too early, does not begin with M, or has

@@ -1,4 +1,4 @@
-// Engine/Base/unstructured.h: free-form data, a tree of maps, lists, numbers and texts.
+// Engine/Base/unstructured.h: free-form data, a tree of maps, arrays, numbers and strings.
 //
 //     Unstructured::Map point;
 //     point["X"] = 1.5;
@@ -35,9 +35,9 @@ using EnableIfDataSource = std::enable_if_t<
 
 }  // namespace detail
 
-/// A value in the manner of JSON, with two kinds of integers and no truth value of its own (truth
+/// A value in the manner of JSON, with two kinds of integers and no boolean of its own (truth
 /// is the integer 1 or 0). It owns its subtree: a copy is deep, a move takes constant time, cannot
-/// fail and leaves null behind. No reading fails: what has no answer is zero, false or empty.
+/// fail and leaves null behind. No conversion fails: what has no meaning is zero, false or empty.
 /// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons
 /// of trees of more than 256 levels allocate a list of what is still to do; destruction never does.
 /// For that a tree counts its levels when it takes a map or an array over: from then on no element
@@ -89,7 +89,7 @@ public:
     /// A path of such steps, from the outside to the inside.
     using Steps = std::initializer_list<Step>;
 
-    /// What a reading along a path came upon.
+    /// What a lookup along a path found.
     enum class Lookup : unsigned char {
         /// Something of the kind that was asked for.
         Found = 0,
@@ -112,7 +112,7 @@ public:
     TARN_API_INLINE Unstructured(long long const& integer) : storage(integer) {}
     TARN_API_INLINE Unstructured(double const& number) : storage(number) {}
     TARN_API_INLINE Unstructured(unsigned long long const& integer) : storage(integer) {}
-    /// Every other integer type, by its sign; a truth value or a character is neither.
+    /// Every other integer type, by its sign; a boolean or a character is neither.
     template <class Integer, std::enable_if_t<detail::isOtherInteger<Integer>, int> = 0>
     Unstructured(Integer integer)
         : Unstructured(static_cast<std::conditional_t<std::is_signed_v<Integer>, long long,
@@ -209,14 +209,14 @@ public:
     TARN_API std::string stringAt(Steps path, std::string otherwise,
                                   Lookup* lookup = nullptr) const;
 
-    /// A text for people, on one line, in the manner of JSON: `{"id": 7u, "size": [80.0, 50.5]}`.
+    /// A string for people, on one line, in the manner of JSON: `{"id": 7u, "size": [80.0, 50.5]}`.
     /// Kinds can be told apart: a floating-point number has a point, an exponent or is "nan" or
     /// "inf", an unsigned one ends in "u", null is "null". Strings are in quotes, in UTF-8: control
     /// characters and bytes that are none stand as "\\n", "\\t", "\\r" or "\\x1f".
     ///
     /// `maxDepth` levels of maps and arrays are shown; a deeper one is "{...}" or "[...]", unless
-    /// it is empty. The text has at most `maxBytes` bytes: what would be longer ends in "..."
-    /// there. The cost follows the text, not the tree; nothing recurses.
+    /// it is empty. The string has at most `maxBytes` bytes: what would be longer ends in "..."
+    /// there. The cost follows the string, not the tree; nothing recurses.
     TARN_API std::string toText(std::size_t maxBytes = 4096, std::size_t maxDepth = 16) const;
 
     /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element

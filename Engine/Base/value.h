@@ -102,7 +102,7 @@ struct FloatVec4 {
 
 /// A 4x4 matrix in one run, zero unless given; the identity has 1.0 at positions 0, 5, 10 and 15.
 /// Rows or columns first is the reader's convention. It has no equality of its own: a `Value`
-/// compares matrices by their bytes, and one reading of `==` is enough.
+/// compares matrices by their bytes, and one meaning of `==` is enough.
 struct FloatMat4 {
     /// Row by row or column by column, as the reader has it.
     double elements[16] = {};
@@ -113,7 +113,7 @@ static_assert(sizeof(FloatMat4) == 128, "sixteen doubles and nothing else");
 /// assertion failure.
 TARN_API std::string typeToString(Type type);
 
-/// The inverse of `typeToString`, byte by byte; empty for any other text.
+/// The inverse of `typeToString`, byte by byte; empty for any other string.
 TARN_API Optional<Type> stringToType(std::string const& name);
 
 /// True for images, videos, sounds and models; false for any byte that is no enumerator.
@@ -123,13 +123,14 @@ TARN_API bool typeIsResource(Type type);
 /// but for paths, models and unstructured data; false for any byte that is no enumerator.
 TARN_API bool typeShouldCopyAcrossDeletedConnections(Type type);
 
-/// One value of one of the fourteen types. Numbers, vectors, truth values and identifiers are held
+/// One value of one of the fourteen types. Numbers, vectors, booleans and identifiers are held
 /// inline; a matrix, a path, a tree or a string is allocated once, never changed afterwards, and
 /// shared by every copy. A copy costs at most one reference count and never fails.
 ///
-/// Every value reads as every type, without failing: a reading that makes no sense is zero, false,
-/// the identity matrix or the empty path. A value that was moved from, or made from a null pointer,
-/// may hold a null payload; it reads as neutral and equals only another null of its alternative.
+/// Every value converts to every type, without failing: a conversion without a meaning is zero,
+/// false, the identity matrix or the empty path. A value that was moved from, or made from a null
+/// pointer, may hold a null payload; it reads as neutral and equals only another null of its
+/// alternative.
 ///
 /// Distinct values may be used on distinct threads, copies of one value included.
 class Value {
@@ -175,7 +176,7 @@ public:
     /// The resource `id`. A `type` that is no resource is an assertion failure.
     TARN_API Value(unsigned long long id, Type type);
 
-    /// An unsigned number needs its `Type`; a character, a pointer or null would be a truth value.
+    /// An unsigned number needs its `Type`; a character, a pointer or null would convert to `bool`.
     template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
     Value(Source) = delete;
     Value(std::nullptr_t) = delete;
@@ -202,9 +203,9 @@ public:
     /// The type of what the value holds. Constant time, a few instructions.
     TARN_API_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
 
-    /// Scalar readings; none allocates. A vector reads as its x, and as true when any component
-    /// is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it has
-    /// elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
+    /// Conversions to scalars; none allocates. A vector reads as its x, and as true when any
+    /// component is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it
+    /// has elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
     /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
     /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
     /// integer towards zero, kept in range, and 0 for a NaN.
@@ -225,7 +226,7 @@ public:
             std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
         return static_cast<Integer>(operator Reading());
     }
-    /// `int(value)` would be a promoted truth value: read a `long long` and narrow that.
+    /// `int(value)` would be a promoted `bool`: convert to a `long long` and narrow that.
     template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
     operator Narrow() const = delete;
 
@@ -233,10 +234,10 @@ public:
     template <class T>
     void operator[](T const*) const = delete;
 
-    /// Vector readings, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would fill the
-    /// record's first number and nothing else. None allocates. A number or truth value fills every
-    /// component, a shorter vector is filled up with zeros and a longer one cut; data reads as
-    /// `Unstructured` says; everything else is zero.
+    /// Conversions to vectors, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would
+    /// fill the record's first number and nothing else. None allocates. A number or boolean fills
+    /// every component, a shorter vector is filled up with zeros and a longer one cut; data reads
+    /// as `Unstructured` says; everything else is zero.
     TARN_API operator FloatVec2() const noexcept;
     TARN_API operator FloatVec3() const noexcept;
     TARN_API operator FloatVec4() const noexcept;
@@ -248,7 +249,7 @@ public:
     /// As `to_string`, but "??" for data that is no string. Made, not assigned: `s = value` does
     /// not compile, since a string is assigned a character too; `s = std::string(value)` does.
     TARN_API operator std::string() const;
-    /// The data of this value: numbers, strings and trees as they are, a truth value as the integer
+    /// The data of this value: numbers, strings and trees as they are, a boolean as the integer
     /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
     TARN_API Unstructured asUnstructured() const;
 
@@ -273,7 +274,7 @@ public:
     template <class Visitor>
     decltype(auto) visit(Visitor&& visitor) const;
 
-    /// A value of exactly `type`, made from the matching reading with a payload of its own, even
+    /// A value of exactly `type`, made by the matching conversion with a payload of its own, even
     /// when this value has that type already. An enumerator out of range is an assertion failure.
     TARN_API Value asType(Type type) const;
 
@@ -374,7 +375,7 @@ struct std::hash<tarn::engine::Value> {
 
 namespace tarn::engine {
 
-/// The text that an editor shows; not made to be read back. Numbers have two decimals, or one from
+/// The string that an editor shows; not made to be parsed. Numbers have two decimals, or one from
 /// 1000 on, without trailing zeros: 2.5, 1234.6, 3; or they are "nan" or "inf", behind "-" where
 /// the sign is set. They are rounded as the rounding mode says, and cut after 127 characters.
 /// Components of a vector are joined by ", ", and a matrix is four lines of four. Truth is "1" or

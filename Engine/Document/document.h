@@ -63,12 +63,12 @@ struct DocumentInfo {
 };
 
 /// The graph of a document: of our own form, which docs/documents.md describes, or of a node graph
-/// as browser-based node editors export it; which of them, the text tells. Empty for anything else:
+/// as browser-based node editors export it; which of them, the text shows. Empty for anything else:
 /// then `*error`, where given, says why and where. `*info`, where given, is filled in otherwise.
 ///
 /// A document of our own form is read exactly: what `writeDocument` wrote becomes an equal graph,
 /// bit for bit, and anything unknown is refused. A node graph is read as far as it can be: nodes
-/// get other identifiers where theirs are 0, negative, texts or repeated, and keep what was given
+/// get other identifiers where theirs are 0, negative, strings or repeated, and keep what was given
 /// as the attribute "id"; what has no place in the records becomes attributes; each use of a
 /// shared definition becomes a group with a copy of its inside.
 ///
