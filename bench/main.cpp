@@ -1,6 +1,6 @@
 // Measures the library beside what its users would otherwise pick, and prints one table.
 //
-//     bench --quick --compare docs/benchmark.md
+//     bench --quick --compare docs/benchmark_table.md
 
 #include "bench.h"
 #include "processes.h"

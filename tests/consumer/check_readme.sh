@@ -33,10 +33,10 @@ if grep -E '_test\.cpp|document_road' "$work/build/compile_commands.json"; then
     echo "tests or examples are built for those who use us"
     exit 1
 fi
-for test in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`[A-Z][A-Za-z]+\.[A-Z][A-Za-z]+`' | tr -d '`'); do
+for test in $(sed -n '/^## Guarantees/,$p' "$root/README.md" | grep -oE '`[A-Z][A-Za-z]+\.[A-Z][A-Za-z]+`' | tr -d '`'); do
     grep -qE "^TEST(_F)?\(${test%.*}, ${test#*.}\)" "$root"/tests/*_test.cpp "$root"/tests/*/*_test.cpp || { echo "no such test: $test"; exit 1; }
 done
-for script in $(sed -n '/^## What holds/,/^What its/p' "$root/README.md" | grep -oE '`(scripts/[a-z]+|\.ci/run)' | tr -d '`'); do
+for script in $(sed -n '/^## Guarantees/,$p' "$root/README.md" | grep -oE '`(scripts/[a-z]+|\.ci/run)' | tr -d '`'); do
     [ -x "$root/$script" ] || { echo "no such script: $script"; exit 1; }
 done
 mkdir "$work/sources"
