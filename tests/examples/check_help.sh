@@ -1,0 +1,15 @@
+#!/bin/sh
+# Compares what `document_road --help` prints with the file that scripts/demo shows. Versions of CLI11 write defaults as
+# "=13" or " [13] ", and end with a blank line or not.
+#
+#     check_help.sh EXPECTED PROGRAM
+set -eu
+
+actual=$(mktemp)
+expected=$(mktemp)
+trap 'rm -f "$actual" "$expected"' EXIT
+alike() { sed -E 's/=([0-9]+)$/ [\1]/; s/ +$//; /^$/d'; }
+"$2" --help | alike > "$actual"
+alike < "$1" > "$expected"
+[ -s "$expected" ]
+diff "$expected" "$actual"
