@@ -1,6 +1,7 @@
 #include <Engine/Base/path.h>
 
 #include "support/allocations.h"
+#include "support/curves.h"
 #include "support/death.h"
 #include "support/print.h"
 #include "support/random.h"
@@ -301,15 +302,10 @@ TEST(PathShapes, ACircleIsAsFarOffAsDocumented) {
     for (std::size_t i = 1; i <= 4; ++i) {
         Points const& p = circle.elements[i].points;
         for (int step = 0; step <= 100000; ++step) {
-            double const t = step / 100000.0;
-            double const s = 1 - t;
-            auto const at = [&](double a, double b, double c, double d) {
-                return s * s * s * a + 3 * s * s * t * b + 3 * s * t * t * c + t * t * t * d;
-            };
-            double const x = at(from.x, p[0].x, p[1].x, p[2].x);
-            double const y = at(from.y, p[0].y, p[1].y, p[2].y);
-            outside = std::max(outside, std::hypot(x, y) - 1);
-            inside = std::max(inside, 1 - std::hypot(x, y));
+            FloatVec2 const point = tests::pointOfCurve(from, p, step / 100000.0);
+            double const distance = std::hypot(point.x, point.y);
+            outside = std::max(outside, distance - 1);
+            inside = std::max(inside, 1 - distance);
         }
         from = p[2];
     }

@@ -1,5 +1,6 @@
 #include <Engine/Base/svg_path.h>
 
+#include "support/curves.h"
 #include "support/locales.h"
 #include "support/print.h"
 #include "support/random.h"
@@ -290,13 +291,7 @@ TEST(PathFromSvgPathData, TurnsArcsIntoCurves) {
             ASSERT_EQ(path->elements[i].instruction, PathInstruction::curveTo);
             Points const& p = path->elements[i].points;
             for (int step = 0; step <= 100; ++step) {
-                double const t = step / 100.0;
-                double const s = 1 - t;
-                auto const at = [&](double a, double b, double c, double d) {
-                    return s * s * s * a + 3 * s * s * t * b + 3 * s * t * t * c + t * t * t * d;
-                };
-                double const x = at(from.x, p[0].x, p[1].x, p[2].x);
-                double const y = at(from.y, p[0].y, p[1].y, p[2].y);
+                auto const [x, y] = tests::pointOfCurve(from, p, step / 100.0);
                 EXPECT_LE(std::abs(std::hypot(x - row.centre.x, y - row.centre.y) - row.radius),
                           2.726e-4 * row.radius);
                 nearestToMiddle =
