@@ -488,6 +488,66 @@ async function checkOdd(browser) {
     await again.close();
 }
 
+// What the other checks do in one of the two ways: choices and buttons by keys, sliders and tabs by the pointer.
+async function checkBothWays(browser) {
+    const page = await openPage(browser, SIZES[0], {}, "#show=values");
+    const choose = async (id, key) => {
+        const before = await page.inputValue(`#${id}`);
+        await page.focus(`#${id}`);
+        await page.keyboard.press(key);
+        check((await page.inputValue(`#${id}`)) !== before, `${id} by the key ${key}`);
+    };
+    const slide = async (id) => {
+        const before = await page.inputValue(`#${id}`);
+        await page.locator(`#${id}`).scrollIntoViewIfNeeded();
+        const box = await page.locator(`#${id}`).boundingBox();
+        await page.mouse.click(box.x + box.width * 0.8, box.y + box.height / 2);
+        check((await page.inputValue(`#${id}`)) !== before, `${id} by the pointer`);
+    };
+    const copy = async (id) => {
+        await page.evaluate(() => (document.getElementById("said").textContent = ""));
+        await page.focus(`[data-copies=${id}]`);
+        await page.keyboard.press("Enter");
+        await page.waitForFunction(() => document.getElementById("said").textContent !== "");
+        check(true, `${id} is copied by the keyboard`);
+    };
+    await choose("port-type", "ArrowDown");
+    await copy("value-code");
+    await show(page, "curves");
+    await slide("curve-progress");
+    await copy("curve-code");
+    await show(page, "shapes");
+    await choose("shape-kind", "ArrowDown");
+    await choose("morph-kind", "ArrowDown");
+    await slide("morph-progress");
+    await page.focus("#morph-progress");
+    await choose("morph-progress", "Home");
+    for (const id of ["shape-svg", "shape-code"]) await copy(id);
+    await show(page, "documents");
+    await choose("sample", "ArrowDown");
+    check((await text(page, "document-name")) === "small", "a sample by the keyboard");
+    await choose("compare", "ArrowDown");
+    await page.waitForSelector("#changes");
+    await choose("input-patch", "ArrowDown");
+    for (const id of ["document-file", "compare-file"]) {
+        await page.focus(`#${id}`);
+        const [chooser] = await Promise.all([page.waitForEvent("filechooser", { timeout: 5000 }), page.keyboard.press("Space")]);
+        await chooser.setFiles(sample("animation"));
+    }
+    await page.waitForFunction(() => document.getElementById("compare").value === "file");
+    await page.focus("#save");
+    const [download] = await Promise.all([page.waitForEvent("download"), page.keyboard.press("Enter")]);
+    checkEqual(download.suggestedFilename(), "animation.json", "saved by the keyboard");
+    await page.locator("#inputs input[type=range]").first().evaluate((slider) => (slider.id = "an-input"));
+    await slide("an-input");
+    await page.focus("#undo");
+    await page.keyboard.press("Enter");
+    await page.focus("#redo");
+    await page.keyboard.press("Enter");
+    checkEqual(await page.getAttribute("#redo", "aria-disabled"), "true", "done again by the keyboard");
+    await page.close();
+}
+
 // A link shows what was set.
 async function checkLinks(browser) {
     const page = await openPage(browser, SIZES[0]);
@@ -590,6 +650,7 @@ try {
         await checkLooks(page, "playground-used", viewport, "light", FEWEST.curves);
         await page.close();
     }
+    await checkBothWays(browser);
     await checkOdd(browser);
     await checkLinks(browser);
     await checkLarge(browser);
