@@ -1,4 +1,4 @@
-// Engine/Base/assertion.h: the end of a program that broke a contract.
+// Engine/Base/assertion.h: reports a broken precondition and ends the program.
 //
 //     if (!hasValue()) assertionFailed("hasValue()", "value", "Engine/Base/optional", __LINE__);
 
@@ -11,8 +11,8 @@ namespace tarn::engine {
 
 /// Writes one line to standard error and calls `abort()`, in every build type:
 /// `Assertion failed: (<condition>), function <function>, file <module>, line <line>.`
-/// `module` is the header that says so, from the repository root, without its extension.
-/// Allocates nothing. The arguments are never null.
+/// `module` is the path of the header that declares the function, from the repository root, without
+/// its extension. Allocates nothing. The arguments must not be null.
 [[noreturn]] TARN_API void assertionFailed(char const* condition, char const* function,
                                            char const* module, int line) noexcept;
 

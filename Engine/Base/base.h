@@ -1,4 +1,4 @@
-// Engine/Base/base.h: everything but json.h, for those who want one include.
+// Engine/Base/base.h: includes every header of the base library except json.h.
 //
 //     #include <Engine/Base/base.h>
 //     using namespace tarn::engine;

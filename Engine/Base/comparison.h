@@ -1,4 +1,4 @@
-// Engine/Base/comparison.h: comparisons of doubles that no flag of a caller's compiler bends.
+// Engine/Base/comparison.h: comparisons of doubles that ignore the caller's compiler flags.
 //
 //     bool equal = detail::equalNumbers(0.0, -0.0);  // True; false for a NaN.
 
@@ -9,13 +9,13 @@
 
 namespace tarn::engine::detail {
 
-// `a == b` and `a < b`, compiled into the library, which knows of NaNs whatever its callers do.
+// `a == b` and `a < b`, compiled into the library, where NaNs always compare correctly.
 TARN_API bool equalNumbersInLibrary(double a, double b) noexcept;
 TARN_API bool lessNumberInLibrary(double a, double b) noexcept;
 
 #if defined(__FINITE_MATH_ONLY__) && __FINITE_MATH_ONLY__
-// The caller's compiler takes every number for finite: a comparison in place could call a NaN equal
-// or smaller. Constants are compared by the compiler itself, which does it right.
+// With `-ffinite-math-only` the compiler assumes that there are no NaNs, so an inline comparison
+// could call a NaN equal or smaller. Constant expressions are not affected.
 constexpr bool equalNumbers(double a, double b) noexcept {
     return __builtin_is_constant_evaluated() ? a == b : equalNumbersInLibrary(a, b);
 }

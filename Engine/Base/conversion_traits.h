@@ -1,4 +1,4 @@
-// Engine/Base/conversion_traits.h: which types values and data are made from and read as.
+// Engine/Base/conversion_traits.h: which types `Value` and `Unstructured` convert from and to.
 //
 //     static_assert(detail::isSignedInteger<short>);
 
@@ -23,7 +23,7 @@ constexpr bool isUnsignedInteger =
 template <class T>
 constexpr bool isInteger = isSignedInteger<T> || isUnsignedInteger<T>;
 
-// Every integer type but the two that data has.
+// Every integer type except the two that an `Unstructured` stores.
 template <class T>
 constexpr bool isOtherInteger = isInteger<T> && !isOneOf<T, long long, unsigned long long>;
 
@@ -31,16 +31,16 @@ template <class T>
 constexpr bool isCharacter = std::is_integral_v<T> && !isSignedInteger<T> &&
                              !isUnsignedInteger<T> && !std::is_same_v<T, bool>;
 
-// The other spelling of a 64-bit integer: `long` where `std::int64_t` is one, for example.
+// The other type of a 64-bit integer: `long` where it has 64 bits, as `std::int64_t` on Linux.
 template <class T>
 constexpr bool isWideInteger = isOneOf<T, long, unsigned long> && sizeof(long) == sizeof(long long);
 
-// What a `Value` refuses to be read as, since it would convert to `bool` and be promoted.
+// Types that a `Value` must not convert to: the result would be a promoted `bool`.
 template <class T>
 constexpr bool isNarrowNumber = std::is_arithmetic_v<T> && !isWideInteger<T> &&
                                 !isOneOf<T, bool, double, long long, unsigned long long>;
 
-// An object that becomes a pointer, as a lambda without captures becomes one to a function.
+// Class types with a conversion to a pointer, such as a lambda without captures.
 template <class T, class = void>
 constexpr bool becomesPointer = false;
 template <class T>
@@ -49,18 +49,19 @@ constexpr bool
                                        std::is_pointer_v<decltype(+std::declval<T const&>())>>> =
         true;
 
-// What a `Value` refuses to be made from, since it would convert to `bool` and be stored as that.
+// Types that a `Value` must not be constructed from: they would be stored as a `bool`.
 template <class T>
 constexpr bool isNoValueSource =
     isUnsignedInteger<T> || isCharacter<T> || std::is_same_v<T, long double> ||
     std::is_member_pointer_v<T> ||
     (std::is_pointer_v<T> && !isOneOf<T, char*, char const*>) || becomesPointer<T>;
 
-// What data refuses to be made from, since it would be a number.
+// Types that an `Unstructured` must not be constructed from: they would be stored as a number.
 template <class T>
 constexpr bool isNoDataSource = std::is_same_v<T, bool> || isCharacter<T>;
 
-// The type of a template's first parameter keeps calls such as `ease<double>(...)` out of it.
+// As the type of the first template parameter, this rejects explicit arguments:
+// `ease<double>(...)`.
 enum class AllDeduced { Yes };
 
 }  // namespace tarn::engine::detail

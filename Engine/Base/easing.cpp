@@ -18,7 +18,7 @@ constexpr std::array<char const*, 13> kNames{
     "Sinusoidal In", "Sinusoidal Out", "Sinusoidal In-Out"};
 static_assert(kNames.size() == std::size_t(EasingFunction::SinusoidalInOut) + 1);
 
-// 2^-10 is where the exponential curves would start; the rest rescales them to start at 0.
+// The unscaled exponential curve starts at 2^-10; the other constants rescale it to start at 0.
 constexpr double kExponentialOffset = 0.0009765625;       // 2^-10
 constexpr double kExponentialRange = 0.9990234375;        // 1 - 2^-10
 constexpr double kExponentialScale = 1.0009775171065494;  // 1024 / 1023
@@ -28,31 +28,31 @@ constexpr double kPi = 3.141592653589793;
 
 double cube(double x) { return std::pow(x, 3.0); }
 
-// The rising half of the exponential curve, as a factor, and the falling one's power.
+// The rising half of the exponential curve as a factor, and the exponent of the falling half.
 double exponentialIn(double t) {
     return (std::exp2((t - 1.0) * kExponent) - kExponentialOffset) / kExponentialRange;
 }
 double exponentialOut(double t) { return 1.0 - std::exp2(t * -kExponent); }
 
-// What the other curves take the way times: the falling half of the quadratic one, and those of
-// the sinusoidal ones but for the sign.
+// Factors of the remaining curves: the falling half of the quadratic one, and the sinusoidal ones
+// without the sign.
 double quadraticFalling(double v) { return (v - 2.0) * v - 1.0; }
 double sinusoidalIn(double t) { return std::cos(t * kHalfPi); }
 double sinusoidalInOut(double t) { return std::cos(t * kPi) - 1.0; }
 
-// That part of the way.
+// The factor times the distance.
 auto part(double factor) {
     return [=](double a, double delta) { return a + factor * delta; };
 }
 
-// b - a in 64 bits, wrapping around.
+// b - a, modulo 2^64.
 long long difference(long long b, long long a) {
     return static_cast<long long>(static_cast<unsigned long long>(b) -
                                   static_cast<unsigned long long>(a));
 }
 
-// What a curve gives for each component: `formula(a, delta)`, with `a` the start and `delta` the
-// way to the end. Whatever depends on progress alone is computed before, once for all components.
+// Evaluates `formula(a, delta)` for each component, with `a` the start and `delta` the distance to
+// the end. What depends on progress alone is computed only once for all components.
 template <class Formula>
 double eachComponent(double from, double to, Formula const& formula) {
     return formula(from, to - from);
@@ -109,7 +109,7 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
             return eachComponent(
                 from, to, [=](double a, double delta) { return a - (t - 2.0) * (delta * t); });
         case EasingFunction::QuadraticInOut: {
-            // Both halves are computed, so that many of them can be at once.
+            // Computes both halves without a branch, so that the compiler can vectorise.
             double const v = u - 1.0;
             double const rising = u * u;
             double const falling = quadraticFalling(v);
@@ -150,16 +150,16 @@ T easeAlong(EasingFunction function, T const& from, T const& to, double t) {
                 from, to, [=](double a, double delta) { return a + factor * (delta * -0.5); });
         }
     }
-    return from;  // An enumerator out of range: stay at the start.
+    return from;  // An undefined enumerator stays at the start.
 }
 
-// One curve, known when this is compiled.
+// One curve, selected at compile time.
 template <EasingFunction function, class T>
 TARN_FLATTEN void easeEachAlong(T const& from, T const& to, double const* progress,
                                 std::size_t count, T* results) {
     std::size_t i = 0;
     if constexpr (std::is_same_v<T, double>) {
-        // Blocks of a size that is known, in memory of their own, are computed several at once.
+        // Blocks of a constant size in local memory are vectorised.
         constexpr std::size_t kBlock = 32;
         for (; count - i >= kBlock; i += kBlock) {
             double block[kBlock];
@@ -193,7 +193,7 @@ void easeEachAlong(EasingFunction function, T const& from, T const& to, double c
         case EF::SinusoidalOut: return along(Curve<EF::SinusoidalOut>());
         case EF::SinusoidalInOut: return along(Curve<EF::SinusoidalInOut>());
     }
-    std::fill(results, results + count, from);  // An enumerator out of range.
+    std::fill(results, results + count, from);  // An undefined enumerator stays at the start.
 }
 
 }  // namespace
@@ -232,8 +232,8 @@ TARN_FLATTEN FloatVec4 ease(EasingFunction function, FloatVec4 from, FloatVec4 t
     return easeAlong(function, from, to, t);
 }
 
-// Where the other forms negate the difference, this one takes it the other way round: that is
-// not the same where it wraps around.
+// The other overloads negate the difference. Here it is computed in the other order, which differs
+// where it wraps around.
 template <>
 TARN_FLATTEN long long ease(EasingFunction function, long long from, long long to, double t) {
     double const a = static_cast<double>(from);

@@ -1,4 +1,4 @@
-// Engine/Base/easing.h: curves between two numbers, vectors or values.
+// Engine/Base/easing.h: easing curves between two numbers, vectors or values.
 //
 //     double y = ease(EasingFunction::CubicOut, 0.0, 100.0, 0.5);  // 87.5
 
@@ -18,7 +18,7 @@
 
 namespace tarn::engine {
 
-/// The curves. The numbers are stored in documents.
+/// The curves. Documents store the numbers.
 enum class EasingFunction : std::int32_t {
     Linear = 0,
     QuadraticIn = 1,
@@ -35,25 +35,27 @@ enum class EasingFunction : std::int32_t {
     SinusoidalInOut = 12,
 };
 
-/// The names that an editor shows, "Linear" to "Sinusoidal In-Out", at their enumerator's
-/// position. A new list at every call.
+/// The names that an editor shows, "Linear" to "Sinusoidal In-Out", indexed by enumerator. Returns
+/// a new list at every call.
 TARN_API std::vector<std::string> easingFunctionNames();
 
-/// The curve of that name, byte by byte; empty for any other string.
+/// The inverse: the curve with this name, compared byte by byte. Empty for any other string.
 TARN_API Optional<EasingFunction> stringToEasingFunction(std::string const& name);
 
-/// Writes the name that an editor shows; "EasingFunction(77)" for what is no enumerator.
+/// Writes the name that an editor shows, or "EasingFunction(77)" for an undefined enumerator.
 TARN_API std::ostream& operator<<(std::ostream& stream, EasingFunction function);
 
-/// The point of the curve from `from` to `to` at `t`, for `double`, `long long`, `FloatVec2`,
-/// `FloatVec3` and `FloatVec4`; other types do not compile.
+/// The point of the curve from `from` to `to` at `t`. `T` is `double`, `long long`, `FloatVec2`,
+/// `FloatVec3` or `FloatVec4`; other types do not compile.
 ///
-/// `t` is progress: 0 at `from`, 1 at `to`. Not clamped, so 1.5 overshoots. The exponential curves
-/// are rescaled to meet their ends, and give the flat one exactly: in the start at 0, out the end
-/// at 1, in-out both. A NaN gives NaN. An enumerator out of range gives `from`.
+/// `t` is the progress: 0 at `from`, 1 at `to`. It is not clamped, so 1.5 overshoots. The
+/// exponential curves are rescaled to pass through both ends. Their flat ends are exact: the in
+/// curve at 0, the out curve at 1, the in-out curve at both. A NaN gives a NaN. An undefined
+/// enumerator gives `from`.
 ///
-/// Vectors are eased component by component. Integers are eased in double precision, cut towards
-/// zero and kept in range (a NaN is 0); their difference wraps around modulo 2^64.
+/// Vectors are eased component by component. Integers are eased in double precision, truncated
+/// towards zero and clamped to the range of `long long` (a NaN is 0); their difference wraps around
+/// modulo 2^64.
 template <class T>
 T ease(EasingFunction function, T from, T to, double t) = delete;
 template <>
@@ -67,10 +69,10 @@ TARN_API FloatVec3 ease<FloatVec3>(EasingFunction, FloatVec3, FloatVec3, double)
 template <>
 TARN_API FloatVec4 ease<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double);
 
-/// The points of one curve at many places: `results[i]` becomes `ease(function, from, to,
-/// progress[i])`, bit for bit, for each `i` below `count`. `results` may be `progress`; otherwise
-/// the two do not overlap. Allocates nothing. Numbers along the linear and the quadratic curves
-/// take a fraction of the time of single calls; for all others the call itself is saved.
+/// Evaluates one curve at many points: for each `i` below `count`, `results[i]` becomes
+/// `ease(function, from, to, progress[i])`, bit for bit. `results` may be `progress`; otherwise the
+/// two must not overlap. Allocates nothing. For numbers, the linear and the quadratic curves take a
+/// fraction of the time of single calls; all other curves save the call itself.
 template <class T>
 void easeEach(EasingFunction function, T from, T to, double const* progress, std::size_t count,
               T* results) = delete;
@@ -89,13 +91,13 @@ template <>
 TARN_API void easeEach<FloatVec4>(EasingFunction, FloatVec4, FloatVec4, double const*, std::size_t,
                                   FloatVec4*);
 
-/// Two ends of different types: make them one, or one of them a `Value`.
+/// Deleted: the two ends have different types. Convert one of them, or pass `Value`s.
 template <detail::AllDeduced = detail::AllDeduced::Yes, class From, class To,
           std::enable_if_t<!std::is_same_v<From, To> && !detail::isOneOf<Value, From, To>, int> = 0>
 void ease(EasingFunction function, From from, To to, double t) = delete;
 
-/// `EasingFunction::ExponentialInOut`, by itself, for the same types: the in curve up to the
-/// midpoint (for integers cut towards zero) and the out curve from there.
+/// `EasingFunction::ExponentialInOut` as a function, for the same types: the in curve up to the
+/// midpoint (truncated towards zero for integers) and the out curve from there.
 template <class T>
 T easeExponentialInOut(T from, T to, double t) = delete;
 template <>
@@ -109,8 +111,8 @@ TARN_API FloatVec3 easeExponentialInOut<FloatVec3>(FloatVec3, FloatVec3, double)
 template <>
 TARN_API FloatVec4 easeExponentialInOut<FloatVec4>(FloatVec4, FloatVec4, double);
 
-/// The same between values. The type of `to` decides: both ends are read as that type, and so is
-/// the result. Only numbers and vectors are eased; for every other type the result is 0.0.
+/// The same for values. The type of `to` decides: both ends are converted to it, and the result has
+/// it. Only numbers and vectors are eased; every other type gives 0.0.
 TARN_API Value ease(EasingFunction function, Value from, Value to, double t);
 
 }  // namespace tarn::engine

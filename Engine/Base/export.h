@@ -1,20 +1,19 @@
-// Engine/Base/export.h: the marks of functions: what the library shows to its callers, and how it
-// is compiled.
+// Engine/Base/export.h: macros that export functions and control how they are compiled.
 //
 //     TARN_API std::string typeToString(Type type);
 
 #ifndef TARN_ENGINE_BASE_EXPORT_H
 #define TARN_ENGINE_BASE_EXPORT_H
 
-/// `TARN_API` is put before every public function and every public member function that is compiled
-/// into the library. Everything without it stays inside.
+/// `TARN_API` exports a public function or member function that is compiled into the library.
+/// Everything without it has hidden visibility.
 ///
-/// `TARN_API_INLINE` is the same for public functions that headers define, so that callers compile
-/// them in place: the shared library has each of them too, for those who find functions by name.
+/// `TARN_API_INLINE` is for public functions that headers define: callers inline them, and the
+/// shared library exports each of them too, for debuggers and foreign-function interfaces.
 ///
-/// `TARN_ENGINE_BASE_BUILDING` is defined by the library's own build and by nobody else,
-/// `TARN_ENGINE_BASE_STATIC` by that of a static library and by everyone who links it. The CMake
-/// target and the pkg-config file do that.
+/// `TARN_ENGINE_BASE_BUILDING` is defined only while the library itself is built.
+/// `TARN_ENGINE_BASE_STATIC` is defined while a static library is built and by everyone who links
+/// it. The CMake target and the pkg-config file define them.
 #if defined(TARN_ENGINE_BASE_STATIC)
 #define TARN_API
 #define TARN_API_INLINE
@@ -35,10 +34,10 @@
 #define TARN_API_INLINE
 #endif
 
-/// `TARN_FLATTEN` has everything that a function calls compiled into it. What reads a union in
-/// several steps is a switch over its alternatives in each of them, until the compiler sees all of
-/// the steps at once. `TARN_LIKELY` is a condition that mostly holds. Both are nothing to compilers
-/// that have no such mark, and the first where code has to be small.
+/// `TARN_FLATTEN` inlines everything that a function calls: a `boost::variant` that is read in
+/// several steps is a switch in each step until the compiler sees all of them at once.
+/// `TARN_LIKELY` marks a condition that is usually true. Both expand to nothing for compilers
+/// without such attributes; `TARN_FLATTEN` also where code is optimised for size.
 #if defined(__GNUC__) && !defined(__OPTIMIZE_SIZE__)
 #define TARN_FLATTEN __attribute__((flatten))
 #else

@@ -1,4 +1,4 @@
-// Engine/Base/fwd.h: the names alone, for those who only pass things on.
+// Engine/Base/fwd.h: forward declarations of all public types.
 //
 //     #include <Engine/Base/fwd.h>
 //     void draw(tarn::engine::Path const& path);

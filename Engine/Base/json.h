@@ -1,4 +1,4 @@
-// Engine/Base/json.h: JSON and `Unstructured`, either way. Needs nlohmann-json 3.
+// Engine/Base/json.h: converts between nlohmann-json 3 and `Unstructured`.
 //
 //     Unstructured data = fromJson(nlohmann::json::parse(R"({"tags": ["intro", true]})"));
 //     std::string text = toJson(data).dump();  // {"tags":["intro",1]}
@@ -17,28 +17,27 @@
 
 namespace tarn::engine {
 
-/// What the document says: an object is a map, an array an array, a string its bytes. A bool is the
-/// integer 1 or 0. An integer is signed where it fits into 64 bits so, else unsigned; a number with
-/// a fraction or an exponent is a floating-point one. Binary values, which no JSON text has, are
-/// null.
+/// Converts a JSON document: an object becomes a map, an array an array, a string its bytes. A bool
+/// becomes the integer 1 or 0. An integer is signed where it fits into 64 bits, else unsigned. A
+/// number with a fraction or an exponent is a double. Binary values, which only nlohmann-json has,
+/// become null.
 ///
-/// Linear. Documents of any depth: nothing here recurses. Throws where memory fails, and nothing
-/// else.
+/// Linear. Not recursive: documents of any depth are safe. Throws only `std::bad_alloc`.
 inline Unstructured fromJson(nlohmann::json const& json);
 
-/// The same way back; an unsigned integer stays one. JSON has no NaN and no infinity: `dump` writes
-/// them as null. Strings of data are any bytes: `dump` throws at those that are not UTF-8, unless
-/// it is told otherwise (`nlohmann::json::error_handler_t::replace`).
+/// The inverse; an unsigned integer stays unsigned. JSON has no NaN and no infinity: `dump` writes
+/// them as null. Strings may hold any bytes: `dump` throws for those that are not UTF-8, unless it
+/// is given another `nlohmann::json::error_handler_t`, such as `replace`.
 ///
-/// Linear, and nothing here recurses; `dump` does, and a document is destroyed as nlohmann-json
-/// destroys it. Throws where memory fails, and nothing else.
+/// Linear, and not recursive itself; `dump` is recursive, and nlohmann-json destroys the document.
+/// Throws only `std::bad_alloc`.
 inline nlohmann::json toJson(Unstructured const& data);
 
 // Implementation
 
 namespace detail {
 
-// Whatever has no parts.
+// For values that are neither objects nor arrays.
 inline Unstructured leafFromJson(nlohmann::json const& json) {
     using Kind = nlohmann::json::value_t;
     switch (json.type()) {
@@ -78,7 +77,7 @@ inline nlohmann::json leafToJson(Unstructured const& data) {
 }  // namespace detail
 
 inline Unstructured fromJson(nlohmann::json const& json) {
-    // An object or an array with those of its elements that are done.
+    // An open object or array with its finished elements.
     struct Level {
         nlohmann::json const* json;
         nlohmann::json::const_iterator next;
@@ -119,7 +118,7 @@ inline Unstructured fromJson(nlohmann::json const& json) {
 
 inline nlohmann::json toJson(Unstructured const& data) {
     nlohmann::json result;
-    // Maps and arrays, and where they go.
+    // Maps and arrays that are still to be converted, and their targets.
     std::vector<std::pair<Unstructured const*, nlohmann::json*>> pending;
     auto const place = [&pending](Unstructured const& from, nlohmann::json& to) {
         if (from.isMap() || from.isArray()) {

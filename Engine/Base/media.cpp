@@ -19,7 +19,7 @@ struct Extension {
     Kind kind;
 };
 
-// In the order in which a text is compared; the first of a kind is the one that is written.
+// In the order of comparison. The first extension of a format is the one that is returned.
 constexpr std::array<Extension<ImageFormat>, 3> kImageExtensions{{
     {"jpg", ImageFormat::JPEG},
     {"jpeg", ImageFormat::JPEG},

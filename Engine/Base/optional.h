@@ -1,4 +1,4 @@
-// Engine/Base/optional.h: a value that may be absent, and whose absence is never read by mistake.
+// Engine/Base/optional.h: a value that may be absent; reading an absent one always aborts.
 //
 //     Optional<Type> type = stringToType("vec2");
 //     if (type) { use(*type); }
@@ -14,10 +14,9 @@
 
 namespace tarn::engine {
 
-/// A flag and, when it is set, a `T`. Stored in place: no allocation beyond the `T`'s own.
-/// Reading an empty one is an assertion failure (function `value`, condition `hasValue()`) in
-/// every build; nothing here throws but what a `T` throws when it is made, copied, moved or
-/// compared.
+/// A flag and, where it is set, a `T`. Stored in place: no allocation beyond the `T`'s own. Reading
+/// an empty one is an assertion failure (function `value`, condition `hasValue()`) in every build
+/// type. Throws only what the `T`'s own operations throw.
 template <class T>
 class Optional {
 public:
@@ -25,14 +24,13 @@ public:
     Optional() = default;
     Optional(std::nullopt_t) noexcept {}
 
-    /// Made from a `T` and from nothing that merely converts to one: an optional bound is
-    /// written `Value(0.0)`, so that the alternative it holds is seen where it is chosen.
+    /// Only from a `T`, not from types that convert to it: an optional bound is written
+    /// `Value(0.0)`, so that its type is visible where it is chosen.
     template <class U, std::enable_if_t<std::is_same_v<std::decay_t<U>, T>, int> = 0>
     Optional(U&& value) : storage(std::forward<U>(value)) {}
 
-    /// From the standard's optional of the same `T`, and back on request. (Not for a `bool`: there
-    /// the standard's optional takes the answer of `hasValue()` for the value. Write `o ?
-    /// std::optional<bool>(*o) : std::nullopt`.)
+    /// From `std::optional<T>`, and explicitly back to it. (Not for `bool`: `std::optional<bool>`
+    /// would take `hasValue()` for the value. Write `o ? std::optional<bool>(*o) : std::nullopt`.)
     template <class U, std::enable_if_t<std::is_same_v<U, std::optional<T>>, int> = 0>
     Optional(U other) : storage(std::move(other)) {}
     explicit operator std::optional<T>() const& { return storage; }
@@ -43,7 +41,7 @@ public:
     bool has_value() const noexcept { return hasValue(); }
     explicit operator bool() const noexcept { return hasValue(); }
 
-    /// The value. Of an empty one it is an assertion failure.
+    /// The value. An assertion failure where there is none.
     T& value() & {
         check();
         return *storage;
@@ -57,7 +55,7 @@ public:
         return *std::move(storage);
     }
 
-    /// As `value()`.
+    /// Same as `value()`.
     T& operator*() & { return value(); }
     T const& operator*() const& { return value(); }
     T&& operator*() && { return std::move(*this).value(); }
@@ -70,25 +68,26 @@ public:
     T value_or(T other) const& { return hasValue() ? *storage : std::move(other); }
     T value_or(T other) && { return hasValue() ? *std::move(storage) : std::move(other); }
 
-    /// Afterwards the value is `T(arguments...)`, made in place. Empty where making it throws.
+    /// Constructs `T(arguments...)` in place. Empty where the constructor throws.
     template <class... Arguments>
     T& emplace(Arguments&&... arguments) {
         return storage.emplace(std::forward<Arguments>(arguments)...);
     }
-    /// Afterwards the optional is empty.
+    /// Makes the optional empty.
     void reset() noexcept { storage.reset(); }
-    /// Afterwards each has what the other had. Throws where moving a `T` does.
+    /// Swaps the values. Throws only what moving a `T` throws.
     void swap(Optional& other) noexcept(std::is_nothrow_swappable_v<std::optional<T>>) {
         storage.swap(other.storage);
     }
     friend void swap(Optional& a, Optional& b) noexcept(noexcept(a.swap(b))) { a.swap(b); }
 
-    /// Equal when both are empty, or when both are set to equal values.
+    /// Equal when both are empty, or when both have equal values.
     friend bool operator==(Optional const& a, Optional const& b) {
         return a.hasValue() == b.hasValue() && (!a.hasValue() || *a.storage == *b.storage);
     }
     friend bool operator!=(Optional const& a, Optional const& b) { return !(a == b); }
-    /// With a `T`, and nothing that merely converts to one: equal when there is a value, and it is.
+    /// Compares with a `T`, not with types that convert to it: equal when there is a value, and it
+    /// is equal.
     template <class U, std::enable_if_t<std::is_same_v<U, T>, int> = 0>
     friend bool operator==(Optional const& a, U const& b) {
         return a.hasValue() && *a.storage == b;

@@ -23,25 +23,25 @@ bool listsEqual(List const& a, List const& b, char const* condition) {
     return a == b || elementsOf(a, condition) == elementsOf(b, condition);
 }
 
-// The list, once it is known not to be null. (Conversions recurse: this one is done before they go
-// on.)
+// The list, checked for null. (The check is a function of its own, to keep the stack frames of
+// recursive conversions small.)
 template <class T>
 Array<T> const& requireList(Array<T> const& list, char const* condition) {
     static_cast<void>(elementsOf(list, condition));
     return list;
 }
 
-// One for each type of element, without an owner.
+// One for each type of element, without a reference count.
 template <class T>
 Array<T> emptyList() noexcept {
     static detail::Immortal<std::vector<T>> const list;
     return Array<T>(std::shared_ptr<void>(), &list.value);
 }
 
-// Walks wait for memory: the list of a child that is a few places ahead is asked for early.
+// Searches are limited by memory latency, so the list of a later child is prefetched.
 constexpr std::size_t kAhead = 6;
 
-// Below a patch that is not the one itself.
+// Searches below the patch, not the patch itself.
 template <class AnyPatch>
 AnyPatch const* findBelow(AnyPatch const& root, unsigned long long id) {
     auto const& children = elementsOf(root.children, kChildren);
@@ -62,7 +62,7 @@ AnyPatch const* findPatch(AnyPatch const& root, unsigned long long id) {
     return root.id == id ? &root : findBelow(root, id);
 }
 
-// The first element of the list whose `field` is `wanted`.
+// The first element of the list whose `field` equals `wanted`.
 template <class Element>
 Element const* findByField(std::vector<Element> const& list, unsigned long long Element::*field,
                            unsigned long long wanted) {
@@ -72,7 +72,7 @@ Element const* findByField(std::vector<Element> const& list, unsigned long long 
     return nullptr;
 }
 
-// The port among those that `ports` names, of the patch, then of its children.
+// Finds the port in the list `ports` of the patch, then of its children.
 EvalPort const* findPort(EvalPatch const& patch, MutableArray<EvalPort> EvalPatch::*ports,
                          char const* condition, unsigned long long portId) {
     auto const among = [&](EvalPatch const& owner) {
@@ -95,7 +95,7 @@ std::unordered_set<Connection> connectionsByField(Patch const& patch,
     return found;
 }
 
-// The first patch of the subtree, depth first, with a child that has the port among its outputs.
+// The first patch of the subtree, depth first, with a child that has the port as an output.
 Patch const* parentOfOutput(Patch const& root, unsigned long long portId) {
     std::vector<Patch> const& children = elementsOf(root.children, kChildren);
     for (std::size_t i = 0; i < children.size(); ++i) {

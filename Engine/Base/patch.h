@@ -1,4 +1,4 @@
-// Engine/Base/patch.h: the graph of patches, its evaluation form, its queries and its debug output.
+// Engine/Base/patch.h: the node graph, its evaluation form, queries and debug output.
 //
 //     Patch const* patch = findPatchRecursive(root, 7);
 //     for (Connection const& c : findOutgoingConnectionsFromPort(root, portId)) { follow(c); }
@@ -26,14 +26,14 @@
 
 namespace tarn::engine {
 
-/// A list that records share: copying a record copies the pointer. Never null in a record, except
-/// in one that was moved from, which is only to be assigned to or destroyed. Where a list is null
-/// all the same (`{}` in braces makes one), whoever reads it first ends the program with an
+/// A shared, immutable list: copying a record copies the pointer. Never null in a record, except in
+/// a moved-from record, which may only be assigned to or destroyed. Where a list is null all the
+/// same (`{}` in a braced initialiser makes one), the first function that reads it aborts with an
 /// assertion failure that names it, such as `children != nullptr`.
 template <class T>
 using Array = std::shared_ptr<std::vector<T> const>;
 
-/// The same with elements that change in place, for everyone who shares it.
+/// A shared list whose elements can be changed in place, for everyone who shares it.
 template <class T>
 using MutableArray = std::shared_ptr<std::vector<T>>;
 
@@ -43,8 +43,8 @@ struct Patch;
 
 namespace detail {
 
-// The empty lists that all new records share. They are never counted and never destroyed, so that
-// threads do not contend for them: `use_count()` is 0.
+// The empty lists that all new records share. They have no reference count and are never destroyed,
+// so threads do not contend for them: `use_count()` is 0.
 TARN_API Array<Port> emptyPorts() noexcept;
 TARN_API Array<Connection> emptyConnections() noexcept;
 TARN_API Array<Patch> emptyPatches() noexcept;
@@ -68,7 +68,7 @@ inline Array<Patch> emptyArray() {
 
 [[noreturn]] TARN_API void listIsNull(char const* condition) noexcept;
 
-// What a list has. A null list is an assertion failure with the condition, which names it.
+// The elements of a list. A null list is an assertion failure, whose condition names the list.
 template <class Pointer>
 typename Pointer::element_type& elementsOf(Pointer const& list, char const* condition) {
     if (!list) listIsNull(condition);
@@ -77,8 +77,8 @@ typename Pointer::element_type& elementsOf(Pointer const& list, char const* cond
 
 }  // namespace detail
 
-/// A list of these elements. One allocation, and what the elements take. Empty lists of ports,
-/// connections and patches are the ones that new records share: they take none.
+/// A list of these elements, in one allocation. Empty lists of ports, connections and patches
+/// allocate nothing: they are the lists that new records share.
 template <class T>
 Array<T> arrayOf(std::vector<T> elements) {
     if (elements.empty()) return detail::emptyArray<T>();
@@ -93,7 +93,7 @@ Array<T> arrayOf(std::initializer_list<T> elements) {
 struct Port {
     /// Unique among all ports of a document.
     unsigned long long id = 0;
-    /// Finds the port among those of its own patch.
+    /// Identifies the port among those of its patch.
     unsigned long long tag = 0;
     std::string name = {};
     TypeInfo typeInfo = {};
@@ -105,24 +105,24 @@ struct Port {
     TARN_API bool operator!=(Port const& other) const;
 };
 
-/// From an output port to an input port. Held by the patch whose children both ends are.
+/// From an output port to an input port. Stored in the parent of the patches that it connects.
 struct Connection {
-    /// The identifiers of both ends; each port by itself is unique in the document.
+    /// The identifiers of both ends. A port's identifier alone is unique in the document.
     unsigned long long fromPatchId = 0;
     unsigned long long fromPortId = 0;
     unsigned long long toPatchId = 0;
     unsigned long long toPortId = 0;
 
-    /// All four identifiers.
+    /// Compares all four identifiers.
     TARN_API bool operator==(Connection const& other) const;
     TARN_API bool operator!=(Connection const& other) const;
 };
 
 }  // namespace tarn::engine
 
-/// The four fields in their order, each combined as
-/// `seed ^= v + 0x9e3779b9 + (seed << 6) + (seed >> 2)` in 64 bits. The same on every platform;
-/// where `std::size_t` has 32 bits, its lower half.
+/// Combines the four fields in their order with `seed ^= v + 0x9e3779b9 + (seed << 6) + (seed >>
+/// 2)` in 64 bits. The result is the same on every platform; where `std::size_t` has 32 bits, it is
+/// the lower half.
 template <>
 struct std::hash<tarn::engine::Connection> {
     TARN_API std::size_t operator()(tarn::engine::Connection const& connection) const noexcept;
@@ -130,58 +130,58 @@ struct std::hash<tarn::engine::Connection> {
 
 namespace tarn::engine {
 
-/// A node of the graph: its ports, its children and the connections between the children's ports.
-/// Copies share the lists. 8 MiB of stack are enough for 10,000 levels of everything here, queries
-/// and debug output included.
+/// A node of the graph: its ports, its child patches and the connections between the children's
+/// ports. Copies share the lists. All operations, queries and debug output included, are recursive:
+/// 8 MiB of stack are enough for 10,000 levels.
 struct Patch {
-    /// Never 0 in a document: that means no patch.
+    /// Never 0 in a document: 0 means no patch.
     unsigned long long id = 0;
-    /// The number of the built-in kind; the evaluator owns the table.
+    /// The number of the built-in kind. The evaluator defines the kinds.
     unsigned long long builtin = 0;
-    /// A second string; compared, but neither printed nor evaluated.
+    /// A second name; compared, but neither printed nor part of the evaluation form.
     std::string descriptor = {};
     ModelLayer modelLayer = {};
     std::string name = {};
     Array<Port> inputs = detail::emptyPorts();
     Array<Port> outputs = detail::emptyPorts();
-    /// "inputCount" and "outputCount" are the configured numbers of ports.
+    /// The keys "inputCount" and "outputCount" configure the numbers of ports.
     std::map<std::string, Unstructured> attributes = {};
     Array<Connection> connections = detail::emptyConnections();
     Array<Patch> children = detail::emptyPatches();
 
-    /// Deep and in order. Lists that are one object are equal without a look at them.
+    /// Compares deeply and in order. Lists that are the same object are equal without a comparison.
     TARN_API bool operator==(Patch const& other) const;
     TARN_API bool operator!=(Patch const& other) const;
 };
 static_assert(std::is_nothrow_move_constructible_v<Port>, "lists of ports move when they grow");
 static_assert(std::is_nothrow_move_constructible_v<Patch>, "lists of patches move when they grow");
 
-/// A port as the evaluator keeps it: with a list of the values that it has now.
+/// A port in the evaluation form: it holds a list of its current values.
 struct EvalPort {
-    /// Those of the port.
+    /// Copied from the port.
     unsigned long long id = 0;
     unsigned long long tag = 0;
-    /// The evaluator's own; zero and false at first, and not looked at here.
+    /// For the evaluator: zero and false at first, and never read by this library.
     unsigned long long evaluatorState = 0;
     bool evaluatorFlag = false;
     TypeInfo typeInfo;
-    /// At first one element, the port's default value.
+    /// At first one element: the port's default value.
     std::vector<Value> values;
     std::string name;
 
-    /// Without values, or with the default value of `port` as the one that it has.
+    /// Without values; or with the default value of `port` as the only value.
     TARN_API EvalPort();
     TARN_API explicit EvalPort(Port const& port);
 
-    /// Field by field, the evaluator's own included.
+    /// Compares every field, the evaluator's included.
     TARN_API bool operator==(EvalPort const& other) const;
     TARN_API bool operator!=(EvalPort const& other) const;
 };
 
-/// A patch as the evaluator keeps it. Copies share the lists; two conversions do not. 8 MiB of
-/// stack are enough for 10,000 levels of everything here.
+/// A patch in the evaluation form. Copies share the lists; each conversion makes new ones. All
+/// operations are recursive: 8 MiB of stack are enough for 10,000 levels.
 struct EvalPatch {
-    /// Those of the patch.
+    /// Copied from the patch.
     unsigned long long id = 0;
     unsigned long long builtin = 0;
     MutableArray<EvalPort> inputs = std::make_shared<std::vector<EvalPort>>();
@@ -189,86 +189,90 @@ struct EvalPatch {
     std::string name;
     MutableArray<EvalPatch> children = std::make_shared<std::vector<EvalPatch>>();
     ModelLayer modelLayer;
-    /// Whether the patch's attributes have the keys "inputCount" and "outputCount", of any value.
+    /// Whether the patch's attributes contain the keys "inputCount" and "outputCount", with any
+    /// value.
     bool hasInputCount = false;
     bool hasOutputCount = false;
 
     TARN_API EvalPatch();
-    /// Converts the whole subtree. Linear in its size; each list is allocated once.
+    /// Converts the whole subtree. Linear in its size; allocates each list once.
     TARN_API explicit EvalPatch(Patch const& patch);
 
-    /// Deep and in order. Lists that are one object are equal without a look at them.
+    /// Compares deeply and in order. Lists that are the same object are equal without a comparison.
     TARN_API bool operator==(EvalPatch const& other) const;
     TARN_API bool operator!=(EvalPatch const& other) const;
 };
 static_assert(std::is_nothrow_move_constructible_v<EvalPort>, "lists of ports move");
 static_assert(std::is_nothrow_move_constructible_v<EvalPatch>, "lists of patches move");
 
-/// The constructors, to be passed to `map`.
+/// The converting constructors as functions, to pass to `map`.
 TARN_API EvalPort toEvalPort(Port const& port);
 TARN_API EvalPatch toEvalPatch(Patch const& patch);
 
-/// A new list of what `std::invoke(function, element)` gives for each element, in order; allocated
-/// once. Never null: `map(&Port::id, list)` is a list of identifiers.
+/// A new list with the result of `std::invoke(function, element)` for each element, in order; one
+/// allocation. Never null. `map(&Port::id, list)` is a list of identifiers.
 template <class Function, class T>
 MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
                                                                           Array<T> const& list);
 
-// Queries. None fails. All are linear in what they search, and allocate for their sets alone.
+// Queries. They never fail, are linear in what they search, and allocate only the sets that they
+// return.
 
-/// The patch of this id in the whole subtree, `root` included; null for id 0, even where a patch
-/// carries it. Each level's children are all looked at before the first of them is entered; the
-/// first found in this order wins. Linear in what it looks at. The pointer refers into the lists of
-/// `root` (or is `root` itself), and lives as long as they do.
+/// The patch with this identifier in the whole subtree, `root` included; null for 0, even where a
+/// patch has that identifier. The search compares all children of a patch before it descends into
+/// the first of them, and returns the first match in this order. Linear in the number of patches
+/// searched. The pointer points into the lists of `root` (or to `root` itself) and lives as long as
+/// they do.
 TARN_API Patch const* findPatchRecursive(Patch const& root, unsigned long long id);
 TARN_API EvalPatch const* findPatchRecursive(EvalPatch const& root, unsigned long long id);
 
-/// The port of this id among the inputs (outputs) of the patch, then of its children in order; not
-/// of grandchildren; null where there is none. The pointer refers into the list that has the port,
-/// and lives as long. Linear in the number of ports searched.
+/// The port with this identifier among the inputs (outputs) of the patch, then among those of its
+/// children, in order; grandchildren are not searched. Null where there is none. The pointer points
+/// into the list with the port and lives as long as that. Linear in the number of ports searched.
 TARN_API EvalPort const* findInputPort(EvalPatch const& patch, unsigned long long portId);
 TARN_API EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long long portId);
 
-/// The first of the patch's own connections that leads to the port; empty where none does. Linear.
+/// The first of the patch's own connections to the port; empty where there is none. Linear.
 TARN_API Optional<Connection> findIncomingConnectionToPort(Patch const& patch,
                                                            unsigned long long portId);
 
-/// Those of the patch's own connections that lead to (start from) the patch `patchId`; an empty set
-/// where there are none. Linear.
+/// All of the patch's own connections to (from) its child `patchId`; an empty set where there are
+/// none. Linear.
 TARN_API std::unordered_set<Connection> findIncomingConnectionsToPatch(Patch const& patch,
                                                                        unsigned long long patchId);
 TARN_API std::unordered_set<Connection>
 findOutgoingConnectionsFromPatch(Patch const& patch, unsigned long long patchId);
 
-/// The connections that start from the port, out of those of the first patch in the subtree with a
-/// child that has the port among its outputs; searched from `root`, depth first. Empty where
-/// that patch has none, and for a port of `root` itself. Linear in the size of the subtree.
+/// The connections from the port. They are those of the first patch in the subtree, depth first
+/// from `root`, with a child that has the port among its outputs. Empty where that patch has none,
+/// and for ports of `root` itself. Linear in the size of the subtree.
 TARN_API std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,
                                                                         unsigned long long portId);
 
-/// The worker behind it: empty where no patch of the subtree has such a child.
+/// Implements the function above: empty where no patch of the subtree has such a child.
 TARN_API Optional<std::unordered_set<Connection>>
 _findOutgoingConnectionsFromPort(Patch const& root, unsigned long long portId);
 
 /// The first input (output) of the patch with this tag, or null; children are not searched. The
-/// pointer refers into the list of the patch, and lives as long. Linear in the number of its ports.
+/// pointer points into the list of the patch and lives as long as that. Linear in the number of
+/// ports.
 TARN_API Port const* inPortForTag(Patch const& patch, unsigned long long tag);
 TARN_API EvalPort const* inPortForTag(EvalPatch const& patch, unsigned long long tag);
 TARN_API Port const* outPortForTag(Patch const& patch, unsigned long long tag);
 TARN_API EvalPort const* outPortForTag(EvalPatch const& patch, unsigned long long tag);
 
-// Debug output, for people; nothing parses it.
+// Debug output, for people only.
 
-/// "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without an end of line. Numbers
-/// follow the stream's flags here and below.
+/// Writes "[name:id tag: 1 typeInfo: [type: float] defaultValue: 0]", without a line end. Here and
+/// below, numbers follow the stream's flags.
 TARN_API std::ostream& operator<<(std::ostream& stream, Port const& port);
 
-/// "[connection:12->34]", the ids of the ports, without an end of line.
+/// Writes "[connection:12->34]", with the identifiers of the ports, without a line end.
 TARN_API std::ostream& operator<<(std::ostream& stream, Connection const& connection);
 
-/// The patch, its ports, its children's whole output and its connections. Deliberate: only a
-/// patch without ports closes its bracket, and nesting is not indented. Every line end is
-/// flushed: print to a string stream where the output is long.
+/// Writes the patch, its ports, its children's whole output and its connections. Deliberate: only a
+/// patch without ports closes its bracket, and nesting is not indented. Every line is flushed: for
+/// long output, print to a string stream first.
 TARN_API std::ostream& operator<<(std::ostream& stream, Patch const& patch);
 
 // Implementation
@@ -284,7 +288,7 @@ MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Functi
         if constexpr (std::is_member_pointer_v<Function>) {
             results.push_back(std::invoke(function, element));
         } else {
-            results.push_back(function(element));  // Without a detour: conversions recurse.
+            results.push_back(function(element));  // No helper in between: conversions recurse.
         }
     }
     return std::make_shared<std::vector<Result>>(std::move(results));

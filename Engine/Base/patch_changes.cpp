@@ -20,8 +20,8 @@ using detail::SeededHash;
 
 constexpr std::size_t kNowhere = static_cast<std::size_t>(-1);
 
-// For each element of `after` the position of the one of its identifier in `before`, the first for
-// the first where it repeats, or `kNowhere`.
+// For each element of `after`, the position of the element with its identifier in `before`, or
+// `kNowhere`. Repeated identifiers are matched in order.
 template <class T>
 std::vector<std::size_t> matched(std::vector<T> const& before, std::vector<T> const& after) {
     std::vector<std::size_t> positions(after.size(), kNowhere);
@@ -43,7 +43,7 @@ std::vector<std::size_t> matched(std::vector<T> const& before, std::vector<T> co
     return positions;
 }
 
-// Whether what is in both is in one order.
+// Whether the elements that are in both lists have the same order.
 bool isInOrder(std::vector<std::size_t> const& positions) {
     std::size_t last = 0;
     for (std::size_t const position : positions) {
@@ -54,7 +54,7 @@ bool isInOrder(std::vector<std::size_t> const& positions) {
     return true;
 }
 
-// The positions below `count` that are not among these, in order.
+// The positions below `count` that are not in `positions`, in order.
 std::vector<std::size_t> missing(std::vector<std::size_t> const& positions, std::size_t count) {
     std::vector<bool> isThere(count, false);
     for (std::size_t const position : positions) {
@@ -73,11 +73,11 @@ public:
         pairs.push_back({&before, &after, nullptr, nullptr});
         comparePairs();
         isMoving = true;
-        // What is only in one of the two was moved, as a rule with all that is in it: then nothing
-        // in there is looked at.
+        // A patch that is only in one of the two lists was usually moved with its whole content.
+        // Then the content is not compared.
         std::vector<Place> rest;
         std::size_t next = 0;
-        while (next < onlyAfter.size()) {  // It grows on the way.
+        while (next < onlyAfter.size()) {  // The list grows in the loop.
             Place const place = onlyAfter[next++];
             if (!findMoved(place, false)) rest.push_back(place);
         }
@@ -168,7 +168,7 @@ private:
         changes.push_back(std::move(change));
     }
 
-    // These and the next two answer whether an order differs.
+    // These and the next two functions return whether the order differs.
     static bool comparePorts(std::vector<Port> const& before, std::vector<Port> const& after,
                              bool areInputs, PatchChange& change) {
         std::vector<std::size_t> const positions = matched(before, after);
@@ -198,7 +198,7 @@ private:
     static bool compareConnections(std::vector<Connection> const& before,
                                    std::vector<Connection> const& after, PatchChange& change) {
         if (before == after) return false;
-        // How many more there are after than before.
+        // The number of occurrences after minus that before.
         std::unordered_map<Connection, std::ptrdiff_t, SeededHash> surplus;
         for (Connection const& c : after) ++surplus[c];
         for (Connection const& c : before) --surplus[c];
@@ -238,8 +238,8 @@ private:
 
     using Places = std::unordered_map<unsigned long long, std::vector<Place>, SeededHash>;
 
-    // Whether the patch was elsewhere before; then both are compared. Looks for it among what has
-    // lost its place, and where `isDeep` inside of that too.
+    // Whether the patch was elsewhere before; then both are compared. Searches the patches that
+    // have lost their place, and where `isDeep` also inside them.
     bool findMoved(Place const& place, bool isDeep) {
         for (; knownRoots < onlyBefore.size(); ++knownRoots) {
             rootsBefore[onlyBefore[knownRoots].patch->id].push_back(onlyBefore[knownRoots]);
@@ -273,7 +273,7 @@ private:
         for (auto& entry : placesInside) std::reverse(entry.second.begin(), entry.second.end());
     }
 
-    // A place of that identifier that nothing was found for, or none.
+    // A place with that identifier that was not matched yet, if any.
     Place takeFrom(Places& places, unsigned long long id) const {
         auto const known = places.find(id);
         while (known != places.end() && !known->second.empty()) {
@@ -300,10 +300,10 @@ private:
     }
 
     std::vector<PatchChange> changes;
-    std::vector<Pair> pairs;  // To be compared.
+    std::vector<Pair> pairs;  // Still to be compared.
     std::vector<Place> onlyBefore;
     std::vector<Place> onlyAfter;
-    Places rootsBefore;  // Of the first `knownRoots` of `onlyBefore`.
+    Places rootsBefore;  // Those of the first `knownRoots` elements of `onlyBefore`.
     std::size_t knownRoots = 0;
     Places placesInside;
     bool hasPlacesInside = false;
@@ -311,7 +311,7 @@ private:
     std::unordered_set<Patch const*> taken;
 };
 
-// The text.
+// Formatting
 
 constexpr std::size_t kLongestText = 60;
 constexpr std::size_t kMostConnections = 20;
@@ -376,7 +376,7 @@ std::string shown(TypeInfo const& info) {
     return text;
 }
 
-// "label 1 -> 2", or "label changed" where that would not show a difference.
+// "label 1 -> 2", or "label changed" where both would look the same.
 template <class T>
 std::string changeOf(std::string const& label, T const& before, T const& after) {
     std::string const from = shown(before);

@@ -1,4 +1,4 @@
-// Engine/Base/patch_changes.h: what differs between two documents.
+// Engine/Base/patch_changes.h: the differences between two documents.
 //
 //     for (PatchChange const& change : patchChanges(before, after)) std::cout << change << "\n";
 
@@ -14,7 +14,7 @@
 
 namespace tarn::engine {
 
-/// What may differ in a port that is in both documents.
+/// The fields of a port that may differ.
 enum class PortField : unsigned char {
     Tag = 0,
     Name = 1,
@@ -23,10 +23,11 @@ enum class PortField : unsigned char {
     Attributes = 4,
 };
 
-/// What may differ in a patch that is in both documents, beside its ports and connections. The
-/// orders are those of what is in both: of the ports, the connections, the children.
+/// The fields of a patch that may differ, in addition to its ports and connections. An order
+/// differs where the ports, connections or children that are in both documents stand in another
+/// order.
 enum class PatchField : unsigned char {
-    /// Of the root alone: all others are known by it.
+    /// Only for the root: all other patches are matched by their identifiers.
     Id = 0,
     Builtin = 1,
     Descriptor = 2,
@@ -39,63 +40,64 @@ enum class PatchField : unsigned char {
     ChildOrder = 9,
 };
 
-/// An input or an output that was added to a patch, removed from it or changed.
+/// An input or output that was added to a patch, removed from it or changed.
 struct PortChange {
-    /// An added one is null before, a removed one after.
+    /// `before` is null for an added port, `after` for a removed one.
     Port const* before = nullptr;
     Port const* after = nullptr;
-    /// Otherwise it is an output.
+    /// True for an input, false for an output.
     bool isInput = false;
-    /// What differs, where the port is in both; in the order of the enumerators.
+    /// The fields that differ, where the port is in both; ordered by enumerator.
     std::vector<PortField> fields = {};
 
-    /// That of the port.
+    /// The identifier of the port.
     unsigned long long id() const { return (before != nullptr ? before : after)->id; }
 };
 
-/// One change of one patch. Points into the two documents, and lives as long as they do.
+/// One change of one patch. Points into the two documents and lives as long as they do.
 struct PatchChange {
-    /// A patch that is in one document only; one that has another parent; one that differs in what
-    /// is its own. A patch may be moved and changed.
+    /// Whether the patch is in one document only, has another parent, or differs in itself. A patch
+    /// may be both moved and changed.
     enum class Kind : unsigned char { Added = 0, Removed = 1, Moved = 2, Changed = 3 };
 
-    /// What happened, and the identifier of the patch: of a root that has another one, the former.
+    /// The kind of change, and the identifier of the patch. A root with another identifier has the
+    /// former one here.
     Kind kind = Kind::Changed;
     unsigned long long id = 0;
-    /// The patch; null before for an added one, null after for a removed one.
+    /// The patch in both documents; `before` is null for an added one, `after` for a removed one.
     Patch const* before = nullptr;
     Patch const* after = nullptr;
-    /// Those whose children it is one of; null for the root, and where the patch is null.
+    /// The parents; null for the root, and where the patch is null.
     Patch const* parentBefore = nullptr;
     Patch const* parentAfter = nullptr;
 
-    /// What is changed, for `Changed` alone. Fields in the order of the enumerators; inputs before
-    /// outputs, removed ports before the others; connections of the patch's children.
+    /// For `Changed` only: what differs. Fields are ordered by enumerator, inputs come before
+    /// outputs and removed ports before the others; connections are those of the patch's children.
     std::vector<PatchField> fields = {};
     std::vector<PortChange> ports = {};
     std::vector<Connection> connectionsAdded = {};
     std::vector<Connection> connectionsRemoved = {};
 };
 
-/// What differs, as changes from `before` to `after`; empty exactly where the two are equal.
-/// Patches and ports are known by their identifiers, those that repeat by their turns as far as
-/// they stand in one place; everything is compared as `==` does. A patch that is added or removed
-/// with others inside it is followed by theirs. Changes of the same documents the other way round
-/// are the same with before and after exchanged, in another order.
+/// The changes that lead from `before` to `after`; empty exactly where the two are equal. Patches
+/// and ports are matched by their identifiers. Repeated identifiers are matched in order, as far as
+/// they are in the same list. Everything is compared as `==` does. Changes of an added or removed
+/// patch are followed by those of the patches inside it. Comparing in the other direction gives the
+/// same changes in another order, with before and after exchanged.
 ///
-/// Lists that are one object are not looked at: to compare a document with its edited copy costs
-/// what the edit copied, else it is linear. (Where patches are added while others are removed, all
-/// that is in the removed ones is looked at.) Nothing recurses.
+/// Lists that are the same object are skipped: comparing a document with its edited copy costs what
+/// the edit copied; otherwise it is linear. (Where patches are added while others are removed,
+/// everything in the removed ones is compared.) Not recursive.
 TARN_API std::vector<PatchChange> patchChanges(Patch const& before, Patch const& after);
 
-/// A line for people, without its end: what happened to which patch, with names and values; long
-/// values are cut, and so are more than twenty connections. `changed patch 7 "fade": input 31
+/// One line for people, without a line end: what happened to which patch, with names and values.
+/// Long values and more than twenty connections are cut. Example: `changed patch 7 "fade": input 31
 /// "progress" default 0.5 -> 0.75`
 TARN_API std::string to_string(PatchChange const& change);
-/// All of them, each on a line of its own with its end.
+/// All changes, one line each, with line ends.
 TARN_API std::string to_string(std::vector<PatchChange> const& changes);
 
-/// Writes that line.
+/// Writes `to_string(change)`.
 TARN_API std::ostream& operator<<(std::ostream& stream, PatchChange const& change);
 
 }  // namespace tarn::engine

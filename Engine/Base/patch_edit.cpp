@@ -22,7 +22,7 @@ using detail::kNone;
 
 enum class Side : unsigned char { Input, Output };
 
-// A port of a list that is changed: the one that is there, or one of the edit's own.
+// A port in a changed list: either the existing one or the edit's own copy.
 struct PortEntry {
     unsigned long long id = 0;
     Port const* base = nullptr;
@@ -36,26 +36,26 @@ struct PortEdits {
     std::vector<PortEntry> entries;
 };
 
-// A patch that is changed, or has one inside it.
+// A patch that is changed, or has a changed patch inside it.
 struct Node {
-    // As it is before, the lists of the edit left out; and as it will be.
+    // The patch before the edit, without the edit's lists, and after it.
     Patch const* base = nullptr;
     Patch fields = {};
-    bool isHandedOut = false;  // Otherwise the fields are as they were.
+    bool isHandedOut = false;  // Otherwise the fields are unchanged.
     PortEdits inputs = {};
     PortEdits outputs = {};
-    // Its children by their numbers, once there is another order of them.
+    // The numbers of its children, once their order has changed.
     bool hasOrder = false;
     std::vector<std::uint32_t> order = {};
     std::unordered_set<Connection, detail::SeededHash> disconnected = {};
-    // With numbers that count up.
+    // Values are consecutive numbers, in the order in which connections were added.
     std::unordered_map<Connection, std::size_t, detail::SeededHash> connected = {};
 };
 
 using Numbers = std::unordered_map<unsigned long long, std::uint32_t, detail::SeededHash>;
 
-// Moves all of `elements`, which are hashed with the same seed, into a container that has room for
-// them, which cannot fail.
+// Moves all `elements` into a container that uses the same seed and has enough room, so that
+// nothing can fail.
 template <class Container>
 void absorb(Container& container, Container&& elements) noexcept {
     container.merge(elements);
@@ -71,8 +71,8 @@ void insertAt(std::vector<T>& list, std::size_t position, T element) noexcept {
     list.insert(list.begin() + static_cast<std::ptrdiff_t>(place), std::move(element));
 }
 
-// Whether nothing tells them apart, not even the sign of a zero. Data and paths that are other
-// objects count as others.
+// Whether they are identical, signed zeros included. Unstructured data and paths must be the same
+// object.
 bool isSame(Value const& a, Value const& b) {
     if (a.type() != b.type() || a != b) return false;
     switch (a.type()) {
@@ -88,7 +88,7 @@ bool isSame(Value const& a, Value const& b) {
         }
         case Type::Path: return a.ifPath() == b.ifPath();
         case Type::Unstructured: return a.ifUnstructured() == b.ifUnstructured();
-        case Type::Mat4:  // Compared by its bytes.
+        case Type::Mat4:  // Compared by bytes.
         case Type::Int:
         case Type::Boolean:
         case Type::Image:
@@ -106,7 +106,7 @@ bool isSame(Optional<Value> const& a, Optional<Value> const& b) {
 
 using Attributes = std::map<std::string, Unstructured>;
 
-// The text knows the sign of a zero.
+// The string shows the sign of a zero.
 bool isSame(Unstructured const& a, Unstructured const& b) {
     constexpr std::size_t kAll = std::numeric_limits<std::size_t>::max();
     return a == b && a.toText(kAll, kAll) == b.toText(kAll, kAll);
@@ -125,8 +125,8 @@ bool haveSameFields(Patch const& a, Patch const& b) {
 
 }  // namespace
 
-// Patches have numbers: those of their records in the index, and behind them those of patches that
-// the edit adds.
+// Every patch has a number: that of its record in the index, or a later number for patches that the
+// edit adds.
 class PatchEdit::State {
 public:
     explicit State(std::shared_ptr<detail::PatchTables> shared)
@@ -253,7 +253,7 @@ public:
             return false;
         }
         Node& node = touch(parent);
-        // One that was there before comes back to its place.
+        // A removed connection that is added again takes its former place.
         if (node.disconnected.erase(connection) == 0) {
             node.connected.emplace(connection, ++lastConnection);
         }
@@ -315,7 +315,7 @@ private:
     }
     bool isAdded(std::uint32_t number) const { return number >= recordCount(); }
 
-    // As it was before, or when it was added.
+    // The patch before the edit, or as it was added.
     Patch const& patchOf(std::uint32_t number) const {
         return isAdded(number) ? *added[number - recordCount()].patch
                                : *tables->graph.records[number].patch;
@@ -339,7 +339,7 @@ private:
         return number == kNone;
     }
 
-    // The number of the patch as the document is now, or `kNone`.
+    // The number of the patch in the edited document, or `kNone`.
     std::uint32_t find(unsigned long long id) const {
         std::uint32_t const before = tables->graph.recordOf(id);
         if (before != kNone && isThere(before)) return before;
@@ -352,7 +352,7 @@ private:
         return node == nodes.end() ? nullptr : &node->second;
     }
 
-    // The place of the port among those of a patch, or `kEnd`.
+    // The position of the port in its list, or `kEnd`.
     std::size_t positionOf(std::uint32_t owner, Side side, unsigned long long portId) const {
         Node const* const node = nodeOf(owner);
         if (node != nullptr) {
@@ -392,9 +392,9 @@ private:
                findPort(portId, Side::Output).owner != kNone;
     }
 
-    // The patch is about to be changed, and so are those that it is in.
+    // Prepares the patch, and all patches around it, for a change.
     Node& touch(std::uint32_t number) {
-        // Where there is a node, there are those around it.
+        // If a patch has a node, so have the patches around it.
         std::vector<std::uint32_t> missing;
         for (std::uint32_t n = number; n != kNone && nodes.count(n) == 0; n = parentOf(n)) {
             missing.push_back(n);
@@ -419,7 +419,7 @@ private:
         return ports;
     }
 
-    // Of a patch of a document whose identifiers repeat.
+    // For a patch of a document with repeated identifiers.
     std::uint32_t firstChildOf(std::uint32_t record) const {
         auto const& records = tables->graph.records;
         if (firstChildren.empty()) {
@@ -460,7 +460,7 @@ private:
         node.order.erase(std::find(node.order.begin(), node.order.end(), number));
     }
 
-    // Numbers for all patches of the tree, and their identifiers, which have to be new.
+    // Numbers all patches of the tree and registers their identifiers, which have to be new.
     bool addTree(std::uint32_t parent, Patch& given, Node& node, std::size_t position) {
         std::list<Patch> kept;
         kept.push_back(std::move(given));
@@ -510,13 +510,13 @@ private:
         return true;
     }
 
-    // What is there already under these keys is of patches that were removed.
+    // Entries that exist under these keys belong to removed patches.
     static void replaceWith(Numbers& known, Numbers&& news) noexcept {
         known.merge(news);
         for (auto const& [id, number] : news) known.find(id)->second = number;
     }
 
-    // Whether the list of the patch has it, as the document is now.
+    // Whether the edited document has the connection in this patch.
     bool isConnected(std::uint32_t parent, Connection const& connection) const {
         if (Node const* const node = nodeOf(parent)) {
             if (node->connected.count(connection) != 0) return true;
@@ -528,7 +528,7 @@ private:
         return isFound;
     }
 
-    // The connections that the parent had before, or those among them that begin or end at `child`.
+    // Calls `function` for the parent's former connections, or only those to and from `child`.
     template <class Function>
     void forEachBefore(std::uint32_t parent, std::uint32_t child, Function function) const {
         constexpr std::size_t kFew = 16;
@@ -545,7 +545,7 @@ private:
         for (Connection const& c : tables->view(parent, record.outgoing)) function(c);
     }
 
-    // All connections of the parent that begin or end at the child and are meant.
+    // All connections of the parent to and from the child for which the predicate is true.
     template <class Predicate>
     void disconnectAll(std::uint32_t parent, std::uint32_t child, Predicate isMeant) {
         Node& node = touch(parent);
@@ -563,7 +563,7 @@ private:
 
     using Ids = std::unordered_set<unsigned long long, detail::SeededHash>;
 
-    // Counts on from the largest; then takes what is free below.
+    // Counts up from the largest identifier, then searches for a free one below.
     template <class IsTaken>
     static unsigned long long fresh(unsigned long long& largest, unsigned long long& lastGap,
                                     Ids& given, IsTaken isTaken) {
@@ -578,7 +578,7 @@ private:
         return 0;
     }
 
-    // Makes the new records of the nodes, the inner ones first.
+    // Makes the new records of the nodes, innermost first.
     class Commit {
     public:
         explicit Commit(State const& edited) : state(edited) {}
@@ -716,22 +716,22 @@ private:
         std::unordered_map<std::uint32_t, std::vector<std::uint32_t>> changedChildren;
     };
 
-    std::shared_ptr<detail::PatchTables> tables;  // Null when done.
+    std::shared_ptr<detail::PatchTables> tables;  // Null after `commit`.
     Patch result;
     std::unordered_map<std::uint32_t, Node> nodes;
-    std::list<Patch> trees;  // Those that were added.
+    std::list<Patch> trees;  // The added patches.
     std::deque<Added> added;
     Numbers addedPatches;
     Numbers addedInputs;
     Numbers addedOutputs;
-    std::unordered_map<std::uint32_t, std::uint32_t> parents;  // Of patches that were moved.
+    std::unordered_map<std::uint32_t, std::uint32_t> parents;  // The new parents of moved patches.
     std::unordered_set<std::uint32_t> removed;
     std::vector<std::unique_ptr<Port>> removedPorts;  // Callers may still have pointers to them.
     mutable std::vector<std::uint32_t> firstChildren;
     std::size_t lastConnection = 0;
     unsigned long long largestPatchId;
     unsigned long long largestPortId;
-    // Below it no identifier is free; used once the largest there is has been given away.
+    // No identifier below is free; used once the largest possible one is taken.
     unsigned long long lastPatchGap = 0;
     unsigned long long lastPortGap = 0;
     Ids givenPatches;

@@ -1,4 +1,4 @@
-// Engine/Base/patch_edit.h: changes to a document, made at once.
+// Engine/Base/patch_edit.h: edits a document, which itself stays unchanged.
 //
 //     PatchIndex index(root);
 //     PatchEdit edit(index);
@@ -19,76 +19,77 @@
 
 namespace tarn::engine {
 
-/// Collects changes to the document of an index and makes a new root of them. The document, its
-/// index and their values stay as they are.
+/// Collects changes to the document of an index and makes a new root from them. The document, its
+/// index and their values stay unchanged.
 ///
-/// `commit` copies a list at most once, however many changes touch it: the lists on the way from
-/// the root to each change, and those that are changed themselves. Every other list of the new root
-/// is the very object that the former one has. A list is copied record by record, so that an edit
-/// costs what stands beside the change, on each level above it: groups are best kept small.
+/// `commit` copies a list at most once, however many changes touch it: the lists that are changed,
+/// and the lists on the path from the root to them. The new root shares every other list with the
+/// old one. A list is copied record by record, so an edit costs the number of siblings of the
+/// change, on each level above it: keep groups small.
 ///
-/// What is not there, what is taken or what does not fit answers false or null and changes nothing;
-/// so does a failing allocation, which throws. Where identifiers repeat, the patch and the port are
-/// those that the index finds, until they are removed. Each call takes constant time on average,
-/// but for the lists of the patch that it changes and for the levels above it. One thread at a
-/// time.
+/// A call that names something that does not exist, is already in use or does not fit returns false
+/// or null and changes nothing. A failing allocation throws and changes nothing. Where identifiers
+/// repeat, a call affects the patch or port that the index finds, until that is removed. Each call
+/// takes constant time on average, plus the lists of the patch that it changes and the levels above
+/// it. Not thread-safe.
 class PatchEdit {
 public:
-    /// The place behind all others.
+    /// A position after all others.
     static constexpr std::size_t kEnd = std::numeric_limits<std::size_t>::max();
 
-    /// Shares the tables of the index until `commit`, whatever becomes of the index.
+    /// Shares the tables of the index until `commit`; the index may be destroyed before.
     TARN_API explicit PatchEdit(PatchIndex const& index);
-    /// One that was moved from is only to be assigned to or destroyed.
+    /// A moved-from edit may only be assigned to or destroyed.
     TARN_API PatchEdit(PatchEdit&& other) noexcept;
     TARN_API PatchEdit& operator=(PatchEdit&& other) noexcept;
     TARN_API ~PatchEdit();
 
-    /// The patch (the port) as it will be, to be changed in place; null for one that is not there
-    /// or is removed. Valid until `commit`, whatever else is changed. The `id` stays, whatever is
-    /// written there. Another list that is assigned to the patch takes the place of the former one
-    /// and of all changes made to that; the edit knows nothing of what is in it. (All empty lists
-    /// of new records and of `arrayOf` are one: assigning it where it was is no change.)
+    /// The patch (the port) after the changes so far, to be changed in place; null where it does
+    /// not exist or is removed. Valid until `commit`, whatever else is changed. The `id` cannot be
+    /// changed: what is written there is ignored. A list that is assigned to the patch replaces the
+    /// former one and all changes made to it; the edit does not look into it. (All empty lists of
+    /// new records and of `arrayOf` are the same object: assigning it where it was changes
+    /// nothing.)
     TARN_API Patch* patch(unsigned long long id);
     TARN_API Port* inputPort(unsigned long long portId);
     TARN_API Port* outputPort(unsigned long long portId);
 
-    /// Adds a port to the patch, ahead of the one at `position`. False where the identifier of the
-    /// port is 0 or taken.
+    /// Adds a port to the patch, before the one at `position`. False where the port's identifier is
+    /// 0 or in use.
     TARN_API bool addInputPort(unsigned long long patchId, Port port, std::size_t position = kEnd);
     TARN_API bool addOutputPort(unsigned long long patchId, Port port, std::size_t position = kEnd);
-    /// Removes the port, and the connections to it (from it) on the level of its patch.
+    /// Removes the port, and the connections to it (from it) in the parent of its patch.
     TARN_API bool removeInputPort(unsigned long long portId);
     TARN_API bool removeOutputPort(unsigned long long portId);
 
-    /// Adds a patch, with all that is in it, to the children of another, ahead of the one at
-    /// `position`. False where an identifier in it is 0, occurs twice or is taken. Linear in its
-    /// size.
+    /// Adds a patch, with everything in it, to the children of another, before the one at
+    /// `position`. False where an identifier in it is 0, repeats or is in use. Linear in its size.
     TARN_API bool addPatch(unsigned long long parentId, Patch patch, std::size_t position = kEnd);
-    /// Removes the patch with all that is in it, and the connections of its parent that begin or
-    /// end at it. The root stays.
+    /// Removes the patch with everything in it, and the connections of its parent to and from it.
+    /// The root cannot be removed.
     TARN_API bool removePatch(unsigned long long id);
-    /// Moves the patch to the children of another, ahead of the one that is then at `position`.
-    /// Connections of a parent that it leaves are removed. False for the root, and for a parent
-    /// that is the patch itself or inside it.
+    /// Moves the patch to the children of another, before the one that is then at `position`. Where
+    /// it leaves a parent, that parent's connections to and from it are removed. False for the
+    /// root, and for a parent that is the patch itself or inside it.
     TARN_API bool movePatch(unsigned long long id, unsigned long long parentId,
                             std::size_t position = kEnd);
 
-    /// Adds the connection; an input may have several. False where it is there already, and where
-    /// its ends are not an output and an input of two children of one patch, or of one child.
+    /// Adds the connection; an input may have several. False where the connection exists, and where
+    /// its ends are not an output and an input of children of the same patch. (Both may belong to
+    /// one child.)
     TARN_API bool connect(Connection connection);
-    /// Removes the connection, wherever it stands in the list of the patch that one of its ends is
-    /// a child of. False where there is none.
+    /// Removes every occurrence of the connection from the parent of its ends. False where there is
+    /// none.
     TARN_API bool disconnect(Connection connection);
 
-    /// An identifier that neither the former document has nor this edit has seen; each call gives
-    /// another. 0 where there is none left.
+    /// An identifier that is used neither in the old document nor in this edit; each call returns
+    /// another one. 0 where there is none left.
     TARN_API unsigned long long freshPatchId();
     TARN_API unsigned long long freshPortId();
 
-    /// The new root. What was changed back to what it was before, to the last bit, is no change: a
-    /// root without any has the lists of the former one. Afterwards the edit is done: it answers
-    /// null and false, and the same root again.
+    /// Makes the new root. A change that was undone, to the last bit, is no change: a root without
+    /// changes has the lists of the old one. Afterwards the edit is finished: every function
+    /// returns null or false, and `commit` returns the same root again.
     TARN_API Patch commit();
 
 private:

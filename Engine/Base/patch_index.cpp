@@ -62,7 +62,7 @@ void PatchTables::lookAtIds() {
     for (auto const& slot : graph.outputs) {
         largestPortId = std::max<unsigned long long>(largestPortId, slot.key);
     }
-    // Both tables are gone through in one order.
+    // Both tables have the same seed, so they are in the same order.
     for (auto const& slot : graph.inputs) {
         if (slot.isFree()) continue;
         largestPortId = std::max<unsigned long long>(largestPortId, slot.key);
@@ -137,8 +137,8 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
     }
 }
 
-// A search for outgoing connections leaves the root's own outputs out: where such an identifier
-// occurs further down too, that patch counts.
+// A search for outgoing connections ignores the root's own outputs. Where such an identifier also
+// occurs further inside, that patch counts.
 std::uint32_t PatchTables::innerOwner(OutputSlot<Port> const& output) {
     if (output.owner != 0) return output.owner;
     if (hasUniqueIds) return kNone;
@@ -161,8 +161,8 @@ PatchIndex::PatchIndex(Patch root)
 
 void PatchIndex::update(Patch root) {
     bool const isShared = tables.use_count() != 1;
-    // What the last of the others did with the tables happened before they let go of them, and that
-    // before this one does.
+    // Synchronises with the copies that have released the tables: what they did with them happened
+    // before.
     static_cast<void>(std::shared_ptr<detail::PatchTables>(tables));
     if (isShared || !tables->update(root)) *this = PatchIndex(std::move(root));
 }

@@ -1,4 +1,4 @@
-// Engine/Base/patch_index.h: the queries over a graph, in constant time.
+// Engine/Base/patch_index.h: the queries of patch.h in constant time.
 //
 //     PatchIndex index(root);
 //     for (Connection const& c : index.outgoingConnections(portId)) { follow(c); }
@@ -21,34 +21,34 @@ struct PatchTables;
 }
 
 /// Some of the connections of one list, each once, in the order of the list. Nothing is copied: a
-/// view and its references live as long as the index that gave it.
+/// view and its references live as long as the index that returned it.
 class ConnectionView {
 public:
-    /// Goes forward, over and over if wanted.
+    /// A forward iterator; it may pass over the view several times.
     class Iterator {
     public:
-        /// As the standard library wants them.
+        /// The types that the standard library requires.
         using iterator_category = std::forward_iterator_tag;
         using value_type = Connection;
         using difference_type = std::ptrdiff_t;
         using pointer = Connection const*;
         using reference = Connection const&;
 
-        /// Equal to nothing but its like, or at a connection of the list.
+        /// Singular: equal only to another singular iterator.
         Iterator() = default;
         Iterator(Connection const* connections, std::uint32_t const* at)
             : list(connections), position(at) {}
 
-        /// The very connection in the list.
+        /// A reference to the connection in the list.
         reference operator*() const { return list[*position]; }
         pointer operator->() const { return &list[*position]; }
-        /// One further; the second form answers where it was.
+        /// Advances by one; the postfix form returns the former position.
         Iterator& operator++() {
             ++position;
             return *this;
         }
         Iterator operator++(int) { return {list, position++}; }
-        /// Whether both are at one place of one view.
+        /// Whether both are at the same position of the same view.
         friend bool operator==(Iterator a, Iterator b) { return a.position == b.position; }
         friend bool operator!=(Iterator a, Iterator b) { return a.position != b.position; }
 
@@ -57,12 +57,12 @@ public:
         std::uint32_t const* position = nullptr;
     };
 
-    /// Empty, or of the connections of a list at `count` positions.
+    /// An empty view, or a view of `count` connections at the given positions of a list.
     ConnectionView() = default;
     ConnectionView(Connection const* connections, std::uint32_t const* positions, std::size_t count)
         : list(connections), first(positions), length(count) {}
 
-    /// As of a container that is only read. All take constant time.
+    /// As for a read-only container. All take constant time.
     Iterator begin() const { return {list, first}; }
     Iterator end() const { return {list, first + length}; }
     std::size_t size() const { return length; }
@@ -75,56 +75,58 @@ private:
     std::size_t length = 0;
 };
 
-/// Answers about a graph exactly as the walking queries of patch.h do, duplicate identifiers and
-/// identifier 0 included, in constant time and without an allocation, whatever the identifiers are.
-/// (`findInputPort` and `findOutputPort` search the whole graph, where the walks know a patch and
-/// its children.) Building takes one pass over the patches, ports and connections.
+/// Returns exactly what the queries of patch.h return, also for repeated identifiers and identifier
+/// 0, in constant time and without an allocation. Identifiers cannot be chosen to make lookups
+/// slow. (`findInputPort` and `findOutputPort` search the whole graph, while the functions of
+/// patch.h search one patch and its children.) Construction takes one pass over the patches, ports
+/// and connections.
 ///
-/// An index shares the lists of its root, which never change: it and its answers stay valid for its
-/// own life, whatever happens to the caller's record. Copies share the tables; queries may run on
-/// any number of threads. One that was moved from is only to be assigned to or destroyed.
+/// An index shares the immutable lists of its root: the index and what it returns stay valid for
+/// its own lifetime, whatever happens to the caller's record. Copies share the tables. Queries are
+/// thread-safe. A moved-from index may only be assigned to or destroyed.
 class PatchIndex {
 public:
-    /// Positions take 32 bits: a graph of more than a thousand million patches, ports or
-    /// connections, shared lists counted wherever they occur, may throw `std::length_error`. The
-    /// stack does not grow with the depth.
+    /// Positions take 32 bits: a graph with more than a thousand million patches, ports or
+    /// connections, shared lists counted wherever they occur, may throw `std::length_error`. Not
+    /// recursive.
     TARN_API explicit PatchIndex(Patch root);
 
-    /// The patch that the index was made of, in the place where its answers refer to it.
+    /// The index's own copy of the patch that it was made from; results point to it.
     TARN_API Patch const& root() const;
 
-    /// As `findPatchRecursive(root(), id)`.
+    /// Same as `findPatchRecursive(root(), id)`.
     TARN_API Patch const* findPatch(unsigned long long id) const;
-    /// The patch whose `children` hold `findPatch(id)`; null for the root and for unknown ids.
+    /// The patch whose `children` contain `findPatch(id)`; null for the root and for unknown
+    /// identifiers.
     TARN_API Patch const* parentOf(unsigned long long id) const;
 
-    /// The input (output) of this id anywhere in the graph: the first in the order in which
-    /// `findPatchRecursive` looks at patches; null where there is none.
+    /// The input (output) with this identifier anywhere in the graph: the first in the search order
+    /// of `findPatchRecursive`; null where there is none.
     TARN_API Port const* findInputPort(unsigned long long portId) const;
     TARN_API Port const* findOutputPort(unsigned long long portId) const;
-    /// The patch of the first port of this id, in the same order, inputs before outputs.
+    /// The patch of the first port with this identifier, in the same order, inputs before outputs.
     TARN_API Patch const* ownerOfPort(unsigned long long portId) const;
 
-    /// The connections of `findOutgoingConnectionsFromPort(root(), portId)`.
+    /// The connections that `findOutgoingConnectionsFromPort(root(), portId)` finds.
     TARN_API ConnectionView outgoingConnections(unsigned long long portId) const;
-    /// What `findIncomingConnectionToPort` finds in the parent of the port's owner, or null.
+    /// The connection that `findIncomingConnectionToPort` finds in the parent of the port's patch,
+    /// or null.
     TARN_API Connection const* incomingConnection(unsigned long long portId) const;
 
-    /// What `findIncomingConnectionsToPatch` (`findOutgoingConnectionsFromPatch`) finds in
-    /// `parentOf(id)`; empty where that is null.
+    /// The connections that `findIncomingConnectionsToPatch` (`findOutgoingConnectionsFromPatch`)
+    /// finds in `parentOf(id)`; empty where that is null.
     TARN_API ConnectionView incomingConnectionsToPatch(unsigned long long id) const;
     TARN_API ConnectionView outgoingConnectionsFromPatch(unsigned long long id) const;
 
-    /// Makes this the index of another root: afterwards its answers are those of
-    /// `PatchIndex(root)`. The cost follows what differs from the root before, lists that are one
-    /// object not being looked at. It is that of a new index where copies share this one's tables,
-    /// where identifiers repeat or a connection leads to an output, and now and then after many
-    /// updates.
+    /// Makes this the index of another root: afterwards it is equivalent to `PatchIndex(root)`. The
+    /// cost depends on what differs from the former root; lists that are the same object are
+    /// skipped. It costs as much as a new index where copies share this index's tables, where
+    /// identifiers repeat or a connection leads to an output, and occasionally after many updates.
     ///
-    /// Views from before are no longer valid, and `root()` is another patch. Pointers to patches,
-    /// ports and connections live as long as the lists that they refer into: those of the former
-    /// root, while somebody holds it, and all that the new one shares with it. A failing
-    /// allocation leaves the index as it was. Nobody may ask this index anything meanwhile.
+    /// Invalidates views, and moves `root()`. Pointers to patches, ports and connections live as
+    /// long as the lists that they point into: those of the former root as long as someone holds
+    /// it, and those that the new root shares with it. A failing allocation leaves the index
+    /// unchanged. Must not run concurrently with any other use of this index.
     TARN_API void update(Patch root);
 
 private:
@@ -132,20 +134,20 @@ private:
     std::shared_ptr<detail::PatchTables> tables;
 };
 
-/// The same for the evaluation form, whose lists everyone who shares them may change. The index
-/// keeps the lists of its root alive, but it does not see a patch or a port that was added, removed
-/// or given another identifier: its answers dangle or are wrong until `rebuild()`. Values of ports
-/// may change freely.
+/// The same for the evaluation form, whose lists can be changed by everyone who shares them. The
+/// index keeps the lists of its root alive, but does not notice patches or ports that are added,
+/// removed or given another identifier: until `rebuild()`, results dangle or are wrong. Values of
+/// ports may change freely.
 class EvalPatchIndex {
 public:
-    /// Shares the lists of `root`. Costs as that of `PatchIndex`.
+    /// Shares the lists of `root`. Costs as much as a `PatchIndex`.
     TARN_API explicit EvalPatchIndex(EvalPatch root);
 
-    /// Looks at the graph again. Afterwards the answers are those of the lists as they are now. A
-    /// failing allocation leaves the index as it was.
+    /// Builds the tables again from the lists as they are now. A failing allocation leaves the
+    /// index unchanged.
     TARN_API void rebuild();
 
-    /// As those of `PatchIndex`. None allocates.
+    /// Same as those of `PatchIndex`. None allocates.
     TARN_API EvalPatch const& root() const;
     TARN_API EvalPatch const* findPatch(unsigned long long id) const;
     TARN_API EvalPatch const* parentOf(unsigned long long id) const;

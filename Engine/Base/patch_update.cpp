@@ -10,7 +10,7 @@ namespace {
 
 using Ids = std::unordered_set<unsigned long long, SeededHash>;
 
-// What becomes of the ports of one kind.
+// The changes to the inputs or to the outputs.
 struct PortPlan {
     Ids erased;
     struct Insertion {
@@ -18,13 +18,13 @@ struct PortPlan {
         std::uint32_t owner;
     };
     std::vector<Insertion> inserted;
-    // Ports that are in a new list, and otherwise where they were.
+    // Ports that are in a new list although they are not new.
     std::vector<Port const*> refreshed;
 };
 
 }  // namespace
 
-// First everything is found out and all memory is taken; what comes then cannot fail.
+// Everything that can fail comes first: comparing and allocating. Then the tables are changed.
 class PatchUpdate {
 public:
     PatchUpdate(PatchTables& updated, Patch& newRoot)
@@ -52,7 +52,7 @@ private:
         Patch const* patch;
     };
 
-    // A record's mark says what this update has seen of it.
+    // Starts a new range of marks, by which this update notes what it has seen of a record.
     bool startMarks() {
         constexpr std::uint32_t kMarks = 3;
         if (tables.lastMark > kNone - 2 * kMarks) return false;
@@ -64,8 +64,8 @@ private:
     }
     std::uint32_t& markOf(std::uint32_t record) { return graph.records[record].mark; }
 
-    // From the root down, into lists that are not the same objects. False where a patch is found in
-    // two places.
+    // Compares from the root down, except lists that are the same object. False where a patch is
+    // found in two places.
     bool compareAll() {
         if (!visit({0, kNone, &next}, nullptr)) return false;
         while (!toEnter.empty()) {
@@ -77,7 +77,7 @@ private:
         return true;
     }
 
-    // A patch that was there before.
+    // A patch that existed before.
     bool visit(Refresh const& now, Patch const* parent) {
         PatchRecord<Patch>& record = graph.records[now.record];
         if (record.mark >= unchanged) return false;
@@ -145,7 +145,7 @@ private:
         return true;
     }
 
-    // A patch that was not there before.
+    // A patch that is new.
     bool add(Patch const& patch, std::uint32_t parent) {
         requireLists(patch);
         if (!addedIds.insert(patch.id).second) return false;
@@ -162,7 +162,7 @@ private:
         return true;
     }
 
-    // Those that nobody visited are nowhere in the new graph.
+    // Patches that were not visited are not in the new graph.
     void removeChildren(std::uint32_t top) {
         std::vector<std::uint32_t> pending{top};
         while (!pending.empty()) {
@@ -183,14 +183,14 @@ private:
 
     void regroup(std::uint32_t record, Patch const& patch) { regrouped.emplace(record, &patch); }
 
-    // Where a patch was moved, its former parent no longer has it.
+    // False where a moved patch is still in its former parent.
     bool checkMoves() {
         return std::all_of(moved.begin(), moved.end(), [this](std::uint32_t record) {
             return markOf(graph.records[record].parent) > unchanged;
         });
     }
 
-    // Identifiers stay unique.
+    // Whether identifiers stay distinct.
     bool checkIds() const {
         Ids seen;
         auto const isFree = [](auto const& table, PortPlan const& plan, unsigned long long id) {
@@ -227,7 +227,7 @@ private:
         for (auto const& [record, patch] : regrouped)
             appendOnce(*patch->connections, record, places);
         members.reserve(3 * places.size());
-        // Three memberships each, and at worst a group for each of them.
+        // Each connection is in three groups, and each may be a new group.
         tables.groups.reserveFor(6 * places.size());
     }
 

@@ -22,7 +22,7 @@ constexpr double kQuarterArc = 0.552284749;  // Deliberate: nine decimals, not 4
 constexpr double kQuarterArcRest = 0.447715251;
 static_assert(kQuarterArcRest == 1.0 - kQuarterArc);
 
-// Nothing but the list itself can fail to grow: the points fit in place.
+// Only growing the list can fail: up to three points fit in place.
 template <class... Vectors>
 void add(std::vector<PathElement>& elements, PathInstruction instruction, Vectors... points) {
     PathElement& element = elements.emplace_back();
@@ -81,7 +81,7 @@ std::shared_ptr<Path const> Path::EmptyPath() {
     return emptyPathSharedPtr.value;
 }
 
-// Growth stays geometric over many calls.
+// Keeps growth geometric over many calls.
 void PathBuilder::reserve(std::size_t more) {
     std::size_t const needed = elements.size() + more;
     if (needed > elements.capacity()) elements.reserve(std::max(needed, 2 * elements.capacity()));
@@ -117,7 +117,7 @@ PathBuilder& PathBuilder::close() {
 }
 
 PathBuilder& PathBuilder::append(Path path) {
-    reserve(path.elements.size());  // All that can fail comes first.
+    reserve(path.elements.size());  // Everything that can fail comes first.
     elements.insert(elements.end(), std::make_move_iterator(path.elements.begin()),
                     std::make_move_iterator(path.elements.end()));
     return *this;
@@ -126,7 +126,7 @@ PathBuilder& PathBuilder::append(Path path) {
 PathBuilder& PathBuilder::arcTo(FloatVec2 p, bool verticalFirst) {
     FloatVec2 const c = currentPoint;
     FloatVec2 const d{p.x - c.x, p.y - c.y};
-    // The second control meets the end's line at c + d as computed, not at a copy of p.
+    // The second control point lies on the end's line through c + d as computed, not through p.
     if (verticalFirst) {
         return curveTo({c.x, kQuarterArc * d.y + c.y}, {kQuarterArcRest * d.x + c.x, d.y + c.y}, p);
     }

@@ -22,7 +22,7 @@ std::size_t pointsOf(PathInstruction instruction) {
     return 0;
 }
 
-// From the smallest to the largest of the numbers that were added; at first nothing.
+// The range of the numbers that were added; initially empty.
 struct Range {
     double min = std::numeric_limits<double>::infinity();
     double max = -std::numeric_limits<double>::infinity();
@@ -35,8 +35,8 @@ struct Range {
     bool isEmpty() const { return !(min <= max); }
 };
 
-// The power of two that brings the largest of the numbers near to 1, so that products neither
-// overflow nor vanish; 0 where there is none.
+// The exponent of two that scales the largest number close to 1, so that products neither overflow
+// nor underflow; 0 where there is none.
 template <std::size_t count>
 int scaleOf(double const (&numbers)[count]) {
     double largest = 0.0;
@@ -44,11 +44,11 @@ int scaleOf(double const (&numbers)[count]) {
     return largest > 0.0 && std::isfinite(largest) ? -std::ilogb(largest) : 0;
 }
 
-// Where the curve turns around on this axis, which is where its slope is zero.
+// Adds the extrema of the curve on this axis: the zeros of its derivative.
 void addCubic(Range& range, double p0, double p1, double p2, double p3) {
     range.add(p0);
     range.add(p3);
-    // Between its ends it stays among its control points.
+    // A Bézier curve stays within the range of its control points.
     if (range.has(p1) && range.has(p2)) return;
     if (std::isinf(p1)) range.add(p1);
     if (std::isinf(p2)) range.add(p2);
@@ -68,7 +68,7 @@ void addCubic(Range& range, double p0, double p1, double p2, double p3) {
     };
     double const discriminant = b * b - 4.0 * a * c;
     if (!(discriminant >= 0.0)) return;
-    // Without a difference of numbers that are nearly the same.
+    // Avoids cancellation.
     double const q = -0.5 * (b + std::copysign(std::sqrt(discriminant), b));
     if (a != 0.0) addAt(q / a);
     if (q != 0.0) addAt(c / q);

@@ -1,4 +1,4 @@
-// Engine/Base/path_geometry.h: where a path lies, and paths made of others.
+// Engine/Base/path_geometry.h: bounding boxes, transformations and interpolation of paths.
 //
 //     Path circle = PathBuilder().circle({0, 0}, 5).build();
 //     Optional<Bounds> box = bounds(circle);  // (-5, -5) to (5, 5)
@@ -13,35 +13,35 @@
 
 namespace tarn::engine {
 
-/// A box with edges along the axes, in the units of the points it is of.
+/// An axis-parallel box, in the units of the points that it encloses.
 struct Bounds {
-    /// The corners of the smallest and of the largest coordinates.
+    /// The corners with the smallest and with the largest coordinates.
     FloatVec2 min = {};
     FloatVec2 max = {};
 
-    /// Both corners.
+    /// Compares both corners.
     friend constexpr bool operator==(Bounds const& a, Bounds const& b) {
         return a.min == b.min && a.max == b.max;
     }
     friend constexpr bool operator!=(Bounds const& a, Bounds const& b) { return !(a == b); }
 };
 
-/// The smallest box around what the path draws: curves count by where they reach, not by their
-/// control points, to within rounding. Every `moveTo` counts as a point; what begins without one
-/// begins at (0, 0). Empty for a path without a point whose coordinates are
-/// numbers; where a control point is infinite, so is the box. Elements with fewer points than their
-/// instruction wants are left out, and so is a coordinate that is a NaN. Linear.
+/// The smallest box around what the path draws, to within rounding: curves count by their extrema,
+/// not by their control points. Every `moveTo` counts as a point; a path without one begins at (0,
+/// 0). Empty for a path without a point that has numbers as coordinates. Where a control point is
+/// infinite, the box is infinite. Elements with fewer points than their instruction needs are
+/// skipped, and so is a coordinate that is a NaN. Linear.
 TARN_API Optional<Bounds> bounds(Path const& path);
 
-/// The path with every point moved by `offset`.
+/// The path with `offset` added to every point.
 TARN_API Path translated(Path const& path, FloatVec2 offset);
 
-/// The path with every point's coordinates times `factors`: larger and smaller about the origin.
+/// The path with every point's coordinates multiplied by `factors`: scaled about the origin.
 TARN_API Path scaled(Path const& path, FloatVec2 factors);
 
-/// The path on the way from `a` to `b`: `a` itself at `t` 0, `b` itself at 1, and between and
-/// beyond them every coordinate x + (y - x) * t. Empty where the two have different instructions or
-/// numbers of points. Linear.
+/// Interpolates from `a` to `b`: exactly `a` at `t` 0, exactly `b` at 1, and for every other `t`
+/// each coordinate is x + (y - x) * t. Empty where the two differ in instructions or numbers of
+/// points. Linear.
 TARN_API Optional<Path> interpolate(Path const& a, Path const& b, double t);
 
 }  // namespace tarn::engine

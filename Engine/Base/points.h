@@ -1,5 +1,4 @@
-// Engine/Base/points.h: a list of points that does not allocate for the few that most elements
-// have.
+// Engine/Base/points.h: a list of points that allocates nothing for up to three of them.
 //
 //     Points points{{1, 2}, {3, 4}};
 //     points.push_back({5, 6});
@@ -25,26 +24,24 @@ namespace tarn::engine {
 
 namespace detail {
 
-// `std::out_of_range` and `std::length_error`, out of line: callers may be compiled without
+// Throw `std::out_of_range` and `std::length_error`, out of line: callers may be compiled without
 // exceptions.
 [[noreturn]] TARN_API void throwOutOfRange(char const* what);
 [[noreturn]] TARN_API void throwLengthError(char const* what);
 
 }  // namespace detail
 
-/// A growable list in the manner of `std::vector<FloatVec2>`, without an allocator: up to three
-/// points are held in place, without an allocation. What differs from a vector:
+/// A growable list with the interface of `std::vector<FloatVec2>` except for allocators. Up to
+/// three points are stored in place, without an allocation. Differences to a vector:
 ///
-/// - a move and a swap invalidate iterators, pointers and references;
-/// - a range that is inserted or assigned is copied first, and so may be a part of the list; an
-/// insertion that fails
-///   leaves the list as it was, wherever it was to go;
-/// - it is made from a vector and converts to one, each being a copy: a `std::vector<FloatVec2>
-/// const&` that is made
-///   from it is a copy too, and `std::vector v{points}` is a vector of one `Points`.
+/// - moving and swapping invalidate iterators, pointers and references;
+/// - a range that is inserted or assigned is copied first, so it may be part of the list; an
+///   insertion that fails leaves the list unchanged, wherever it was to go;
+/// - conversions from and to a vector copy. A `std::vector<FloatVec2> const&` bound to a `Points`
+///   refers to a copy, and `std::vector v{points}` is a vector with one `Points`.
 class Points {
 public:
-    /// As those of a vector.
+    /// As for a vector.
     using value_type = FloatVec2;
     using size_type = std::size_t;
     using difference_type = std::ptrdiff_t;
@@ -57,14 +54,15 @@ public:
     using reverse_iterator = std::reverse_iterator<iterator>;
     using const_reverse_iterator = std::reverse_iterator<const_iterator>;
 
-    /// As the constructors of a vector; and from a vector, which is copied.
+    /// As for a vector; the constructor from a vector copies it.
     Points() = default;
     explicit Points(size_type count) { resize(count); }
     Points(size_type count, FloatVec2 point) { resize(count, point); }
     Points(std::initializer_list<FloatVec2> points) { append(points.begin(), points.size()); }
     Points(std::vector<FloatVec2> const& points) { append(points.data(), points.size()); }
     template <class Iterator, class = typename std::iterator_traits<Iterator>::iterator_category>
-    Points(Iterator first, Iterator last) : Points() {  // Whole by now: released on failure.
+    Points(Iterator first, Iterator last)
+        : Points() {  // Fully constructed by now: a failure releases it.
         using Category = typename std::iterator_traits<Iterator>::iterator_category;
         if constexpr (std::is_base_of_v<std::forward_iterator_tag, Category>) {
             reserve(static_cast<size_type>(std::distance(first, last)));
@@ -82,7 +80,7 @@ public:
     Points(Points&& other) noexcept { take(other); }
     ~Points() { release(); }
 
-    /// Into the room that there is, when it is enough. A failing allocation leaves this as it was.
+    /// Reuses the memory where it suffices. A failing allocation leaves this unchanged.
     Points& operator=(Points const& other) {
         if (other.length > room) return *this = Points(other);
         if (this != &other) overwrite(other.begin(), other.length);
@@ -100,11 +98,10 @@ public:
         return *this;
     }
 
-    /// A copy.
+    /// Copies.
     operator std::vector<FloatVec2>() const { return {begin(), end()}; }
 
-    /// The points behind one another, and how many. Constant time. More than `max_size` throw
-    /// `std::length_error`.
+    /// As for a vector. Constant time. More than `max_size` points throw `std::length_error`.
     FloatVec2* data() noexcept { return isMany() ? held.many : held.few; }
     FloatVec2 const* data() const noexcept { return isMany() ? held.many : held.few; }
     size_type size() const noexcept { return length; }
@@ -116,7 +113,7 @@ public:
     }
     bool empty() const noexcept { return length == 0; }
 
-    /// Valid until points are added or this is moved from.
+    /// Invalidated when points are added or this is moved from.
     iterator begin() noexcept { return data(); }
     iterator end() noexcept { return data() + length; }
     const_iterator begin() const noexcept { return data(); }
@@ -130,10 +127,9 @@ public:
     const_reverse_iterator crbegin() const noexcept { return rbegin(); }
     const_reverse_iterator crend() const noexcept { return rend(); }
 
-    /// One point. `at` throws `std::out_of_range` for one that is not there. The others have to be
-    /// there: where
-    /// `_GLIBCXX_ASSERTIONS` is defined, which checks vectors too, one that is not is an assertion
-    /// failure.
+    /// One point. `at` throws `std::out_of_range` for a position out of range. For the others such
+    /// a position is undefined behaviour; it is an assertion failure where `_GLIBCXX_ASSERTIONS` is
+    /// defined, which checks vectors too.
     FloatVec2& operator[](size_type i) {
         check(i < length, "i < size()", "operator[]");
         return data()[i];
@@ -161,8 +157,8 @@ public:
         return end()[-1];
     }
 
-    /// As of a vector: adding at the end takes constant time over many calls, and a failing
-    /// allocation leaves this as it was.
+    /// As for a vector: adding at the end takes amortised constant time, and a failing allocation
+    /// leaves this unchanged.
     void reserve(size_type wanted) { withRoomFor(wanted); }
     void shrink_to_fit() {
         if (isMany() && length < room) *this = Points(*this);
@@ -187,7 +183,7 @@ public:
         length = static_cast<Count>(count);
     }
 
-    /// Linear in what is inserted and what follows the place.
+    /// Linear in the points inserted and the points after them.
     iterator insert(const_iterator position, FloatVec2 point) {
         return insert(position, &point, &point + 1);
     }
@@ -218,7 +214,7 @@ public:
         length = static_cast<Count>(std::copy(last, cend(), to) - begin());
         return to;
     }
-    /// As assigning what the constructors make.
+    /// The same as assigning a newly constructed list.
     void assign(size_type count, FloatVec2 point) {
         if (count > room) {
             *this = Points(count, point);
@@ -237,14 +233,14 @@ public:
     void swap(Points& other) noexcept { std::swap(*this, other); }
     friend void swap(Points& a, Points& b) noexcept { a.swap(b); }
 
-    /// As many points, equal as floating-point numbers are.
+    /// The same number of points, equal as floating-point numbers.
     friend bool operator==(Points const& a, Points const& b) {
         return a.length == b.length && std::equal(a.begin(), a.end(), b.begin());
     }
     friend bool operator!=(Points const& a, Points const& b) { return !(a == b); }
 
-    /// Takes out all that equal the point (that the predicate is true for); says how many they
-    /// were. Linear.
+    /// Removes all points that equal the given one (for which the predicate is true) and returns
+    /// their number. Linear.
     template <class Predicate>
     friend size_type erase_if(Points& points, Predicate predicate) {
         auto const kept = std::remove_if(points.begin(), points.end(), predicate);
@@ -260,7 +256,8 @@ private:
     using Count = std::uint32_t;
     static constexpr Count kInPlace = 3;
 
-    // A block of their own, or in place: `room` tells. Copying it copies what is there.
+    // The points: in a block on the heap or in place, which `room` tells. Copying copies the
+    // pointer.
     union Held {
         Held() noexcept : few{} {}
         FloatVec2 few[kInPlace];
@@ -296,7 +293,7 @@ private:
         std::copy(points, points + count, data());
         length = static_cast<Count>(count);
     }
-    // Twice what there is, or all that is wanted if that is more.
+    // Doubles the capacity, or returns what is wanted if that is more.
     size_type grownRoom(size_type wanted) const {
         size_type const doubled = 2 * size_type(length);
         return std::max(wanted, std::min(doubled, max_size()));
@@ -304,7 +301,7 @@ private:
     FloatVec2* withGrownRoomFor(size_type wanted) {
         return withRoomFor(wanted <= room ? wanted : grownRoom(wanted));
     }
-    // Where the points are, then.
+    // Grows if needed; returns where the points are then.
     FloatVec2* withRoomFor(size_type wanted) {
         if (wanted <= room) return data();
         moveTo(wanted);
@@ -318,7 +315,7 @@ private:
         held.many = larger;
         room = static_cast<Count>(newRoom);
     }
-    // Without a look at what this held. Afterwards `other` is empty.
+    // Takes the points of `other`, which is empty afterwards, and overwrites its own.
     void take(Points& other) noexcept {
         held = other.held;
         length = std::exchange(other.length, 0);

@@ -22,19 +22,19 @@ namespace {
 
 constexpr double kPi = 3.141592653589793;
 
-// Of a number that may not be finite, which is nothing that SVG could write.
+// SVG cannot express non-finite numbers.
 void append(std::string& text, double number) {
     constexpr double kLargest = std::numeric_limits<double>::max();
     detail::appendShortest(text,
                            std::isnan(number) ? 0.0 : std::clamp(number, -kLargest, kLargest));
 }
 
-// Reads path data into a builder, command by command.
+// Parses path data into a builder, command by command.
 class Reader {
 public:
     explicit Reader(std::string const& text) : data(text) {}
 
-    // Whether all of it could be read.
+    // Whether the whole string was valid.
     bool read() {
         skipSpace();
         char command = 0;
@@ -47,7 +47,7 @@ public:
                 skipSpace();
                 if (!readCommand(command)) return false;
             } else {
-                // The numbers of another command of the kind. After M they are those of L.
+                // More numbers repeat the command; after M they mean L.
                 if (command == 0 || command == 'Z' || command == 'z') return false;
                 if (command == 'M') command = 'L';
                 if (command == 'm') command = 'l';
@@ -73,7 +73,7 @@ private:
     void skipSpace() {
         while (atSpace()) ++position;
     }
-    // A comma may stand between numbers, but nowhere else.
+    // A comma may stand between numbers only.
     void skipSpaceAndComma() {
         skipSpace();
         if (position >= data.size() || data[position] != ',') return;
@@ -128,7 +128,7 @@ private:
         return true;
     }
 
-    // One digit, with or without something around it.
+    // One digit, 0 or 1; separators may be missing.
     bool readFlag(bool& flag) {
         skipSpaceAndComma();
         if (position >= data.size() || (data[position] != '0' && data[position] != '1'))
@@ -139,7 +139,7 @@ private:
 
     FloatVec2 current() const { return builder.currentPoint; }
 
-    // Whatever is drawn after a close begins where the outline began.
+    // Drawing after a close begins where the outline began.
     PathBuilder& drawing() {
         if (builder.elements.back().instruction == PathInstruction::close) builder.moveTo(start);
         return builder;
@@ -222,7 +222,7 @@ private:
         }
     }
 
-    // The last control point, seen from the other side of the current point.
+    // The last control point, reflected about the current point.
     FloatVec2 reflected() const { return current() * 2.0 - lastControl; }
 
     bool cubicTo(FloatVec2 c1, FloatVec2 c2, FloatVec2 p) {
@@ -236,7 +236,8 @@ private:
         return true;
     }
 
-    // An arc of an ellipse, by its centre and angles, in pieces of at most a quarter.
+    // Converts an elliptical arc to its centre and angles, and draws it in pieces of at most a
+    // quarter.
     void arcTo(FloatVec2 radii, double degrees, bool isLarge, bool isClockwise, FloatVec2 end) {
         FloatVec2 const from = current();
         double rx = std::abs(radii.x);
@@ -245,12 +246,12 @@ private:
         double const phi = std::fmod(degrees, 360.0) * kPi / 180.0;
         double const cosine = std::cos(phi);
         double const sine = std::sin(phi);
-        // Half the way, in the axes of the ellipse and in units of its radii.
+        // Half of the chord, in the axes of the ellipse and in units of its radii.
         FloatVec2 const half = from / 2.0 - end / 2.0;
         double const x = (cosine * half.x + sine * half.y) / rx;
         double const y = (cosine * half.y - sine * half.x) / ry;
         double reach = std::hypot(x, y);
-        // Radii that do not reach are made as large as they have to be.
+        // Radii that are too small are scaled up until they fit.
         if (reach > 1.0) {
             rx *= reach;
             ry *= reach;
@@ -260,8 +261,8 @@ private:
             drawing().lineTo(end);
             return;
         }
-        // The way is a chord of the circle that the ellipse is in these units; half of it is seen
-        // from the centre under an angle whose sine is `reach`.
+        // In these units the ellipse is a unit circle, and half of the chord is the sine of half
+        // the angle.
         double const small = 2.0 * std::asin(reach);
         double const sweep = (isClockwise ? 1.0 : -1.0) * (isLarge ? 2.0 * kPi - small : small);
         double const first =
@@ -270,7 +271,7 @@ private:
         auto const turned = [&](double u, double v) {
             return FloatVec2{cosine * rx * u - sine * ry * v, sine * rx * u + cosine * ry * v};
         };
-        // From the beginning and not from the centre, which may be far away.
+        // Relative to the start and not to the centre, which may be far away.
         auto const place = [&](double angle) {
             double const middle = first + angle / 2.0;
             double const chord = 2.0 * std::sin(angle / 2.0);

@@ -1,4 +1,4 @@
-// Engine/Base/svg_path.h: paths as the data of SVG's `path` elements, either way.
+// Engine/Base/svg_path.h: converts paths to and from SVG path data.
 //
 //     Path line = PathBuilder().moveTo({0, 0}).lineTo({1.5, 2}).build();
 //     std::string data = svgPathData(line);  // "M0 0L1.5 2"
@@ -16,21 +16,21 @@
 
 namespace tarn::engine {
 
-/// The string of a `d` attribute: M, L, C, Q and Z, with absolute coordinates. Each number is the
-/// shortest that reads back to the same double, in every locale. SVG has no NaN, which is written
-/// as 0, and no infinity, which is written as the largest double. Elements with fewer points than
-/// their instruction wants are left out, their further points are not written, and a path that
-/// begins without a `moveTo` begins with "M0 0". Linear.
+/// The value of a `d` attribute: M, L, C, Q and Z with absolute coordinates. Each number is the
+/// shortest that converts back to the same double, in every locale. SVG has no NaN, which is
+/// written as 0, and no infinity, which is written as the largest double. Elements with fewer
+/// points than their instruction needs are skipped, and additional points are ignored. A path that
+/// begins without a `moveTo` gets "M0 0" in front. Linear.
 TARN_API std::string svgPathData(Path const& path);
 
-/// The path of such a string, of all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
-/// relative. It consists of `moveTo`, `lineTo`, `curveTo`, `quadCurveTo` and `close` alone: arcs
-/// become up to four cubic curves each, as close as `PathBuilder::arcTo` is, and what is drawn
-/// after a close begins with a `moveTo`. No data is the empty path.
+/// Parses such a string with all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
+/// relative. The path consists of `moveTo`, `lineTo`, `curveTo`, `quadCurveTo` and `close` alone:
+/// an arc becomes up to four cubic curves, as accurate as those of `PathBuilder::arcTo`, and a
+/// `moveTo` is added after a close where drawing goes on. An empty string is the empty path.
 ///
-/// Empty where the data is faulty, also where it only ends too early, does not begin with M, or has
-/// a number beyond the range of a double; `*fault` is then the position of the first byte that
-/// cannot be read. Otherwise it is left as it is.
+/// Empty where the data is invalid: also where it is incomplete, does not begin with M, or has a
+/// number beyond the range of a double. `*fault` is then the position of the first byte that cannot
+/// be parsed; otherwise it is not changed.
 TARN_API Optional<Path> pathFromSvgPathData(std::string const& data, std::size_t* fault = nullptr);
 
 }  // namespace tarn::engine

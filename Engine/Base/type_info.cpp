@@ -1,4 +1,4 @@
-// What ports carry, and what they make of values and loops.
+// Types of ports: names, clamping and loops.
 
 #include <Engine/Base/value.h>
 
@@ -15,7 +15,7 @@ namespace tarn::engine {
 
 namespace {
 
-// What `indexLoopCasting` takes from an empty loop.
+// The element of an empty loop.
 Value const& nullValue() {
     static detail::Immortal<Value> const null;
     return null.value;
@@ -53,7 +53,7 @@ std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural) {
     TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/value");
 }
 
-// Deliberate: the value is copied, not moved from.
+// Deliberate: the value is copied, not moved.
 Value castValueToType(Value&& value, TypeInfo const& typeInfo) {
     Value const& named = value;
     return castValueToType(named, typeInfo);

@@ -15,7 +15,7 @@ namespace tarn::engine {
 
 namespace {
 
-// Trees of no more levels are handled by plain recursion, of some hundred bytes of stack a level.
+// Trees up to this depth are handled recursively, with some hundred bytes of stack a level.
 constexpr std::uint32_t kDeepestRecursion = 256;
 
 Unstructured const& elementOf(Unstructured const& element) { return element; }
@@ -23,12 +23,12 @@ Unstructured const& elementOf(Unstructured::Map::value_type const& entry) { retu
 
 constexpr std::array<char const*, 4> kComponentKeys{"X", "Y", "Z", "W"};
 
-// At the enumerator's position.
+// Indexed by enumerator.
 constexpr std::array<std::string_view, 7> kKindNames{
     "null", "map", "array", "float", "integer", "unsigned integer", "string"};
 static_assert(kKindNames.size() == std::size_t(Unstructured::Type::String) + 1);
 
-// Component `i` of the vector that `tree` reads as.
+// Component `i` of the vector that `tree` converts to.
 double component(Unstructured const& tree, std::size_t i) {
     if (Unstructured::Map const* map = tree.ifMap()) {
         auto const entry = map->find(kComponentKeys[i]);
@@ -40,7 +40,7 @@ double component(Unstructured const& tree, std::size_t i) {
     return tree.asFloat();
 }
 
-// Numbers, the most of what arrays hold, are compared without a call.
+// Numbers, the most frequent elements, are compared without a function call.
 bool elementsEqual(Unstructured const& a, Unstructured const& b) {
     bool const numbers = a.type() == Unstructured::Type::Float && b.type() == a.type();
     return numbers ? a.asFloat() == b.asFloat() : a == b;
@@ -80,7 +80,7 @@ Unstructured& Unstructured::operator=(Unstructured const& other) {
     return *this = Unstructured(other);
 }
 Unstructured& Unstructured::operator=(Unstructured&& other) noexcept {
-    // First out of `other`, which may be this or a part of it.
+    // Moved out first: `other` may be this value or a part of it.
     Unstructured taken(std::move(other));
     if (ownsContent()) destroyContent();
     ::new (static_cast<void*>(&storage)) Storage(taken.storage);
@@ -103,7 +103,7 @@ Unstructured::Storage Unstructured::makeStorage(T&& content) {
         Unstructured const& tree = elementOf(element);
         if (tree.ownsContent()) levels = std::max(levels, tree.height());
     }
-    levels = std::max(levels, levels + 1);  // Stays at the largest there is.
+    levels = std::max(levels, levels + 1);  // Saturates.
     return new Node<T>{std::forward<T>(content), levels};
 }
 
@@ -132,8 +132,8 @@ Unstructured::Storage Unstructured::copiedContent() const {
     return storage;
 }
 
-// Deep trees are copied container by container: each is made with null in the place of its deep
-// elements, whose turn comes later. Whatever is there when memory fails is a tree, and goes.
+// Copies a deep tree container by container: each copy has null in place of its deep elements,
+// which are copied later. When an allocation fails, the copy so far is a valid tree.
 void Unstructured::copyDeep(Unstructured const& from, Unstructured& to) {
     std::vector<std::pair<Unstructured const*, Unstructured*>> waiting{{&from, &to}};
     auto const put = [&waiting](Unstructured const& element, Unstructured& place) {
@@ -164,7 +164,7 @@ void Unstructured::copyDeep(Unstructured const& from, Unstructured& to) {
     }
 }
 
-// For two containers of one kind, at least one of which is deep.
+// For two containers of the same kind, at least one of them deep.
 bool Unstructured::equalDeep(Unstructured const& a, Unstructured const& b) {
     std::vector<std::pair<Unstructured const*, Unstructured const*>> waiting{{&a, &b}};
     auto const differ = [&waiting](Unstructured const& x, Unstructured const& y) {
@@ -211,8 +211,8 @@ void Unstructured::dropLastElement() {
     }
 }
 
-// Takes every element out of a deep container without recursion, and without memory, which may be
-// short: on the way down each container's last place keeps the container above it.
+// Removes every element of a deep container without recursion and without allocating: on the way
+// down, each container's last element stores the container above it.
 void Unstructured::emptyDeep() noexcept {
     Unstructured current;
     std::swap(current.storage, storage);
@@ -317,7 +317,7 @@ Unstructured const* Unstructured::find(Steps path) const noexcept {
     return found;
 }
 
-// What is at the end of the path and of the kind, else null.
+// The value at the end of the path if it is of the kind, else null.
 Unstructured const* Unstructured::findOfKind(Steps path, bool (*isKind)(Unstructured const&),
                                              Lookup* lookup) const noexcept {
     Unstructured const* const found = find(path);

@@ -1,4 +1,4 @@
-// Engine/Base/unstructured.h: free-form data, a tree of maps, arrays, numbers and strings.
+// Engine/Base/unstructured.h: JSON-like data: a tree of maps, arrays, numbers and strings.
 //
 //     Unstructured::Map point;
 //     point["X"] = 1.5;
@@ -35,22 +35,23 @@ using EnableIfDataSource = std::enable_if_t<
 
 }  // namespace detail
 
-/// A value in the manner of JSON, with two kinds of integers and no boolean of its own (truth
-/// is the integer 1 or 0). It owns its subtree: a copy is deep, a move takes constant time, cannot
-/// fail and leaves null behind. No conversion fails: what has no meaning is zero, false or empty.
-/// A tree may be of any depth: nothing here uses more stack for a deep one. Copies and comparisons
-/// of trees of more than 256 levels allocate a list of what is still to do; destruction never does.
-/// For that a tree counts its levels when it takes a map or an array over: from then on no element
+/// A JSON-like value, with two kinds of integers and without booleans (they are the integers 1 and
+/// 0). It owns its subtree: a copy is deep; a move takes constant time, never throws and leaves
+/// null. Conversions never fail: those without a sensible result return zero, false or an empty
+/// value. A tree may be of any depth: nothing here uses more stack for a deep one. Copies and
+/// comparisons of trees of more than 256 levels allocate a work list; destruction never allocates.
+/// To know which algorithm is needed, a map or an array caches its depth when it is constructed:
+/// from then on, no element may be changed through an older reference.
 /// may be changed through a reference from before.
 ///
-/// An `Array` in braces is an element: `Array{array}` has one, `Array(array)` is the copy.
+/// In braces, an `Array` is an element: `Array{array}` has one element, `Array(array)` is a copy.
 class Unstructured {
 public:
-    /// An object, ordered by the bytes of its keys, and a list.
+    /// A JSON object, ordered by the bytes of its keys, and a JSON array.
     using Map = std::map<std::string, Unstructured>;
     using Array = std::vector<Unstructured>;
 
-    /// The kinds, numbered as the alternatives of the union.
+    /// The kinds, numbered like the alternatives of the variant.
     enum class Type : unsigned char {
         Null = 0,
         Map = 1,
@@ -61,20 +62,20 @@ public:
         String = 6,
     };
 
-    /// One step from data to a part of it: the key of a map, or the position in an array. Made
-    /// implicitly, to be written in the braces of a path: `{"render", "size", 0}`.
+    /// One step of a lookup: the key in a map or the position in an array. Converts implicitly, so
+    /// that a path is written in braces: `{"render", "size", 0}`.
     class Step {
     public:
-        /// To the element of a map with this key; a null pointer is the empty one.
+        /// The element of a map with this key; a null pointer is the empty key.
         Step(char const* mapKey) : key(mapKey == nullptr ? "" : mapKey), isKey(true) {}
         Step(std::string mapKey) : key(std::move(mapKey)), isKey(true) {}
-        /// To the element of an array at this position. A negative one is that of no element.
+        /// The element of an array at this position. A negative position never exists.
         template <class Integer, std::enable_if_t<detail::isInteger<Integer>, int> = 0>
         Step(Integer arrayPosition) : position(positionOf(arrayPosition)) {}
 
     private:
         friend class Unstructured;
-        // That of no element where it is negative, or more than can be addressed.
+        // A position that never exists where it is negative, or larger than `std::size_t`.
         template <class Integer>
         static std::size_t positionOf(Integer arrayPosition) {
             auto const result = static_cast<std::size_t>(arrayPosition);
@@ -86,16 +87,16 @@ public:
         std::size_t position = 0;
         bool isKey = false;
     };
-    /// A path of such steps, from the outside to the inside.
+    /// A path of steps, from the outside to the inside.
     using Steps = std::initializer_list<Step>;
 
-    /// What a lookup along a path found.
+    /// The result of a lookup.
     enum class Lookup : unsigned char {
-        /// Something of the kind that was asked for.
+        /// A value of the requested kind.
         Found = 0,
-        /// Nothing.
+        /// No value.
         Missing = 1,
-        /// Something of another kind, null included.
+        /// A value of another kind, null included.
         WrongKind = 2,
     };
 
@@ -112,26 +113,26 @@ public:
     TARN_API_INLINE Unstructured(long long const& integer) : storage(integer) {}
     TARN_API_INLINE Unstructured(double const& number) : storage(number) {}
     TARN_API_INLINE Unstructured(unsigned long long const& integer) : storage(integer) {}
-    /// Every other integer type, by its sign; a boolean or a character is neither.
+    /// Every other integer type, according to its sign; booleans and characters do not compile.
     template <class Integer, std::enable_if_t<detail::isOtherInteger<Integer>, int> = 0>
     Unstructured(Integer integer)
         : Unstructured(static_cast<std::conditional_t<std::is_signed_v<Integer>, long long,
                                                       unsigned long long>>(integer)) {}
-    /// As `value.asUnstructured()`.
+    /// Same as `value.asUnstructured()`.
     TARN_API Unstructured(Value const& value);
 
     template <class Source, std::enable_if_t<detail::isNoDataSource<Source>, int> = 0>
     Unstructured(Source) = delete;
     Unstructured(std::nullptr_t) = delete;
 
-    /// The whole tree, copied; or taken over in constant time, null being left behind.
+    /// Copies the whole tree; or moves it in constant time and leaves null.
     TARN_API_INLINE Unstructured(Unstructured const& other)
         : storage(other.ownsContent() ? other.copiedContent() : other.storage) {}
     TARN_API_INLINE Unstructured(Unstructured&& other) noexcept
         : storage(std::move(other.storage)) {
         other.forget();
     }
-    /// A failing allocation leaves this as it was. What is assigned may be a part of this; a whole
+    /// A failing allocation leaves this unchanged. A part of this may be assigned to it. The whole
     /// may be copied, but not moved, into a part of itself.
     TARN_API Unstructured& operator=(Unstructured const& other);
     TARN_API Unstructured& operator=(Unstructured&& other) noexcept;
@@ -139,20 +140,20 @@ public:
         if (ownsContent()) destroyContent();
     }
 
-    /// Null, by name.
+    /// The same as null.
     TARN_API_INLINE static Unstructured Undefined() { return Unstructured(); }
 
-    /// The kind of this value. Constant time.
+    /// The kind of value. Constant time.
     TARN_API_INLINE Type type() const noexcept { return Type(storage.which()); }
 
-    /// Copies of the content, empty for every other kind. `ifMap`, `ifArray` and `ifString` copy
-    /// nothing.
+    /// A copy of the content; empty for every other kind. `ifMap`, `ifArray` and `ifString` do not
+    /// copy.
     TARN_API Map asMap() const;
     TARN_API Array asArray() const;
     TARN_API std::string asString() const;
 
-    /// The signed number, or the floating-point one (towards zero and kept in range, NaN as 0, for
-    /// an integer). Deliberate: an unsigned number is an identifier and reads as 0 in both.
+    /// The signed integer, or the double (truncated towards zero and clamped; a NaN is 0).
+    /// Deliberate: an unsigned integer is an identifier and converts to 0 in both.
     TARN_API long long asInteger() const;
     TARN_API_INLINE double asFloat() const {
         if (double const* number = boost::get<double>(&storage)) return *number;
@@ -161,14 +162,14 @@ public:
         }
         return 0.0;
     }
-    /// Deliberate: every map and every array is true, empty ones included; a string when it is not
+    /// Maps and arrays are true, deliberately also empty ones; a string is true when it is not
     /// empty, a number when it is not zero.
     TARN_API bool asBool() const;
-    /// The unsigned number, the signed one's bits, or the floating-point one towards zero and
-    /// kept in range; else 0.
+    /// The unsigned integer, the signed integer's bits, or the double truncated towards zero and
+    /// clamped; else 0.
     TARN_API unsigned long long asId() const;
 
-    /// The content in place, or null for every other kind. Lives until this is assigned to,
+    /// A pointer to the content, or null for every other kind. Valid until this is assigned to,
     /// moved from or destroyed.
     TARN_API_INLINE Map const* ifMap() const { return content<Map>(); }
     TARN_API_INLINE Array const* ifArray() const { return content<Array>(); }
@@ -177,8 +178,8 @@ public:
         return text == nullptr ? nullptr : *text;
     }
 
-    /// Whether this is of that kind. A number is a floating-point or a signed one: what `asFloat`
-    /// reads, and not an identifier (an unsigned integer). Constant time.
+    /// Whether this is of that kind. A number is a double or a signed integer, as `asFloat`
+    /// converts it; an unsigned integer is an identifier. Constant time.
     bool isNull() const noexcept { return type() == Type::Null; }
     bool isMap() const noexcept { return type() == Type::Map; }
     bool isArray() const noexcept { return type() == Type::Array; }
@@ -191,17 +192,16 @@ public:
     TARN_API std::size_t size() const noexcept;
     bool empty() const noexcept { return size() == 0; }
 
-    /// The element of a map with this key, the element of an array at this position, or what a path
-    /// of both leads to; null where there is none, and for data of another kind. An empty path
-    /// leads to this itself. Lives as the content in place does. Copies nothing.
+    /// The element of a map with this key, the element of an array at this position, or the value
+    /// at the end of a path of both. Null where it does not exist, and in values of another kind.
+    /// An empty path leads to this value itself. Lifetime as for `ifMap`. Copies nothing.
     TARN_API Unstructured const* find(std::string const& key) const noexcept;
     TARN_API Unstructured const* find(std::size_t position) const noexcept;
     TARN_API Unstructured const* find(Steps path) const noexcept;
 
-    /// What is at the end of the path, or `otherwise` where it leads nowhere or to data of another
-    /// kind; `lookup`, where it is given, says which. A number is as in `isNumber`; an integer is a
-    /// signed one, or a floating-point number without a fraction that fits; a truth is the integer
-    /// 1 or 0.
+    /// The value at the end of the path, or `otherwise` where it does not exist or has another
+    /// kind; `lookup`, where given, tells which. A number is as in `isNumber`. An integer is a
+    /// signed integer, or a double without a fraction that fits. A boolean is the integer 1 or 0.
     TARN_API double numberAt(Steps path, double otherwise, Lookup* lookup = nullptr) const noexcept;
     TARN_API long long integerAt(Steps path, long long otherwise,
                                  Lookup* lookup = nullptr) const noexcept;
@@ -209,27 +209,27 @@ public:
     TARN_API std::string stringAt(Steps path, std::string otherwise,
                                   Lookup* lookup = nullptr) const;
 
-    /// A string for people, on one line, in the manner of JSON: `{"id": 7u, "size": [80.0, 50.5]}`.
-    /// Kinds can be told apart: a floating-point number has a point, an exponent or is "nan" or
-    /// "inf", an unsigned one ends in "u", null is "null". Strings are in quotes, in UTF-8: control
-    /// characters and bytes that are none stand as "\\n", "\\t", "\\r" or "\\x1f".
+    /// A JSON-like string for people, on one line: `{"id": 7u, "size": [80.0, 50.5]}`. It shows the
+    /// kinds: a double has a point, an exponent or is "nan" or "inf", an unsigned integer ends in
+    /// "u", null is "null". Strings are quoted UTF-8: control characters and invalid bytes are
+    /// written as "\\n", "\\t", "\\r" or "\\x1f".
     ///
     /// `maxDepth` levels of maps and arrays are shown; a deeper one is "{...}" or "[...]", unless
-    /// it is empty. The string has at most `maxBytes` bytes: what would be longer ends in "..."
-    /// there. The cost follows the string, not the tree; nothing recurses.
+    /// it is empty. The string has at most `maxBytes` bytes: a longer one is cut there and ends in
+    /// "...". The cost depends on the string, not on the tree. Not recursive.
     TARN_API std::string toText(std::size_t maxBytes = 4096, std::size_t maxDepth = 16) const;
 
-    /// A map is read by its keys "X", "Y", "Z" and "W", an array by position; each element
-    /// counts as its `asFloat()`, and what is missing as 0. A floating-point or signed number
-    /// fills every component. Everything else is zero. Nothing is allocated.
+    /// A map gives its values for the keys "X", "Y", "Z" and "W", an array its first elements; each
+    /// element converts as by `asFloat()`, and missing ones are 0. A double or a signed integer
+    /// fills every component. Everything else is zero. Allocates nothing.
     TARN_API operator FloatVec2() const;
     TARN_API operator FloatVec3() const;
     TARN_API operator FloatVec4() const;
 
-    /// The same kind with equal content, deeply: 1, 1u and 1.0 are three different things.
+    /// Equal kinds with equal content, compared deeply: 1, 1u and 1.0 are three different values.
     TARN_API bool operator==(Unstructured const& other) const;
     TARN_API bool operator!=(Unstructured const& other) const;
-    /// With what data is made from on the left side, as it may stand on the right.
+    /// Also with a type on the left side that converts to `Unstructured`.
     template <class Source, detail::EnableIfDataSource<Source> = 0>
     friend bool operator==(Source const& source, Unstructured const& data) {
         return data.operator==(source);
@@ -239,21 +239,21 @@ public:
         return data.operator!=(source);
     }
 
-    /// A copy of `map` without its empty maps, arrays and strings. One level deep: what is kept is
-    /// kept whole. Null and zero are not empty.
+    /// A copy of `map` without its empty maps, arrays and strings. Only the top level is filtered.
+    /// Null and zero are not empty.
     TARN_API static Map removeEmptyValues(Map const& map);
 
 private:
-    // A map or array with the number of levels from it downwards. Content never changes once it
-    // is here, so neither does the number; with it, deep trees are known before they are entered.
+    // A map or array with its depth. Neither its content nor the depth changes once it is here, so
+    // deep trees are recognised without a traversal.
     template <class T>
     struct Node {
         T content;
         std::uint32_t height;
     };
 
-    // Maps, arrays and strings are on the heap and owned: that keeps the union at two words, which
-    // arrays of numbers pay for each element, and moving it a plain copy.
+    // Maps, arrays and strings are on the heap: the variant is two words, which is what an array of
+    // numbers takes for each element, and moving it is a plain copy.
     using Storage = boost::variant<std::nullptr_t, Node<Map>*, Node<Array>*, double, long long,
                                    unsigned long long, std::string*>;
 
@@ -285,7 +285,7 @@ private:
     Unstructured* lastElement() const;
     void dropLastElement();
     void emptyDeep() noexcept;
-    // Afterwards this is null. Whoever calls it has taken the content over.
+    // Sets this to null without destroying the content, which the caller has taken over.
     void forget() noexcept { ::new (static_cast<void*>(&storage)) Storage(nullptr); }
     TARN_API Storage copiedContent() const;
     TARN_API void destroyContent() noexcept;
@@ -294,7 +294,7 @@ private:
 };
 
 /// The name of a kind, for people: "null", "map", "array", "float", "integer", "unsigned integer"
-/// or "string"; "Unstructured::Type(77)" for what is no enumerator.
+/// or "string"; "Unstructured::Type(77)" for an undefined enumerator.
 TARN_API std::string to_string(Unstructured::Type kind);
 
 /// Writes that name.

@@ -11,7 +11,7 @@ namespace tarn::engine {
 
 namespace {
 
-// Writes a tree until the text is long enough.
+// Writes a tree until the string is long enough.
 class Writer {
 public:
     Writer(std::size_t maxBytes, std::size_t maxDepth)
@@ -35,7 +35,7 @@ private:
 
     bool isFull() const { return text.size() > byteLimit; }
 
-    // To the limit, dots included, and not inside a character.
+    // Cuts the string to the limit, dots included, at a character boundary.
     void cut() {
         constexpr std::string_view kDots = "...";
         std::size_t length = byteLimit - std::min(byteLimit, kDots.size());
@@ -44,7 +44,7 @@ private:
         text += kDots.substr(0, byteLimit);
     }
 
-    // The next element of the innermost level, or its end.
+    // Writes the next element of the innermost level, or closes it.
     void step() {
         Level& level = open.back();
         bool const isFirst = text.back() == '{' || text.back() == '[';

@@ -26,8 +26,8 @@ namespace tarn::engine {
 
 namespace {
 
-// Programs that sort reports of failed assertions know this one by its whole message, the line
-// included: it stays, wherever the check moves.
+// This assertion message always ends in line 161, wherever the check moves, because crash reports
+// are grouped by the whole message.
 constexpr int kResourceTypeLine = 161;
 
 constexpr FloatMat4 FloatMat4Identity{{1, 0, 0, 0,  //
@@ -35,13 +35,13 @@ constexpr FloatMat4 FloatMat4Identity{{1, 0, 0, 0,  //
                                        0, 0, 1, 0,  //
                                        0, 0, 0, 1}};
 
-// The types and their names, at the enumerator's position.
+// Names indexed by enumerator.
 constexpr std::array<std::string_view, 14> kTypeNames{
     "float", "vec2",  "vec3",  "vec4", "mat4",   "boolean", "int",
     "image", "video", "sound", "path", "string", "model",   "unstructured"};
 static_assert(kTypeNames.size() == std::size_t(Type::Unstructured) + 1);
 
-// A set of types as bits; a byte that is no enumerator is in no set.
+// A set of types as bits. Undefined enumerators are in no set.
 constexpr unsigned setOf(std::initializer_list<Type> types) {
     unsigned bits = 0;
     for (Type const type : types) bits |= 1u << unsigned(type);
@@ -59,14 +59,14 @@ bool hasElements(std::shared_ptr<Path const> const& path) {
     return path && !path->elements.empty();
 }
 
-// The number that the whole text is, else whether there is any text.
+// The number that the whole string represents; otherwise 1, and 0 for an empty string.
 double numberFromString(std::shared_ptr<std::string const> const& text) {
     if (!text) return 0.0;
     int const errorBefore = errno;
     char* parsedTo = nullptr;
     double const number = std::strtod(text->c_str(), &parsedTo);
     errno = errorBefore;
-    // The whole of the empty text is 0.
+    // For the empty string this is 0: all of nothing was parsed.
     return parsedTo == text->c_str() + text->size() ? number : 1.0;
 }
 
@@ -272,7 +272,7 @@ private:
     std::string& text;
 };
 
-// Deliberate: 0.0 and -0.0 differ, and a NaN equals its own bits.
+// Deliberate: 0.0 and -0.0 differ, and a NaN equals itself.
 bool payloadsEqual(FloatMat4 const& a, FloatMat4 const& b) {
     // NOLINTNEXTLINE(bugprone-suspicious-memory-comparison,cert-exp42-c,cert-flp37-c)
     return std::memcmp(&a, &b, sizeof(FloatMat4)) == 0;
@@ -294,7 +294,7 @@ std::uint64_t combine(std::uint64_t seed, std::uint64_t word) {
     return seed;
 }
 
-// Equal for equal numbers, the two zeros included.
+// Equal for equal numbers, so for both zeros.
 std::uint64_t wordOf(double d) {
     std::uint64_t word = 0;
     if (d != 0.0) std::memcpy(&word, &d, sizeof word);
@@ -356,7 +356,7 @@ struct HashOf : boost::static_visitor<std::uint64_t> {
 private:
     static std::uint64_t ofText(std::string const& text) { return std::hash<std::string>()(text); }
 
-    // By itself, without what a map or an array has: data may be of any depth.
+    // Without the elements of a map or an array: data may be of any depth.
     static std::uint64_t ofElement(Unstructured const& element) {
         std::uint64_t content = element.asId();
         if (auto const* map = element.ifMap()) content = map->size();
@@ -367,7 +367,7 @@ private:
     }
 };
 
-// What an alternative points to, itself or shared; nothing where another one is held.
+// A pointer to the payload, plain or shared; null where the value has another type.
 template <class T>
 T const* inside(std::shared_ptr<T const> const* held) {
     return held != nullptr ? held->get() : nullptr;
@@ -602,6 +602,6 @@ std::hash<tarn::engine::Value>::operator()(tarn::engine::Value const& value) con
     using namespace tarn::engine;
     std::uint64_t const all = combine(std::uint64_t(value.storage.which()),
                                       boost::apply_visitor(HashOf(), value.storage));
-    // The lower half of a double is often zero, and may be all that is kept.
+    // The lower half of a double is often zero, and `std::size_t` may have only 32 bits.
     return static_cast<std::size_t>(all ^ all >> 32);
 }

@@ -1,4 +1,4 @@
-// Engine/Base/value.h: the values that travel along connections, and the ports that take them.
+// Engine/Base/value.h: the values on connections, and the types of ports.
 //
 //     Value radius = 2.5;
 //     double r = radius;                          // 2.5
@@ -29,15 +29,15 @@
 #include <utility>
 #include <vector>
 
-/// The vocabulary that the evaluator, the renderer and the editor share.
+/// The data types that evaluator, renderer and editor share.
 namespace tarn::engine {
 
 struct Path;
 class Unstructured;
 
-/// The closed set of value types. The numbers are persisted and index tables; they are not the
-/// order of the alternatives inside a `Value`. A pulse is a `Boolean` port and a layer an
-/// `Unstructured` port that `TypeInfo::subtype` marks.
+/// The value types. Documents store the numbers, and tables are indexed by them; the alternatives
+/// inside a `Value` have another order. `TypeInfo::subtype` marks a `Boolean` port as a pulse and
+/// an `Unstructured` port as a layer.
 enum class Type : unsigned char {
     Float = 0,
     Vec2 = 1,
@@ -55,7 +55,7 @@ enum class Type : unsigned char {
     Unstructured = 13,
 };
 
-/// Two doubles. Equality is the floating-point one: a NaN is unequal to itself, and 0.0 equals
+/// Two doubles, compared as floating-point numbers: a NaN is unequal to itself, and 0.0 equals
 /// -0.0.
 struct FloatVec2 {
     /// The components.
@@ -69,7 +69,7 @@ struct FloatVec2 {
     friend constexpr bool operator!=(FloatVec2 const& a, FloatVec2 const& b) { return !(a == b); }
 };
 
-/// Three doubles, compared like two.
+/// Three doubles, compared likewise.
 struct FloatVec3 {
     /// The components.
     double x = 0.0;
@@ -84,9 +84,9 @@ struct FloatVec3 {
     friend constexpr bool operator!=(FloatVec3 const& a, FloatVec3 const& b) { return !(a == b); }
 };
 
-/// Four doubles, compared like two.
+/// Four doubles, compared likewise.
 struct FloatVec4 {
-    /// The components; of a colour red, green, blue and opacity, from 0 to 1.
+    /// The components. For a colour: red, green, blue and opacity, from 0 to 1.
     double x = 0.0;
     double y = 0.0;
     double z = 0.0;
@@ -100,52 +100,53 @@ struct FloatVec4 {
     friend constexpr bool operator!=(FloatVec4 const& a, FloatVec4 const& b) { return !(a == b); }
 };
 
-/// A 4x4 matrix in one run, zero unless given; the identity has 1.0 at positions 0, 5, 10 and 15.
-/// Rows or columns first is the reader's convention. It has no equality of its own: a `Value`
-/// compares matrices by their bytes, and one meaning of `==` is enough.
+/// A 4x4 matrix, all zero by default; the identity has 1.0 at the indices 0, 5, 10 and 15. Whether
+/// rows or columns come first is the user's convention. It has no `==`: a `Value` compares matrices
+/// by their bytes, and a second meaning would confuse.
 struct FloatMat4 {
-    /// Row by row or column by column, as the reader has it.
+    /// Row by row or column by column, by the user's convention.
     double elements[16] = {};
 };
 static_assert(sizeof(FloatMat4) == 128, "sixteen doubles and nothing else");
 
-/// The name that documents store, "float" to "unstructured". An enumerator out of range is an
-/// assertion failure.
+/// The name in documents, "float" to "unstructured". An undefined enumerator is an assertion
+/// failure.
 TARN_API std::string typeToString(Type type);
 
-/// The inverse of `typeToString`, byte by byte; empty for any other string.
+/// The inverse of `typeToString`, compared byte by byte; empty for any other string.
 TARN_API Optional<Type> stringToType(std::string const& name);
 
-/// True for images, videos, sounds and models; false for any byte that is no enumerator.
+/// True for images, videos, sounds and models; false for undefined enumerators.
 TARN_API bool typeIsResource(Type type);
 
-/// Whether the value that flowed along a deleted connection is copied across to the input: true
-/// but for paths, models and unstructured data; false for any byte that is no enumerator.
+/// Whether the input keeps the value of a connection that is deleted: true except for paths, models
+/// and unstructured data; false for undefined enumerators.
 TARN_API bool typeShouldCopyAcrossDeletedConnections(Type type);
 
-/// One value of one of the fourteen types. Numbers, vectors, booleans and identifiers are held
-/// inline; a matrix, a path, a tree or a string is allocated once, never changed afterwards, and
+/// A value of one of the fourteen types. Numbers, vectors, booleans and identifiers are stored
+/// inline. A matrix, a path, a tree or a string is allocated once, never changed afterwards, and
 /// shared by every copy. A copy costs at most one reference count and never fails.
 ///
-/// Every value converts to every type, without failing: a conversion without a meaning is zero,
-/// false, the identity matrix or the empty path. A value that was moved from, or made from a null
-/// pointer, may hold a null payload; it reads as neutral and equals only another null of its
-/// alternative.
+/// Conversions never fail: those without a sensible result return zero, false, the identity matrix
+/// or the empty path. A value that was moved from, or made from a null pointer, may hold a null
+/// payload. It converts to zero and equals only another null of its type.
 ///
-/// Distinct values may be used on distinct threads, copies of one value included.
+/// Thread-safe as the types of the standard library are: copies that share a payload may be used in
+/// different threads.
 class Value {
 public:
-    /// A resource by its number; 0 is no resource. Four types, so that an image is never a video.
+    /// The identifier of a resource; 0 is no resource. A type for each kind, so that an image is
+    /// never a video.
     template <Type resource>
     struct ResourceID {
-        /// The resource's number; 0 is none.
+        /// The identifier; 0 is none.
         unsigned long long id = 0;
 
-        /// The same kind and the same number.
+        /// The same identifier. (Different kinds do not compare.)
         friend constexpr bool operator==(ResourceID a, ResourceID b) { return a.id == b.id; }
         friend constexpr bool operator!=(ResourceID a, ResourceID b) { return a.id != b.id; }
     };
-    /// One for each kind of resource.
+    /// The four kinds of resources.
     using ImageID = ResourceID<Type::Image>;
     using VideoID = ResourceID<Type::Video>;
     using SoundID = ResourceID<Type::Sound>;
@@ -155,7 +156,7 @@ public:
     TARN_API_INLINE Value() noexcept : storage(0.0) {}
     TARN_API_INLINE Value(double number) noexcept : storage(number) {}
     TARN_API_INLINE Value(long long integer) noexcept : storage(integer) {}
-    /// Every other signed integer type; `char` is not one.
+    /// Every other signed integer type; `char` does not compile.
     template <class Integer, std::enable_if_t<detail::isSignedInteger<Integer>, int> = 0>
     Value(Integer integer) noexcept : Value(static_cast<long long>(integer)) {}
     TARN_API_INLINE Value(bool truth) noexcept : storage(truth) {}
@@ -167,48 +168,49 @@ public:
     TARN_API Value(char const* text);
     TARN_API Value(std::string text);
     TARN_API Value(Path path);
-    /// Shares the path; nothing is copied.
+    /// Shares the path without copying it.
     TARN_API Value(std::shared_ptr<Path const> path) noexcept;
     TARN_API Value(Unstructured tree);
-    /// Shares the data; nothing is copied. An aliasing pointer makes an element of a large document
-    /// a value: `std::shared_ptr<Unstructured const>(document, &element)`. The whole lives as long.
+    /// Shares the tree without copying it. An aliasing pointer makes an element of a large document
+    /// a value and keeps the whole document alive: `std::shared_ptr<Unstructured const>(document,
+    /// &element)`.
     TARN_API Value(std::shared_ptr<Unstructured const> tree) noexcept;
-    /// The resource `id`. A `type` that is no resource is an assertion failure.
+    /// The resource `id`. A `type` that is not a resource is an assertion failure.
     TARN_API Value(unsigned long long id, Type type);
 
-    /// An unsigned number needs its `Type`; a character, a pointer or null would convert to `bool`.
+    /// Deleted: an unsigned integer needs a `Type`, and the others would convert to `bool`.
     template <class Source, std::enable_if_t<detail::isNoValueSource<Source>, int> = 0>
     Value(Source) = delete;
     Value(std::nullptr_t) = delete;
 
-    /// Shares the payload of `other`, or takes it over. Neither allocates.
+    /// Shares or moves the payload of `other`. Neither allocates.
     Value(Value const& other) noexcept = default;
     Value(Value&& other) noexcept = default;
     Value& operator=(Value const& other) noexcept = default;
     Value& operator=(Value&& other) noexcept = default;
     ~Value() = default;
 
-    /// As the constructor of the same type.
+    /// Same as the constructor with that type.
     TARN_API static Value Image(unsigned long long id);
     TARN_API static Value Video(unsigned long long id);
     TARN_API static Value Sound(unsigned long long id);
     TARN_API static Value Model(unsigned long long id);
 
-    /// What a fresh port of `type` starts with: zero, false, the identity matrix, identifier 0, an
-    /// empty path or string, null data. `qualifier` 4 makes a `Vec4` start as (0, 0, 0, 1), an
-    /// opaque black, and changes nothing else. An enumerator out of range is an assertion failure.
+    /// The value of a new port of `type`: zero, false, the identity matrix, identifier 0, an empty
+    /// path or string, null data. With `qualifier` 4 a `Vec4` is (0, 0, 0, 1), opaque black; other
+    /// types ignore it. An undefined enumerator is an assertion failure.
     TARN_API static Value defaultValue(Type type);
     TARN_API static Value defaultValue(Type type, unsigned char qualifier);
 
-    /// The type of what the value holds. Constant time, a few instructions.
+    /// The type of the value. Constant time, a few instructions.
     TARN_API_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
 
-    /// Conversions to scalars; none allocates. A vector reads as its x, and as true when any
-    /// component is not zero; an identifier reads as 1, or 0 for identifier 0; a path as whether it
-    /// has elements; a matrix as zero. Data reads its floating-point or signed number, else zero,
-    /// and its truth is `Unstructured::asBool`. A string is the number that `strtod` reads from all
-    /// of it, else 1, and 0 when it is empty; its truth is not being empty. A double becomes an
-    /// integer towards zero, kept in range, and 0 for a NaN.
+    /// Conversions to scalars; none allocates. A vector converts to its x, and to true when a
+    /// component is not zero. An identifier is 1, or 0 for identifier 0. A path is whether it has
+    /// elements. A matrix is zero. Unstructured data converts as by `asFloat` and `asInteger`, and
+    /// to `bool` as by `asBool`. A string is the number that `strtod` parses from all of it, else
+    /// 1, and 0 when it is empty; it is true when it is not empty. A double becomes an integer by
+    /// truncation towards zero, clamped to the range, and 0 for a NaN.
     TARN_API operator long long() const noexcept;
     TARN_API_INLINE TARN_FLATTEN operator double() const noexcept {
         if (TARN_LIKELY(storage.which() == kFloat)) {
@@ -217,69 +219,70 @@ public:
         return readDouble();
     }
     TARN_API operator bool() const noexcept;
-    /// The identifier: a resource's, or that of data (`Unstructured::asId`); else 0.
+    /// The identifier of a resource, or of unstructured data (`Unstructured::asId`); else 0.
     TARN_API operator unsigned long long() const noexcept;
-    /// As `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
+    /// Same as `long long` or `unsigned long long`, for the other 64-bit types (`std::int64_t`).
     template <class Integer, std::enable_if_t<detail::isWideInteger<Integer>, int> = 0>
     operator Integer() const noexcept {
         using Reading =
             std::conditional_t<std::is_signed_v<Integer>, long long, unsigned long long>;
         return static_cast<Integer>(operator Reading());
     }
-    /// `int(value)` would be a promoted `bool`: convert to a `long long` and narrow that.
+    /// Deleted: `int(value)` would be a promoted `bool`. Convert to `long long` and narrow that.
     template <class Narrow, std::enable_if_t<detail::isNarrowNumber<Narrow>, int> = 0>
     operator Narrow() const = delete;
 
-    /// Would be the element of the array at the value's integer.
+    /// Deleted: `value[pointer]` would be an element of an array.
     template <class T>
     void operator[](T const*) const = delete;
 
     /// Conversions to vectors, written `FloatVec2 v = value` or `FloatVec2(value)`; braces would
-    /// fill the record's first number and nothing else. None allocates. A number or boolean fills
-    /// every component, a shorter vector is filled up with zeros and a longer one cut; data reads
-    /// as `Unstructured` says; everything else is zero.
+    /// set only the first component. None allocates. A number or boolean fills every component; a
+    /// shorter vector is padded with zeros and a longer one truncated; unstructured data converts
+    /// as described in `Unstructured`; everything else is zero.
     TARN_API operator FloatVec2() const noexcept;
     TARN_API operator FloatVec3() const noexcept;
     TARN_API operator FloatVec4() const noexcept;
-    /// The matrix held, else the identity.
+    /// The matrix; the identity for every other type.
     TARN_API operator FloatMat4() const noexcept;
-    /// A copy of the path held, else the empty path. Linear; `ifPath` copies nothing. Its callers
-    /// include path.h, as those of `asUnstructured` include unstructured.h.
+    /// A copy of the path, or the empty path for every other type. Linear; `ifPath` does not copy.
+    /// Callers include path.h, as callers of `asUnstructured` include unstructured.h.
     TARN_API operator Path() const;
-    /// As `to_string`, but "??" for data that is no string. Made, not assigned: `s = value` does
-    /// not compile, since a string is assigned a character too; `s = std::string(value)` does.
+    /// Same as `to_string`, but "??" for unstructured data that is not a string. `s = value` does
+    /// not compile, since a string can also be assigned a character; write `s =
+    /// std::string(value)`.
     TARN_API operator std::string() const;
-    /// The data of this value: numbers, strings and trees as they are, a boolean as the integer
-    /// 1 or 0, a vector as a map of "X", "Y", "Z", "W"; everything else is null.
+    /// The value as unstructured data: numbers, strings and trees unchanged, a boolean as the
+    /// integer 1 or 0, a vector as a map with "X", "Y", "Z", "W"; everything else is null.
     TARN_API Unstructured asUnstructured() const;
 
-    /// The payload inside the value, or null where the value holds another alternative or a null
-    /// payload. Lives until the value is assigned to or destroyed. Copies nothing.
+    /// A pointer to the payload, or null where the value has another type or a null payload. Valid
+    /// until the value is assigned to or destroyed. Copies nothing.
     TARN_API FloatMat4 const* asFloatMat4() const noexcept;
     TARN_API Path const* ifPath() const noexcept;
     TARN_API std::string const* ifString() const noexcept;
     TARN_API Unstructured const* ifUnstructured() const noexcept;
 
-    /// The payload, shared: the pointer that every copy of the value holds, or null as above. Costs
-    /// one reference count, and keeps the payload for as long as it is held.
+    /// The shared payload: the pointer that every copy of the value holds, or null as above. Costs
+    /// one reference count, and keeps the payload alive.
     TARN_API std::shared_ptr<FloatMat4 const> sharedFloatMat4() const noexcept;
     TARN_API std::shared_ptr<Path const> sharedPath() const noexcept;
     TARN_API std::shared_ptr<std::string const> sharedString() const noexcept;
     TARN_API std::shared_ptr<Unstructured const> sharedUnstructured() const noexcept;
 
-    /// What the visitor gives for what the value holds, as a reference to const: a `long long`, a
-    /// `double`, a vector, a `FloatMat4`, a `bool`, a `ResourceID`, a `Path`, an `Unstructured` or
-    /// a `std::string`. A null payload is the identity matrix, the empty path, null data or the
-    /// empty string. Every call has to have the same type of result.
+    /// Calls the visitor with the content as a reference to const: a `long long`, a `double`, a
+    /// vector, a `FloatMat4`, a `bool`, a `ResourceID`, a `Path`, an `Unstructured` or a
+    /// `std::string`. A null payload is the identity matrix, the empty path, null data or the empty
+    /// string. The visitor must return the same type for each of them.
     template <class Visitor>
     decltype(auto) visit(Visitor&& visitor) const;
 
-    /// A value of exactly `type`, made by the matching conversion with a payload of its own, even
-    /// when this value has that type already. An enumerator out of range is an assertion failure.
+    /// Converts to exactly `type`. The result has its own payload, even when this value already has
+    /// that type. An undefined enumerator is an assertion failure.
     TARN_API Value asType(Type type) const;
 
-    /// The same alternative with equal content: 1 and 1.0 differ. Doubles and vectors compare as
-    /// floating-point numbers do, matrices by their bytes, and payloads deeply unless shared.
+    /// The same type with equal content: 1 and 1.0 differ. Doubles and vectors compare as
+    /// floating-point numbers, matrices by their bytes, and payloads deeply unless they are shared.
     TARN_API_INLINE TARN_FLATTEN bool operator==(Value const& other) const {
         if (storage.which() != other.storage.which()) return false;
         if (storage.which() != kFloat) return contentEquals(other);
@@ -298,24 +301,24 @@ private:
                        std::shared_ptr<FloatMat4 const>, bool, ImageID, VideoID, SoundID, ModelID,
                        std::shared_ptr<Path const>, std::shared_ptr<Unstructured const>,
                        std::shared_ptr<std::string const>>;
-    // By alternative: the only place where the two numberings meet.
+    // Indexed by alternative: the only place that relates the two orders.
     static constexpr Type kTypes[] = {Type::Int,          Type::Float, Type::Vec2,    Type::Vec3,
                                       Type::Vec4,         Type::Mat4,  Type::Boolean, Type::Image,
                                       Type::Video,        Type::Sound, Type::Model,   Type::Path,
                                       Type::Unstructured, Type::String};
 
-    // Most values are numbers: they are looked for first.
+    // Most values are floats: they are tested first.
     static constexpr int kFloat = 1;
     static_assert(kTypes[kFloat] == Type::Float);
 
     TARN_API double readDouble() const noexcept;
-    // For values of the same alternative.
+    // For two values of the same type.
     TARN_API bool contentEquals(Value const& other) const;
 
     Storage storage;
 };
 
-/// The tag of a native type. Other types than these do not compile.
+/// The `Type` of a C++ type. Types other than these do not compile.
 template <class T>
 constexpr Type TarnType() = delete;
 template <>
@@ -366,8 +369,9 @@ static_assert(std::is_nothrow_move_constructible_v<Value>, "loops move when they
 
 }  // namespace tarn::engine
 
-/// Equal values have equal hashes; a NaN has one too. Linear in a path and a string; of data the
-/// first level counts. The number may be another one in each process, version and platform.
+/// Equal values have equal hashes; a NaN has a hash too. Linear in a path or string; of
+/// unstructured data only the first level counts. The hash may differ between processes, versions
+/// and platforms.
 template <>
 struct std::hash<tarn::engine::Value> {
     TARN_API std::size_t operator()(tarn::engine::Value const& value) const noexcept;
@@ -375,23 +379,23 @@ struct std::hash<tarn::engine::Value> {
 
 namespace tarn::engine {
 
-/// The string that an editor shows; not made to be parsed. Numbers have two decimals, or one from
-/// 1000 on, without trailing zeros: 2.5, 1234.6, 3; or they are "nan" or "inf", behind "-" where
-/// the sign is set. They are rounded as the rounding mode says, and cut after 127 characters.
-/// Components of a vector are joined by ", ", and a matrix is four lines of four. Truth is "1" or
-/// "0", an identifier its number, a path "Path" or "Empty Path", data "unstructured" unless it is a
-/// string. The decimal point that is trimmed is that of `std::cout`'s locale at the call; nobody
-/// may change that locale meanwhile.
+/// The string that an editor shows; not meant to be parsed. Numbers have two decimals, or one from
+/// 1000 on, without trailing zeros: 2.5, 1234.6, 3. Non-finite ones are "nan" or "inf", with "-"
+/// where the sign is set. The rounding mode of the process applies; numbers are cut after 127
+/// characters. Components of a vector are joined by ", ", and a matrix is four lines of four. A
+/// boolean is "1" or "0", an identifier its number, a path "Path" or "Empty Path", unstructured
+/// data "unstructured" unless it is a string. The decimal point that is trimmed is that of
+/// `std::cout`'s locale at the time of the call; no other thread may change that locale meanwhile.
 TARN_API std::string to_string(Value const& value);
 
-/// Appends `to_string(value)` to `text`. Numbers and vectors of them need no string of their own:
-/// where `text` has room, nothing is allocated. A failing allocation leaves `text` as it was, or
-/// with the first components of a vector or a matrix.
+/// Appends `to_string(value)` to `text`. For numbers and vectors nothing is allocated where the
+/// capacity of `text` suffices. A failing allocation leaves `text` unchanged, or with the first
+/// components of a vector or a matrix.
 TARN_API void appendText(std::string& text, Value const& value);
 
 namespace detail {
 
-/// The kinds that convert to or from a `Value`.
+/// Types that convert to or from a `Value`.
 template <class T>
 constexpr bool isComparedByReading =
     !std::is_convertible_v<T*, Value const*> &&
@@ -399,7 +403,7 @@ constexpr bool isComparedByReading =
      isOneOf<T, FloatVec2, FloatVec3, FloatVec4, FloatMat4, Path, std::shared_ptr<Path const>,
              Unstructured, std::shared_ptr<Unstructured const>>);
 
-// `V` is deduced, so that only a `Value` itself is meant and nothing that converts to one.
+// `V` is deduced, so that only a `Value` matches and nothing that converts to one.
 template <class V, class Other>
 using EnableIfMixed = std::enable_if_t<std::is_same_v<V, Value> && isComparedByReading<Other>, int>;
 template <class V>
@@ -407,8 +411,7 @@ using EnableIfValue = std::enable_if_t<std::is_convertible_v<V*, Value const*>, 
 
 }  // namespace detail
 
-/// A value is compared with a value: whether the other side becomes one, or this one is read as
-/// the other kind, is for the caller to write.
+/// Deleted: compare values with values. Convert one of the two sides explicitly.
 template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
 bool operator==(V const&, Other const&) = delete;
 template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
@@ -418,8 +421,8 @@ bool operator!=(V const&, Other const&) = delete;
 template <class V, class Other, detail::EnableIfMixed<V, Other> = 0>
 bool operator!=(Other const&, V const&) = delete;
 
-/// A value beside a pointer or a string literal would be pointer arithmetic: `"x" +
-/// std::string(value)` joins them. (`array[value]` cannot be refused: it is the element at the
+/// Deleted: with a pointer or a string literal this would be pointer arithmetic. `"x" +
+/// std::string(value)` concatenates. (`array[value]` still compiles: it is the element at the
 /// value's integer.)
 template <class T, class V, detail::EnableIfValue<V> = 0>
 void operator+(T const*, V const&) = delete;
@@ -434,74 +437,74 @@ void operator+=(T*&, V const&) = delete;
 template <class T, class V, detail::EnableIfValue<V> = 0>
 void operator-=(T*&, V const&) = delete;
 
-/// A list of values; indices wrap around it (`indexLoopCasting`).
+/// A list of values; `indexLoopCasting` wraps indices around.
 using Loop = std::vector<Value>;
 
-/// What a port carries, and the bounds of what it takes.
+/// What a port carries: the type and the bounds of its values.
 struct TypeInfo {
     /// The type of the port's values.
     Type type = Type::Float;
     /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
     unsigned char subtype = 0;
-    /// Bounds, both inclusive, of a `Float` port; other ports are never clamped.
+    /// Inclusive bounds of a `Float` port; values of other ports are never clamped.
     Optional<Value> min = {};
     Optional<Value> max = {};
-    /// Carried, copied and compared; this library reads nothing into it.
+    /// Carried, copied and compared; this library does not interpret it.
     Optional<Value> extra = {};
 
-    /// Field by field.
+    /// Compares every field.
     TARN_API bool operator==(TypeInfo const& other) const;
     TARN_API bool operator!=(TypeInfo const& other) const;
 };
 
-/// The name of a port of this kind, such as "Number" or, where `plural`, "Numbers". Only `type` and
-/// `subtype` matter. An enumerator out of range is an assertion failure.
+/// The name of a port of this type, such as "Number" or, where `plural`, "Numbers". Only `type` and
+/// `subtype` matter. An undefined enumerator is an assertion failure.
 TARN_API std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural);
 
-/// `value`, or the bound that it lies beyond where the port is a `Float` port: `min` is tested
-/// first, a NaN passes, and what is returned keeps its own alternative. Copies nothing: the result
-/// refers into one of the arguments and lives no longer than both.
+/// `value`, clamped to the bounds of a `Float` port. `min` is tested first, a NaN passes, and a
+/// bound is returned with its own type. Copies nothing: the result refers to one of the arguments
+/// and must not outlive them.
 TARN_API_INLINE inline Value const& castValueToType(Value const& value,
                                                     TypeInfo const& typeInfo) noexcept;
 
-/// The same decision, as a copy of the value chosen.
+/// The same result as a copy.
 TARN_API Value castValueToType(Value&& value, TypeInfo const& typeInfo);
 
-/// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as
-/// one element, 0.0. Constant time, copies nothing: the result refers into `loop`, `typeInfo` or
-/// a value that lives to program exit.
+/// The element at `index`, wrapped around the loop, cast to the port. An empty loop counts as one
+/// element, 0.0. Constant time, copies nothing: the result refers to `loop`, to `typeInfo` or to a
+/// value that lives until the program ends.
 TARN_API_INLINE inline Value const& indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo,
                                                      unsigned long long index) noexcept;
 
-/// The same for a range of indices: `results[i]` becomes the address of `indexLoopCasting(loop,
-/// typeInfo, first + i)`, for each `i` below `count`; the sum wraps around at 2^64. One division
-/// each time that the loop begins again.
+/// The same for a range of indices: for each `i` below `count`, `results[i]` becomes the address of
+/// `indexLoopCasting(loop, typeInfo, first + i)`; the sum wraps around at 2^64. Needs only one
+/// division for each pass over the loop.
 TARN_API void indexLoopCasting(Loop const& loop, TypeInfo const& typeInfo, unsigned long long first,
                                std::size_t count, Value const** results) noexcept;
 
-/// The empty loop that everyone shares; lives to program exit.
+/// The empty loop that everyone shares; lives until the program ends.
 TARN_API Loop const& nullLoop();
 
 /// Writes `to_string(value)`.
 TARN_API std::ostream& operator<<(std::ostream& stream, Value const& value);
 
-/// Writes the name of the type, "float" to "unstructured"; "Type(77)" for what is no enumerator.
+/// Writes the name, "float" to "unstructured", or "Type(77)" for an undefined enumerator.
 TARN_API std::ostream& operator<<(std::ostream& stream, Type type);
 
-/// Writes the type alone: "[type: float]".
+/// Writes only the type: "[type: float]".
 TARN_API std::ostream& operator<<(std::ostream& stream, TypeInfo const& typeInfo);
 
 // Implementation
 
 namespace detail {
 
-// `value`, or the bound of the port that it lies beyond.
+// `value`, or the bound of the port that it exceeds.
 Value const& clamped(Value const& value, TypeInfo const& typeInfo) noexcept;
 
-// What an empty loop counts as, cast to the port.
+// The element of an empty loop, cast to the port.
 TARN_API Value const& castNullValue(TypeInfo const& typeInfo) noexcept;
 
-// What a visitor is shown in the place of a null payload.
+// The matrix that a visitor gets for a null payload.
 TARN_API FloatMat4 const& neutralMatrix() noexcept;
 TARN_API Path const& neutralPath() noexcept;
 TARN_API Unstructured const& neutralData() noexcept;

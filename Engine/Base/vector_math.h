@@ -1,4 +1,4 @@
-// Engine/Base/vector_math.h: sums and multiples of vectors.
+// Engine/Base/vector_math.h: arithmetic operators of vectors.
 //
 //     FloatVec2 middle = (FloatVec2{0, 2} + FloatVec2{4, 4}) / 2.0;  // (2, 3)
 
@@ -16,7 +16,7 @@ namespace detail {
 template <class V>
 constexpr bool isVector = isOneOf<V, FloatVec2, FloatVec3, FloatVec4>;
 
-// `V` is deduced, so that nothing is converted to a vector to take part.
+// `V` is deduced, so that operands are never converted to a vector.
 template <class V>
 using EnableIfVector = std::enable_if_t<isVector<V>, int>;
 template <class V, class Number>
@@ -24,7 +24,7 @@ using EnableIfScaling =
     std::enable_if_t<isVector<V> && std::is_arithmetic_v<Number> && !std::is_same_v<Number, bool>,
                      int>;
 
-// A vector of what `function` gives for each component of `a` and `b`.
+// A vector with the result of `function` for each component of `a` and `b`.
 template <class Function>
 constexpr FloatVec2 eachOf(FloatVec2 const& a, FloatVec2 const& b, Function function) {
     return {function(a.x, b.x), function(a.y, b.y)};
@@ -40,7 +40,7 @@ constexpr FloatVec4 eachOf(FloatVec4 const& a, FloatVec4 const& b, Function func
 
 }  // namespace detail
 
-/// Component by component. Both are vectors of one size.
+/// Component by component. Both operands have the same size.
 template <class V, detail::EnableIfVector<V> = 0>
 constexpr V operator+(V const& a, V const& b) {
     return detail::eachOf(a, b, [](double x, double y) { return x + y; });
@@ -54,9 +54,9 @@ constexpr V operator-(V const& a) {
     return detail::eachOf(a, a, [](double x, double) { return -x; });
 }
 
-/// Every component times the number, or divided by it: each is divided itself, so that the last bit
-/// is that of a division. The number may be of any arithmetic type but `bool`, and is taken as a
-/// double.
+/// Multiplies or divides every component by the number. A division is not a multiplication by the
+/// reciprocal, so the last bit is that of a division. The number may have any arithmetic type
+/// except `bool`, and is converted to a double.
 template <class V, class Number, detail::EnableIfScaling<V, Number> = 0>
 constexpr V operator*(V const& a, Number factor) {
     auto const f = static_cast<double>(factor);
@@ -73,7 +73,7 @@ constexpr V operator/(V const& a, Number divisor) {
     return detail::eachOf(a, a, [d](double x, double) { return x / d; });
 }
 
-/// As the operators above, in place.
+/// The operators above, in place.
 template <class V, detail::EnableIfVector<V> = 0>
 constexpr V& operator+=(V& a, V const& b) {
     return a = a + b;

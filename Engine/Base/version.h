@@ -1,11 +1,11 @@
-// Engine/Base/version.h: which version these headers are of.
+// Engine/Base/version.h: the version of these headers.
 //
 //     static_assert(TARN_ENGINE_BASE_VERSION >= 10100, "needs Tarn Engine Base 1.1");
 
 #ifndef TARN_ENGINE_BASE_VERSION_H
 #define TARN_ENGINE_BASE_VERSION_H
 
-/// The version, as semantic versioning counts it. The build files read it here.
+/// The semantic version. The build files read it here.
 #define TARN_ENGINE_BASE_VERSION_MAJOR 1
 #define TARN_ENGINE_BASE_VERSION_MINOR 1
 #define TARN_ENGINE_BASE_VERSION_PATCH 0

@@ -1,13 +1,13 @@
-// Engine/Document/export.h: the mark of what the library shows to its callers.
+// Engine/Document/export.h: the macro that exports functions.
 //
 //     TARN_DOCUMENT_API std::string writeDocument(Patch const& root);
 
 #ifndef TARN_ENGINE_DOCUMENT_EXPORT_H
 #define TARN_ENGINE_DOCUMENT_EXPORT_H
 
-/// `TARN_DOCUMENT_API` is put before every public function. It is to this library what
-/// `TARN_API` is to the base library; so are `TARN_ENGINE_DOCUMENT_BUILDING` and
-/// `TARN_ENGINE_DOCUMENT_STATIC`.
+/// `TARN_DOCUMENT_API` exports a public function, `TARN_ENGINE_DOCUMENT_BUILDING` and
+/// `TARN_ENGINE_DOCUMENT_STATIC` tell how the library is built: the same as `TARN_API`,
+/// `TARN_ENGINE_BASE_BUILDING` and `TARN_ENGINE_BASE_STATIC` of the base library.
 #if defined(TARN_ENGINE_DOCUMENT_STATIC)
 #define TARN_DOCUMENT_API
 #elif defined(_WIN32) && defined(TARN_ENGINE_DOCUMENT_BUILDING)

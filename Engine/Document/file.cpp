@@ -40,7 +40,7 @@ int processNumber() { return ::_getpid(); }
 int processNumber() { return ::getpid(); }
 #endif
 
-// A name in the target's folder that no other writer takes, however long the target's own is.
+// A file name in the target's folder that no other writer uses, however long the target's name is.
 fs::path nameBeside(fs::path const& target) {
     static std::atomic<unsigned> count{0};
     constexpr std::size_t kLongest = 200;
@@ -96,11 +96,10 @@ bool writeAll(int file, std::string_view content) {
     return true;
 }
 
-// With the permissions and, as far as this user may give it away, the owner of the file that it is
-// to replace.
+// Copies the permissions and, as far as this user may, the owner of the file that is replaced.
 bool copyPermissions(int file, struct stat const& old) {
     if (::fchown(file, old.st_uid, old.st_gid) != 0 && ::fchown(file, uid_t(-1), old.st_gid) != 0) {
-        errno = 0;  // The permissions are what counts.
+        errno = 0;  // Only the permissions matter.
     }
     return ::fchmod(file, old.st_mode & 07777) == 0;
 }
@@ -109,8 +108,8 @@ bool writeBeside(fs::path const& target, fs::path& beside, std::string_view cont
                  std::string& problem) {
     struct stat old = {};
     bool const replaces = ::stat(target.c_str(), &old) == 0;
-    // Nobody else reads what may be a secret before it has its permissions; a new file has those
-    // that the process gives to new files.
+    // Until the permissions are set, nobody else may read the content. A new file gets the
+    // process's default permissions.
     mode_t const mode = replaces ? 0600 : 0666;
     fs::path name = nameBeside(target);
     Descriptor file(::open(name.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, mode));
@@ -126,7 +125,7 @@ bool writeBeside(fs::path const& target, fs::path& beside, std::string_view cont
     return isWritten;
 }
 
-// So that the new name is on the disk too. Some file systems have no such thing.
+// Makes the rename durable. Some file systems do not support this.
 void flushFolder(fs::path const& target) {
     fs::path const folder = target.parent_path();
     Descriptor const opened(::open(folder.empty() ? "." : folder.c_str(), O_RDONLY | O_CLOEXEC));
@@ -188,7 +187,7 @@ Optional<Patch> loadDocument(std::string const& fileName, DocumentError* error,
         return std::nullopt;
     }
     std::string text;
-    std::uintmax_t const size = fs::file_size(fileName, failed);  // Of a pipe there is none.
+    std::uintmax_t const size = fs::file_size(fileName, failed);  // A pipe has no size.
     if (!failed) text.reserve(static_cast<std::size_t>(size));
     char buffer[1 << 16];
     while (std::size_t const count = std::fread(buffer, 1, sizeof buffer, file.get())) {

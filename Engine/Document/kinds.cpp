@@ -7,7 +7,7 @@ namespace tarn::engine {
 
 namespace {
 
-// At the number's position.
+// Names indexed by number.
 constexpr std::array<std::string_view, 23> kNames{
     "unknown", "group",     "input",    "output", "time",      "constant", "ease",   "oscillator",
     "add",     "multiply",  "compose",  "split",  "loop",      "pulse",    "choose", "circle",

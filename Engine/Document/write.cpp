@@ -18,10 +18,10 @@ namespace tarn::engine {
 namespace {
 
 constexpr std::string_view kHexDigits = "0123456789abcdef";
-// Deeper records begin further to the left, so that the text grows no faster than the graph.
+// Deeper records are not indented further, so that the string grows linearly.
 constexpr std::size_t kWidestIndent = 40;
 
-// Writes JSON into a string, piece by piece.
+// Appends JSON to a string.
 class JsonWriter {
 public:
     std::string text;
@@ -41,7 +41,7 @@ public:
         text.append(buffer, end);
     }
 
-    // As a string, where some reader of JSON would lose digits.
+    // Written as a string where a JSON reader with doubles would lose digits.
     template <class Integer>
     void integer(Integer value) {
         bool const isSmall = fits(value);
@@ -59,7 +59,7 @@ public:
 
     void string(std::string_view bytes) {
         text += '"';
-        std::size_t plain = 0;  // Of the bytes, those that stand as they are.
+        std::size_t plain = 0;  // The number of bytes that need no escape.
         auto const isPlain = [&](std::size_t i) {
             auto const byte = static_cast<unsigned char>(bytes[i]);
             return byte >= 0x20 && byte < 0x7f && byte != '"' && byte != '\\';
@@ -133,7 +133,7 @@ private:
             if (level.nextEntry == level.map->end()) return end('}');
             if (level.nextEntry != level.map->begin()) json.text += ',';
             auto const& [key, element] = *level.nextEntry++;
-            // A "$" at the beginning has a meaning.
+            // Keys that begin with "$" are escaped by another "$".
             json.string(!key.empty() && key[0] == '$' ? "$" + key : key);
             json.text += ':';
             begin(element);
@@ -183,7 +183,7 @@ private:
     std::vector<Level> open;
 };
 
-// Writes a value as ports of its type have it.
+// Writes a value in the format of its port's type.
 class ValueWriter {
 public:
     explicit ValueWriter(JsonWriter& target) : json(target) {}
@@ -273,7 +273,7 @@ bool hasNullPayload(Value const& value) {
     }
 }
 
-// Whether a reader that finds nothing makes this value.
+// Whether a missing field is read as this value.
 bool isDefault(Value const& value, Type type) {
     if (hasNullPayload(value)) return false;
     Value const usual = type <= Type::Unstructured ? Value::defaultValue(type) : Value();
@@ -282,7 +282,7 @@ bool isDefault(Value const& value, Type type) {
         case Type::Float:
         case Type::Vec2:
         case Type::Vec3:
-        case Type::Vec4: {  // The sign of a zero counts; all usual ones are positive.
+        case Type::Vec4: {  // Signs of zeros matter; here all are positive.
             FloatVec4 const v = value;
             return value == usual && !std::signbit(v.x) && !std::signbit(v.y) &&
                    !std::signbit(v.z) && !std::signbit(v.w);
@@ -456,7 +456,7 @@ private:
             key(name);
             written.visit(ValueWriter(json));
         }
-        // Null alone says that nothing is there.
+        // Only null can be left out.
         Unstructured const* const data = written.ifUnstructured();
         bool const isNullData = data != nullptr && data->isNull();
         if (isNull || isNullData || written.type() != usualType) {

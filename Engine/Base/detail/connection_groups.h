@@ -1,5 +1,5 @@
-// Engine/Base/detail/connection_groups.h: which connections belong to a patch or an output, in few
-// bytes.
+// Engine/Base/detail/connection_groups.h: a compact table of the connections of each patch and
+// output.
 //
 //     groups.count(members);           // how large each group is,
 //     groups.layOut(group, end);       // where it begins (for each group),
@@ -17,14 +17,14 @@
 
 namespace tarn::engine::detail {
 
-/// A group of connections. It is counted first and has a place afterwards; never both, so that four
-/// bytes are enough for it in each record.
+/// A group of connections: first its size, then its position. It never needs both at once, so four
+/// bytes are enough in each record.
 class ConnectionGroup {
 public:
-    /// Before it is laid out: one connection more; how many those are.
+    /// While counting: adds a connection; the number so far.
     void grow() { number = exists() ? number + 1 : 1; }
     std::uint32_t size() const { return number; }
-    /// Afterwards: where it begins.
+    /// After counting: the position of the group's first connection.
     void place(std::uint32_t at) { number = at; }
     std::uint32_t begin() const { return number; }
 
@@ -35,11 +35,11 @@ private:
     std::uint32_t number = kNone;
 };
 
-/// The groups of a graph, behind one another: how many connections there are, then their positions
-/// in the list that has them.
+/// The groups of a graph in one array: for each group the number of its connections, followed by
+/// their positions in the connection list.
 class ConnectionGroups {
 public:
-    /// A connection's membership in a group.
+    /// The membership of a connection in a group.
     struct Member {
         ConnectionGroup* group;
         std::uint32_t position;
@@ -52,7 +52,7 @@ public:
         }
     }
 
-    /// The group, if it was counted, gets the place at `end`, which then is the end behind it.
+    /// Gives a group that has connections the position `end`, and moves `end` behind it.
     static void layOut(ConnectionGroup& group, std::size_t& end) noexcept {
         if (!group.exists()) return;
         auto const begin = static_cast<std::uint32_t>(end);
@@ -60,7 +60,7 @@ public:
         group.place(begin);
     }
 
-    /// After all groups were laid out, up to `end`, which is to be countable.
+    /// Stores the members, after every group was laid out. Throws where `end` is not countable.
     void fill(std::vector<Member> const& members, std::size_t end) {
         numbers.resize(end);
         for (std::size_t i = 0; i < members.size(); ++i) {
@@ -74,9 +74,9 @@ public:
         }
     }
 
-    /// Where a further group would begin.
+    /// The position of the next group.
     std::size_t end() const { return numbers.size(); }
-    /// Afterwards filling up to that many more does not allocate.
+    /// Reserves memory so that filling in that many more numbers does not allocate.
     void reserveFor(std::size_t more) {
         requireCountable(numbers.size() + more);
         detail::reserveFor(numbers, more);
@@ -87,10 +87,10 @@ public:
         unused += 1 + numbers[group.begin()];
         group.reset();
     }
-    /// Whether more of it belonged to groups that were dropped than to those that are there.
+    /// Whether more than half of the table belongs to groups that were dropped.
     bool isWasteful() const { return unused > numbers.size() / 2 + 1000; }
 
-    /// The connections of the group, which are in that list.
+    /// The connections of the group; `list` is the list that they are in.
     ConnectionView view(std::vector<Connection> const& list, ConnectionGroup group) const {
         if (!group.exists()) return {};
         std::uint32_t const* const first = &numbers[group.begin()];

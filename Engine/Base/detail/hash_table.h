@@ -1,4 +1,4 @@
-// Engine/Base/detail/hash_table.h: slots by 64-bit keys, whatever keys a document chooses.
+// Engine/Base/detail/hash_table.h: a hash table for 64-bit keys that is safe against chosen keys.
 //
 //     HashTable<Slot> table(slots);
 //     if (!table.slotFor(id).isFree()) { use(table.slotFor(id)); }
@@ -19,18 +19,18 @@
 
 namespace tarn::engine::detail {
 
-/// The position of nothing.
+/// The position that stands for "none".
 constexpr std::uint32_t kNone = std::numeric_limits<std::uint32_t>::max();
 
-/// Positions take 32 bits, of which one pattern stands for none.
+/// Throws where positions would not fit into 32 bits, of which one value means none.
 inline void requireCountable(std::size_t count) {
     if (count >= kNone) throw std::length_error("PatchIndex");
 }
 
-/// Tables and documents are larger than caches: what is needed a few steps on is asked for early.
+/// How many elements to prefetch ahead: tables and documents are larger than caches.
 constexpr std::size_t kAhead = 8;
 
-/// Spreads identifiers that were counted up over all bits.
+/// Mixes the bits of a key: identifiers are often consecutive.
 constexpr std::uint64_t mix(std::uint64_t key) {
     key ^= key >> 32;
     key *= 0xd6e8feb86659fd93;
@@ -39,8 +39,8 @@ constexpr std::uint64_t mix(std::uint64_t key) {
     return key;
 }
 
-/// Different in every table, by where it is in memory: a document cannot choose its identifiers so
-/// that all of them come to the same slot.
+/// A hash with a different seed in every table, taken from its address in memory, so that a
+/// document cannot choose identifiers that collide.
 struct SeededHash {
     std::uint64_t seed = mix(reinterpret_cast<std::uintptr_t>(this));
     std::uint64_t operator()(std::uint64_t key) const { return mix(key ^ seed); }
@@ -53,15 +53,15 @@ struct SeededHash {
     }
 };
 
-/// A hash table in one block, made from all its slots at once and probed in a line. A `Slot` has a
-/// `key` and says itself whether it is free; one made by default is. The first slot that comes for
-/// a key stays.
+/// An open-addressing hash table with linear probing, built at once from all its slots. A `Slot`
+/// has a `key` and `isFree()`; a default-constructed one is free. Of several slots with one key the
+/// first is kept.
 template <class Slot>
 class HashTable {
 public:
     explicit HashTable(std::vector<Slot> const& filled)
         : HashTable(filled, SeededHash{mix(reinterpret_cast<std::uintptr_t>(this))}) {}
-    /// Tables with one seed have their keys in one order.
+    /// Tables with the same seed iterate over their keys in the same order.
     HashTable(std::vector<Slot> const& filled, SeededHash seeded)
         : slots(sizeFor(filled.size())), hash(seeded) {
         for (std::size_t i = 0; i < filled.size(); ++i) {
@@ -74,22 +74,22 @@ public:
     }
 
     SeededHash const& hashFunction() const { return hash; }
-    /// How many keys there are.
+    /// The number of keys.
     std::size_t size() const { return count; }
 
-    /// The slot of the key, or the free one where it would be.
+    /// The slot of the key, or the free one where it would be inserted.
     Slot const& slotFor(std::uint64_t key) const { return slots[positionOf(key)]; }
     Slot& slotFor(std::uint64_t key) { return slots[positionOf(key)]; }
 
-    /// Asks for the slots where the key will be looked for; probes often reach into a second line
-    /// of the cache.
+    /// Prefetches the slots where a lookup of the key begins; probing often reaches a second cache
+    /// line.
     void prefetch(std::uint64_t key) const {
         std::size_t const start = startOf(key);
         detail::prefetch(&slots[start]);
         detail::prefetch(&slots[std::min(start + 3, slots.size() - 1)]);
     }
 
-    /// Makes room for so many further keys. A failing allocation changes nothing.
+    /// Makes room for so many more keys. A failing allocation changes nothing.
     void reserveFor(std::size_t further) {
         std::size_t const wanted = sizeFor(count + further);
         if (wanted <= slots.size()) return;
@@ -101,16 +101,16 @@ public:
         }
     }
 
-    /// Adds a slot. There is room, and its key is new.
+    /// Inserts a slot. There must be room, and the key must be new.
     void insert(Slot const& slot) noexcept {
         slotFor(slot.key) = slot;
         ++count;
     }
 
-    /// Frees the slot of a key that is there. References to other slots are no longer valid.
+    /// Erases a key that is present. Invalidates references to all slots.
     void erase(std::uint64_t key) noexcept {
         std::size_t gap = positionOf(key);
-        // Slots that were probed for across the gap move into it.
+        // Slots that were probed for past the gap move into it.
         for (std::size_t i = next(gap); !slots[i].isFree(); i = next(i)) {
             std::size_t const start = startOf(slots[i].key);
             bool const isBehindGap =
@@ -129,7 +129,7 @@ public:
     typename std::vector<Slot>::const_iterator end() const { return slots.end(); }
 
 private:
-    // A quarter more slots than keys keeps the probes short, and one is always free.
+    // Load factor of at most 4/5: probes stay short, and one slot is always free.
     static std::size_t sizeFor(std::size_t keys) {
         std::size_t const wanted = keys + keys / 4 + 1;
         requireCountable(wanted);
@@ -151,13 +151,13 @@ private:
     SeededHash hash;
 };
 
-/// Room for so many further elements, at a cost that does not add up.
+/// Reserves room for so many more elements, with geometric growth.
 template <class T>
 void reserveFor(std::vector<T>& list, std::size_t further) {
     std::size_t const wanted = list.size() + further;
     if (wanted > list.capacity()) list.reserve(std::max(wanted, 2 * list.capacity()));
 }
-/// The same for a container of the standard library that hashes.
+/// The same for an unordered container of the standard library.
 template <class Container>
 void reserveSlots(Container& container, std::size_t further) {
     auto const room = static_cast<double>(container.bucket_count()) *

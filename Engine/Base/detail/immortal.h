@@ -1,4 +1,4 @@
-// Engine/Base/detail/immortal.h: a static that nobody outlives.
+// Engine/Base/detail/immortal.h: a static object that is never destroyed.
 //
 //     static Immortal<std::string> const text(std::string("-0"));
 //     return text.value;
@@ -10,13 +10,13 @@
 
 namespace tarn::engine::detail {
 
-/// Holds a value that is made and never destroyed: the destructor of another static may still read
-/// it while the program ends. What it has allocated is within reach of leak checkers.
+/// Holds a value without ever destroying it, so that destructors of other statics can still use it.
+/// Leak checkers still find what it allocated.
 template <class T>
 union Immortal {
     Immortal() : value() {}
     explicit Immortal(T initial) : value(std::move(initial)) {}
-    // By default there would be none.
+    // The implicit destructor would be deleted.
     ~Immortal() {}  // NOLINT(modernize-use-equals-default)
 
     T value;

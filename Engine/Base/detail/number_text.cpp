@@ -19,7 +19,7 @@ namespace tarn::engine::detail {
 
 namespace {
 
-// The text that "%.f" gives for negative zero.
+// The result of "%.f" for negative zero.
 std::string const& negativeZero() {
     static Immortal<std::string> const text([] {
         char buffer[16];
@@ -29,19 +29,18 @@ std::string const& negativeZero() {
     return text.value;
 }
 
-// Whether numbers are rounded to the nearest: in any other mode the two sums differ. The C library
-// asks the control word of the processor, which took a tenth of the time of a number's string.
+// Whether the rounding mode is to nearest: in any other mode the two sums differ. Calling
+// `fegetround` instead took a tenth of the time of formatting a number.
 bool roundsToNearest() {
     double const volatile tiny = 0x1p-60;
     return 1.0 + tiny == 1.0 - tiny;
 }
 
-// Where numbers have no fraction and one decimal still fits into 64 bits.
+// From here on doubles have no fraction; below, one decimal still fits into 64 bits.
 constexpr double kTwo52 = 4503599627370496.0;
 
-// The magnitude of `d` times `scale`, as an integer, rounded as the C library rounds. Exact: the
-// mantissa times the scale fits into 64 bits. For a `d` between -2^52 and 2^52 and a scale of at
-// most 100.
+// The magnitude of `d` times `scale` as an integer, rounded half to even as the C library does.
+// Exact for |d| < 2^52 and a scale of at most 100: the mantissa times the scale fits into 64 bits.
 std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     std::uint64_t bits = 0;
     std::memcpy(&bits, &d, sizeof bits);
@@ -50,7 +49,7 @@ std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     std::uint64_t const mantissa = biased == 0 ? fraction : fraction | std::uint64_t(1) << 52;
     int const shift = 1075 - (biased == 0 ? 1 : biased);  // At least 1, for a number below 2^52.
     std::uint64_t const product = mantissa * scale;       // Below 2^60.
-    // From 62 on, the product is less than a quarter of what it is shifted by.
+    // From 62 on, `whole` is 0 and the rest is less than one half.
     std::uint64_t const whole = shift < 62 ? product >> shift : 0;
     std::uint64_t const rest = shift < 62 ? product - (whole << shift) : product;
     std::uint64_t const half = std::uint64_t(1) << (shift < 62 ? shift - 1 : 61);
@@ -72,11 +71,11 @@ std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     }
 }
 
-// A number's text from the end to the beginning.
+// Writes the digits of a number from the last to the first.
 class Digits {
 public:
-    // `decimals` places behind `point`, of `multiple`, which is that many powers of ten too large.
-    // Those that are zero are left out where `trimmed`, and so is a point with nothing behind it.
+    // The number is `multiple` divided by 10^`decimals`. `trimmed` leaves out trailing zeros, and
+    // the point where no decimals remain.
     Digits(std::uint64_t multiple, int decimals, char const* point, bool trimmed, bool negative) {
         bool shown = !trimmed;
         for (; decimals > 0; --decimals, multiple /= 10) {
@@ -94,7 +93,7 @@ public:
         } while (multiple != 0);
         if (negative) *--begin = '-';
     }
-    // Until this is destroyed.
+    // Valid until this is destroyed.
     std::string_view text() const {
         return {begin, static_cast<std::size_t>(std::end(buffer) - begin)};
     }
@@ -105,10 +104,11 @@ private:
 };
 
 #if defined(TARN_ENGINE_BASE_CLASSIC_LOCALE)
-// In a program that has no other locale. What locales and streams need is left out then.
+// Configured without locales: nothing of streams or locales is linked.
 constexpr char decimalPoint() { return '.'; }
 #else
-// That of `std::cout`'s locale. Most often it is the classic one, which is quickly seen.
+// The decimal point of `std::cout`'s locale. The classic locale, the usual case, takes a short
+// path.
 char decimalPoint() {
     std::locale const locale = std::cout.getloc();
     if (locale == std::locale::classic()) return '.';
@@ -116,7 +116,7 @@ char decimalPoint() {
 }
 #endif
 
-// Without the zeros that end it, and without a point with nothing behind it.
+// Removes trailing zeros, and a point that ends the string.
 std::string_view trimmed(std::string_view text, char point) {
     if (std::size_t const position = text.find(point); position != std::string_view::npos) {
         while (text.size() > position + 1 && text.back() == '0') text.remove_suffix(1);
@@ -139,7 +139,7 @@ void appendNumber(std::string& text, double d) {
         Digits const digits(multiple, decimals, radix.text, isUsual, hasSign);
         text += isUsual ? digits.text() : trimmed(digits.text(), point);
     } else if (std::isfinite(d)) {
-        char buffer[128];  // Deliberate: the texts of huge numbers are cut here.
+        char buffer[128];  // Deliberate: longer results are cut to 127 characters.
         std::snprintf(buffer, sizeof buffer, "%.1f", d);
         text += trimmed(buffer, point);
     } else {

@@ -1,4 +1,4 @@
-// Engine/Base/detail/number_text.h: numbers as people read them, at the end of a string.
+// Engine/Base/detail/number_text.h: appends numbers to a string in the form that people read.
 //
 //     appendNumber(text, 2.50);  // "2.5"
 
@@ -10,11 +10,11 @@
 
 namespace tarn::engine::detail {
 
-/// As the C library formats it with "%.1f" from 1000.0 on and with "%.2f" below, without the zeros
-/// that end it. What is no finite number is "nan" or "inf" behind its sign, on every platform.
+/// Formats like the C library's "%.1f" from 1000.0 on and "%.2f" below, without trailing zeros.
+/// Non-finite numbers are "nan" or "inf" with their sign, on every platform.
 void appendNumber(std::string& text, double number);
 
-/// All its digits, behind a sign where it is negative.
+/// Appends all digits, after a "-" where negative.
 void appendInteger(std::string& text, std::uint64_t magnitude, bool isNegative);
 
 }  // namespace tarn::engine::detail

@@ -1,4 +1,4 @@
-// Engine/Base/detail/patch_tables.h: what the indexes of graphs know.
+// Engine/Base/detail/patch_tables.h: the lookup tables behind the indexes of graphs.
 
 #ifndef TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
 #define TARN_ENGINE_BASE_DETAIL_PATCH_TABLES_H
@@ -42,12 +42,12 @@ struct OutputSlot {
 
 template <class AnyPatch>
 struct PatchRecord {
-    /// Null for a record that is free.
+    /// Null for a free record.
     AnyPatch const* patch = nullptr;
     std::uint32_t parent = kNone;
     ConnectionGroup incoming = {};
     ConnectionGroup outgoing = {};
-    /// What the last updates have seen of it.
+    /// What the last updates noted about it.
     std::uint32_t mark = 0;
 };
 
@@ -64,9 +64,8 @@ inline void requireLists(Patch const& patch) {
     static_cast<void>(elementsOf(patch.children, "children != nullptr"));
 }
 
-/// Every patch, and where to find it and its ports. The first record is that of the root. In a new
-/// graph the records stand in the order in which a search looks at the patches, so that the
-/// children of a patch are neighbours.
+/// A record for every patch, and tables that find it and its ports. The first record is that of the
+/// root. In a newly built table the records are in search order, so that siblings are neighbours.
 template <class AnyPatch, class AnyPort>
 struct Graph {
     explicit Graph(AnyPatch const& root)
@@ -142,12 +141,12 @@ struct Graph {
 
     std::vector<PatchRecord<AnyPatch>> records;
     HashTable<PatchSlot> patches;
-    std::size_t portCount = 0;  // Repeated ones included.
+    std::size_t portCount = 0;  // With repeated ones.
     HashTable<InputSlot<AnyPort>> inputs;
     HashTable<OutputSlot<AnyPort>> outputs;
 };
 
-/// A connection, and where it stands.
+/// A connection and its position.
 struct ConnectionPlace {
     Connection const* connection;
     std::uint32_t parent;
@@ -158,16 +157,16 @@ struct ConnectionPlace {
 void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
                 std::vector<ConnectionPlace>& places);
 
-/// What a `PatchIndex` knows.
+/// The tables of a `PatchIndex`.
 struct PatchTables {
     explicit PatchTables(Patch patch);
 
-    /// Takes the new root over and makes this what it would be for that one. False where it has to
-    /// be made anew instead; then, and where an allocation fails, both are as they were.
+    /// Updates the tables for the new root, which is moved from. False where they have to be built
+    /// again instead; then, and where an allocation fails, nothing is changed.
     bool update(Patch& newRoot);
 
-    /// The record of the child at `position` in `children`, which are those of one patch, for
-    /// whoever goes through them in order: `previous` is that of the one before, or `kNone`.
+    /// The record of the child at `position` in `children`. Callers that iterate over the children
+    /// pass the record of the previous child as `previous`, or `kNone`.
     std::uint32_t childRecord(std::vector<Patch> const& children, std::size_t position,
                               std::uint32_t previous) const {
         Patch const& child = children[position];
@@ -176,7 +175,7 @@ struct PatchTables {
         return isNext ? next : graph.recordOf(child.id);
     }
 
-    /// The connections of a group in the list of `parent`.
+    /// The connections of a group in the connection list of `parent`.
     ConnectionView view(std::uint32_t parent, ConnectionGroup group) const {
         if (!group.exists()) return {};
         return groups.view(*graph.records[parent].patch->connections, group);
@@ -186,16 +185,16 @@ struct PatchTables {
     Graph<Patch, Port> graph;
     ConnectionGroups groups;
     std::vector<std::uint32_t> freeRecords;
-    /// Whether every patch but the root has an identifier of its own that is not 0, and every port
-    /// one that no other has. Then no answer depends on an order.
+    /// Whether all patches except the root, and all ports, have distinct identifiers, and none is 0
+    /// for a patch. Then no result depends on the search order.
     bool hasUniqueIds = false;
-    /// None is larger.
+    /// An upper bound of the patches' identifiers.
     unsigned long long largestPatchId = 0;
     unsigned long long largestPortId = 0;
-    /// Which update saw a record last.
+    /// The mark of the latest update.
     std::uint32_t lastMark = 0;
 
-    /// Both are for graphs that use one identifier for ports of two kinds.
+    /// Both are only used where ports of two kinds have the same identifier.
     std::unordered_map<unsigned long long, std::uint32_t, SeededHash> innerOwners;
     std::unordered_map<unsigned long long, std::uint32_t, SeededHash> incomingToOutputs;
 

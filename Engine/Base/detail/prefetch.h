@@ -1,4 +1,4 @@
-// Engine/Base/detail/prefetch.h: a word to the processor about what comes next.
+// Engine/Base/detail/prefetch.h: a hint to load memory into the cache.
 //
 //     prefetch(&list[i + 6]);
 
@@ -7,8 +7,8 @@
 
 namespace tarn::engine::detail {
 
-/// Has the memory at `address` fetched in the background, where the compiler can say so. Any
-/// address will do.
+/// Loads the memory at `address` into the cache in the background, on compilers that support it.
+/// The address need not be valid.
 inline void prefetch([[maybe_unused]] void const* address) {
 #if defined(__GNUC__)
     __builtin_prefetch(address);

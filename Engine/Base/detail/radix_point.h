@@ -15,8 +15,8 @@
 
 namespace tarn::engine::detail {
 
-/// A string of its own, as of when this is made; lives until the locale is changed. The C library's
-/// other questions about it may not be asked on two threads at once.
+/// A copy of the C locale's decimal point, made when this is constructed. Not thread-safe while the
+/// locale is changed. (`localeconv` would not be thread-safe at all.)
 #if __has_include(<langinfo.h>)
 struct RadixPoint {
     char const* const text = nl_langinfo(RADIXCHAR);
@@ -25,7 +25,7 @@ struct RadixPoint {
 struct RadixPoint {
     RadixPoint() {
         std::snprintf(half, sizeof half, "%.1f", 0.5);
-        half[std::strlen(half) - 1] = '\0';  // The 5.
+        half[std::strlen(half) - 1] = '\0';  // Removes the 5.
     }
     char half[16];
     char const* const text = half + 1;

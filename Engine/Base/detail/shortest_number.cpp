@@ -11,8 +11,8 @@ namespace tarn::engine::detail {
 
 namespace {
 
-// "d.ddde-xx", with any decimal point: the shortest that reads back to `number`, which is not
-// negative, into the buffer. Returns its end.
+// Writes "d.ddde-xx", with any decimal point: the shortest representation of `number`, which is not
+// negative, that converts back to it. Returns the end.
 char* writeScientific(char (&buffer)[64], double number) {
 #if defined(__cpp_lib_to_chars)
     return std::to_chars(buffer, std::end(buffer), number, std::chars_format::scientific).ptr;
@@ -37,7 +37,7 @@ void appendShortest(std::string& text, double number) {
         if (*c >= '0' && *c <= '9') digits[count++] = *c;
     }
     bool const isBelowOne = *++c == '-';
-    int exponent = 0;  // The power of ten of the first digit.
+    int exponent = 0;  // The decimal exponent of the first digit.
     for (++c; c != end; ++c) exponent = exponent * 10 + (*c - '0');
     if (isBelowOne) exponent = -exponent;
 

@@ -1,4 +1,4 @@
-// Engine/Base/detail/shortest_number.h: numbers as short as they can be written.
+// Engine/Base/detail/shortest_number.h: the shortest decimal representation of a double.
 //
 //     std::string text = "r=";
 //     appendShortest(text, 0.1);  // "r=0.1"
@@ -11,7 +11,7 @@
 
 namespace tarn::engine::detail {
 
-/// While it lives, numbers are rounded to the nearest, in the C library too.
+/// Sets the rounding mode to nearest, for the C library too, and restores it when destroyed.
 class NearestRounding {
 public:
     NearestRounding() : before(std::fegetround()) { set(FE_TONEAREST); }
@@ -26,9 +26,9 @@ private:
     int before;
 };
 
-/// Appends the shortest decimal number that reads back to the same double, which is finite: in any
-/// locale "-0.25", without a fraction where there is none, and with an exponent ("1.5e21", "1e-7")
-/// from 1e21 on and below 1e-6. Under a `NearestRounding` alone.
+/// Appends the shortest decimal number that converts back to the same double, which must be finite.
+/// In every locale it looks like "-0.25"; there is no fraction where none is needed, and an
+/// exponent ("1.5e21", "1e-7") from 1e21 on and below 1e-6. Needs a `NearestRounding` in scope.
 void appendShortest(std::string& text, double number);
 
 }  // namespace tarn::engine::detail

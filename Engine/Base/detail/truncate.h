@@ -1,4 +1,4 @@
-// Engine/Base/detail/truncate.h: from doubles to integers without undefined behaviour.
+// Engine/Base/detail/truncate.h: converts doubles to integers without undefined behaviour.
 //
 //     long long i = truncate<long long>(-2.9);  // -2
 
@@ -10,12 +10,12 @@
 
 namespace tarn::engine::detail {
 
-/// `d` towards zero; the nearest integer of the type where it does not fit, and 0 for a NaN.
+/// Truncates `d` towards zero and clamps it to the range of the type; a NaN is 0.
 template <class Integer>
 Integer truncate(double d) {
     using Limits = std::numeric_limits<Integer>;
     if (std::isnan(d)) return 0;
-    // The conversion rounds the maximum up, to the power of two just out of range.
+    // Converted to a double, the maximum is rounded up to the power of two just out of range.
     if (d >= static_cast<double>(Limits::max())) return Limits::max();
     if (d <= static_cast<double>(Limits::min())) return Limits::min();
     return static_cast<Integer>(d);

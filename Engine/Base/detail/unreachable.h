@@ -1,5 +1,5 @@
-// Engine/Base/detail/unreachable.h: the end of a program at a place that a broken contract alone
-// leads to.
+// Engine/Base/detail/unreachable.h: aborts at a place that is only reached after a broken
+// precondition.
 //
 //     TARN_ENGINE_BASE_UNREACHABLE("Engine/Base/path");
 
@@ -8,10 +8,10 @@
 
 #include <Engine/Base/assertion.h>
 
-/// The condition reads "0": it is the place itself that must not be reached, and not an expression
-/// that turned out to be false. The function is the one that this stands in, in this namespace.
+/// The condition is "0", since no expression was tested. The function is the enclosing one, which
+/// has to be in this namespace.
 #define TARN_ENGINE_BASE_UNREACHABLE(module) TARN_ENGINE_BASE_UNREACHABLE_AT(module, __LINE__)
-/// The same with a line of its own.
+/// The same with an explicit line number.
 #define TARN_ENGINE_BASE_UNREACHABLE_AT(module, line) assertionFailed("0", __func__, module, line)
 
 #endif

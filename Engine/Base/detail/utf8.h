@@ -1,4 +1,4 @@
-// Engine/Base/detail/utf8.h: the characters of a text.
+// Engine/Base/detail/utf8.h: finds the characters of a UTF-8 string.
 //
 //     if (utf8Length(text) == 0) text.remove_prefix(1);  // A byte that begins none.
 
@@ -10,12 +10,11 @@
 
 namespace tarn::engine::detail {
 
-/// Whether this is a byte of a character that is not its first.
+/// Whether this is a continuation byte.
 inline bool isUtf8Continuation(char c) { return (static_cast<unsigned char>(c) & 0xc0u) == 0x80u; }
 
-/// The number of bytes of the character of UTF-8 that the text, which is not empty, begins with; 0
-/// where it begins with none: overlong forms, halves of UTF-16 pairs and what is beyond U+10FFFF
-/// are none.
+/// The number of bytes of the UTF-8 character that the non-empty string begins with; 0 where it is
+/// invalid: overlong, a surrogate, or beyond U+10FFFF.
 inline std::size_t utf8Length(std::string_view text) {
     auto const byte = [&](std::size_t i) { return static_cast<unsigned char>(text[i]); };
     unsigned const first = byte(0);

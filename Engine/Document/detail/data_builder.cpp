@@ -62,7 +62,7 @@ bool DataBuilder::closeMap(std::size_t firstValue, std::size_t firstKey) {
     return true;
 }
 
-// Takes the mark off the keys that begin with "$".
+// Removes the escape from keys that begin with "$".
 bool DataBuilder::decodeKeys(std::size_t firstKey) {
     for (std::size_t i = firstKey; i < keys.size(); ++i) {
         std::string& name = keys[i];
@@ -78,7 +78,7 @@ bool DataBuilder::decodeKeys(std::size_t firstKey) {
     return true;
 }
 
-// Replaces {"$float": "inf"} and its like by what it stands for.
+// Replaces {"$float": "inf"} and similar objects by the values that they stand for.
 bool DataBuilder::decodeTagged(std::string const& tag) {
     Unstructured& value = values.back();
     std::string_view const text = value.isString() ? *value.ifString() : std::string_view();

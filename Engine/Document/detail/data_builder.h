@@ -1,4 +1,4 @@
-// Engine/Document/detail/data_builder.h: data from the events of a JSON text.
+// Engine/Document/detail/data_builder.h: builds unstructured data from parser events.
 //
 //     DataBuilder builder(DataBuilder::Strictness::Lenient);
 //     builder.open(false), builder.add(1), builder.close();
@@ -17,14 +17,14 @@
 
 namespace tarn::engine::detail {
 
-/// Builds one tree at a time from the inside to the outside: what is done waits in lists without
-/// room to spare, so that a level and an element cost little more than they do in the tree.
+/// Builds one tree at a time, innermost values first. Finished values wait in compact lists, so
+/// that building takes little more memory than the tree.
 class DataBuilder {
 public:
     enum class Strictness {
-        /// Of several elements with one key, the last counts, as in the browsers' JSON.
+        /// Of repeated keys the last one counts, as in browsers.
         Lenient,
-        /// Of our own form: a key is there once, and a "$" at its beginning has a meaning.
+        /// Our own format: keys must be distinct, and a "$" at the start has a meaning.
         Own,
     };
     explicit DataBuilder(Strictness chosen) : strictness(chosen) {}
@@ -33,26 +33,26 @@ public:
     bool isOpen() const { return !levels.empty(); }
     /// False where there are more values than can be counted.
     bool open(bool isMap);
-    /// The outermost level, which is a map to be taken by `takeMap`.
+    /// Opens the outermost map, to be taken by `takeMap`.
     bool openMap() {
         isMapWanted = true;
         return open(true);
     }
     void add(Unstructured data) { values.push_back(std::move(data)); }
     void key(std::string& text) { keys.push_back(std::move(text)); }
-    /// False where the map is refused; then `problem` says why.
+    /// False where the map is invalid; then `problem` says why.
     bool close();
     std::string problem;
 
-    /// What was built, once nothing is open.
+    /// Returns the tree, once everything is closed.
     Unstructured take();
     Unstructured::Map takeMap() {
         isMapWanted = false;
         return std::move(outermost);
     }
     bool wantsMap() const { return isMapWanted; }
-    /// The JSON pointer from the tree to the innermost map or array that is open, and to the
-    /// element that comes next in it; of deep trees to something around it.
+    /// The JSON pointer from the tree to the innermost open map or array and its next element; for
+    /// deep trees, to something around it.
     std::string pointerToOpen() const;
     std::string pointerToNext() const;
 
@@ -67,7 +67,7 @@ private:
     Unstructured::Map outermost;
     std::deque<Unstructured> values;
     std::deque<std::string> keys;
-    // For each open level 2 * its first value, and 1 more for a map. Keys are as many as values.
+    // For each open level 2 * its first value, plus 1 for a map. There are as many keys as values.
     std::deque<std::uint32_t> levels;
 };
 

@@ -17,7 +17,7 @@ Unstructured emptyContainer(bool isObject) {
     return isObject ? Unstructured(Unstructured::Map()) : Unstructured(Unstructured::Array());
 }
 
-// An integer, however it is written: 3, 3.0.
+// An integer, written with or without a fraction: 3, 3.0.
 Optional<long long> integerOf(Unstructured const& data) {
     Unstructured::Lookup lookup = Unstructured::Lookup::Missing;
     long long const number = data.integerAt({}, 0, &lookup);
@@ -161,7 +161,7 @@ bool GraphReader::onString(std::string& text) {
 bool GraphReader::onScalar(Scalar& scalar) { return set(scalar); }
 bool GraphReader::onData(Scalar& captured) { return set(captured); }
 
-// A member of an object, or an element of a list.
+// Sets a member of an object or an element of a list.
 bool GraphReader::set(Scalar& scalar) {
     Unstructured& data = scalar.data;
     if (levels.empty()) return refuseType("an object", data);
@@ -217,7 +217,8 @@ bool GraphReader::setNodeMember(Unstructured& data) {
     if (key == "id") {
         level.hasId = true;
         if (!setName(node.name, data, "")) return false;
-        // Said again where the node gets another: a text, or a number that no identifier can be.
+        // The original identifier is kept as an attribute where it cannot be used: a string or an
+        // invalid number.
         if (node.name.text) node.attributes[key] = std::move(data);
         return true;
     }
@@ -247,7 +248,7 @@ bool GraphReader::setPortMember(Unstructured& data) {
         port.name = *data.ifString();
         return true;
     }
-    // Said by the links themselves.
+    // Redundant: the links themselves have this information.
     if (key == "link" || key == "links" || key == "linkIds") return true;
     port.attributes[key] = std::move(data);
     return true;
@@ -264,7 +265,7 @@ bool GraphReader::setName(NodeName& name, Unstructured const& data, std::string 
         return true;
     }
     if (!data.isString()) return refuseType("a number or a text", data, step);
-    // Editors write one node's number either way.
+    // Editors write the number of a node as a number or a string.
     if (Optional<long long> const number = integerOfText(*data.ifString())) {
         name.number = *number;
     } else {
@@ -309,7 +310,7 @@ bool GraphReader::addLink(Unstructured const& data) {
     return true;
 }
 
-// Connections have no attributes: what else there is goes to the patch around them.
+// Connections have no attributes: additional members are stored in the patch around them.
 void GraphReader::keepLinkMembers(Unstructured const& link) {
     Unstructured::Map members = *link.ifMap();
     for (char const* known : {"origin_id", "origin_slot", "target_id", "target_slot", "type"}) {
@@ -340,7 +341,7 @@ bool GraphReader::onClose() {
         case Place::Definitions:
         case Place::DefinitionList: break;
     }
-    // The list around a record is at its next element.
+    // Moves to the next element of the list around the record.
     bool const isElement = level.place == Place::Node || level.place == Place::Port ||
                            (level.place == Place::Graph && level.isDefinition);
     if (isElement) ++levels.back().position;

@@ -1,4 +1,4 @@
-// Engine/Document/detail/graph_reader.h: reads graphs of browser-based node editors.
+// Engine/Document/detail/graph_reader.h: parses node graphs of browser-based editors.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_GRAPH_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_GRAPH_READER_H
@@ -13,8 +13,8 @@
 
 namespace tarn::engine::detail {
 
-/// Reads nodes, links and shared definitions into a `NodeGraph`; whatever else there is becomes
-/// attributes of what it belongs to.
+/// Parses nodes, links and shared definitions into a `NodeGraph`. Everything else becomes
+/// attributes of the record that it is in.
 class GraphReader : public JsonReader {
 public:
     GraphReader() : JsonReader(DataBuilder::Strictness::Lenient) {}
@@ -24,7 +24,7 @@ public:
 
 private:
     enum class Place : unsigned char {
-        Graph,  // The whole, an inline subgraph or a shared definition.
+        Graph,  // The document, an inline subgraph or a shared definition.
         Nodes,
         Node,
         Ports,
@@ -35,11 +35,11 @@ private:
     };
     struct Level {
         Place place;
-        std::string key;           // Of an object: the member that is being read.
-        std::size_t position = 0;  // Of a list: of the element that is being read.
-        bool hasId = false;        // Of a node.
+        std::string key;           // Objects: the current member.
+        std::size_t position = 0;  // Lists: the current element.
+        bool hasId = false;        // Nodes only.
         bool hasType = false;
-        bool isDefinition = false;  // Of a graph.
+        bool isDefinition = false;  // Graphs only.
     };
 
     bool onScalar(Scalar& scalar) override;
@@ -68,7 +68,7 @@ private:
     std::vector<Level> levels;
     std::vector<NodeGraph*> openGraphs;
     std::vector<GraphNode*> openNodes;
-    // One of the two.
+    // Either inputs or outputs.
     std::deque<Port>* openPorts = nullptr;
     std::vector<Port>* openDefinitionPorts = nullptr;
     Unstructured::Map otherDefinitions;

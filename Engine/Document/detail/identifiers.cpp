@@ -11,7 +11,7 @@ namespace tarn::engine::detail {
 namespace {
 
 using Id = unsigned long long;
-using End = std::pair<Id, Id>;  // A patch and its port.
+using End = std::pair<Id, Id>;  // A patch and one of its ports.
 
 std::vector<Port> const& portsOf(Patch const& patch, bool outputs) {
     return outputs ? elementsOf(patch.outputs, "outputs != nullptr")
@@ -21,7 +21,7 @@ std::vector<Patch> const& childrenOf(Patch const& patch) {
     return elementsOf(patch.children, "children != nullptr");
 }
 
-// Calls `visit(patch)` for every patch, parents before children, until it answers false. `path` are
+// Calls `visit(patch)` for every patch, parents before children, until it returns false. `path` has
 // the positions from the root to the patch.
 class Walk {
 public:
@@ -41,7 +41,7 @@ public:
         }
     }
 
-    // Of the patch that was visited last.
+    // The JSON pointer of the last visited patch.
     std::string pointer() const {
         std::string result = "/root";
         for (auto const& [children, next] : levels) {
@@ -54,7 +54,7 @@ private:
     std::vector<std::pair<std::vector<Patch> const*, std::size_t>> levels;
 };
 
-// Whether none is there twice and none is 0. Sorts them, unless they are in order as in most
+// Whether the identifiers are distinct and not 0. Sorts them, unless they are in order as in most
 // documents.
 bool areUnique(std::vector<Id>& ids) {
     auto const isNotBefore = [](Id a, Id b) { return a >= b; };
@@ -64,7 +64,7 @@ bool areUnique(std::vector<Id>& ids) {
     return std::adjacent_find(ids.begin(), ids.end()) == ids.end() && (ids.empty() || ids[0] != 0);
 }
 
-// The first identifier that is 0 or was there before.
+// Finds the first identifier that is 0 or repeated.
 class FirstFault {
 public:
     DocumentError find(Patch const& root) {
@@ -107,7 +107,7 @@ private:
     std::unordered_set<Id> ports;
 };
 
-// The ends that connections between the children may have.
+// All ends that connections between the children may have.
 std::vector<End> endsOf(Patch const& parent, bool outputs) {
     std::vector<End> ends;
     for (Patch const& child : childrenOf(parent)) {
@@ -127,7 +127,7 @@ std::string missingEnd(Patch const& parent, End end, bool outputs) {
     return "there is no patch " + std::to_string(end.first) + " beside the connection";
 }
 
-// Whether every connection has its ends; else what is wrong with the first.
+// Whether every connection has valid ends; otherwise `fault` describes the first that has not.
 bool connectionsAreRight(Patch const& patch, DocumentError& fault) {
     std::vector<Connection> const& connections =
         elementsOf(patch.connections, "connections != nullptr");

@@ -1,4 +1,4 @@
-// Engine/Document/detail/identifiers.h: whether each identifier of a graph stands for one thing.
+// Engine/Document/detail/identifiers.h: validates the identifiers of a graph.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_IDENTIFIERS_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_IDENTIFIERS_H
@@ -9,9 +9,9 @@
 
 namespace tarn::engine::detail {
 
-/// Patches have identifiers of their own that are not 0, and so have ports; connections lead from
-/// an output of one child to an input of another (or of the same). Empty where all that holds, else
-/// the first that is wrong, with its pointer in the document. About linear, without recursion.
+/// Patches and ports must have distinct identifiers that are not 0. Connections must lead from an
+/// output of one child to an input of another (or the same). Empty where the graph is valid, else
+/// the first error with its JSON pointer. Nearly linear, not recursive.
 Optional<DocumentError> findWrongIdentifier(Patch const& root);
 
 }  // namespace tarn::engine::detail

@@ -20,7 +20,7 @@ void setPlace(std::string_view text, std::size_t offset, DocumentError& error) {
     error.column = before.size() - (lineEnd == std::string_view::npos ? 0 : lineEnd + 1) + 1;
 }
 
-// Moves over a text that is JSON up to the place that is looked for.
+// Scans a valid JSON string up to a given place.
 class Scanner {
 public:
     explicit Scanner(std::string_view scanned) : text(scanned) {
@@ -32,14 +32,14 @@ public:
     std::size_t offset() const { return position; }
     char current() const { return position < text.size() ? text[position] : '\0'; }
 
-    // Into the object or array, to its first key or element; false where it has none.
+    // Enters the object or array; false where it is empty.
     bool enter() {
         ++position;
         skipSpace();
         return current() != '}' && current() != ']' && current() != '\0';
     }
 
-    // To the next key or element; false at the end.
+    // Moves to the next key or element; false at the end.
     bool next() {
         skipSpace();
         if (current() != ',') return false;
@@ -48,7 +48,7 @@ public:
         return true;
     }
 
-    // A key, decoded as far as it takes to compare it; afterwards at its value.
+    // Reads a key, decoded as far as comparing needs it, and moves to its value.
     std::string key() {
         std::size_t const begin = position;
         skipString();

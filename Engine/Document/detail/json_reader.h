@@ -1,5 +1,5 @@
-// Engine/Document/detail/json_reader.h: what readers of documents share: the events of a JSON text,
-// and where they come from.
+// Engine/Document/detail/json_reader.h: the base class of the document readers, which receives
+// parser events.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_JSON_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_JSON_READER_H
@@ -15,18 +15,18 @@
 
 namespace tarn::engine::detail {
 
-/// A value without parts, or one that was captured.
+/// A number, string, boolean or null; or data that was captured.
 struct Scalar {
-    /// As data; true and false are 1 and 0.
+    /// The value; booleans are 1 and 0.
     Unstructured data = {};
-    /// Whether it is true or false, or has them among its parts.
+    /// Whether it is a boolean or contains one.
     bool isBoolean = false;
-    /// An integer beyond 64 bits, which `data` has as a double.
+    /// An integer beyond 64 bits, which `data` stores as a double.
     bool isBeyond64Bits = false;
 };
 
-/// Takes the events of a JSON text in the way that nlohmann-json gives them. What a reader does not
-/// take itself it has captured as data.
+/// Receives the events of nlohmann-json's parser. A derived class handles each event itself or has
+/// the value captured as unstructured data.
 class JsonReader {
 public:
     explicit JsonReader(DataBuilder::Strictness chosen) : strictness(chosen), builder(chosen) {}
@@ -34,12 +34,12 @@ public:
     JsonReader(JsonReader const&) = delete;
     JsonReader& operator=(JsonReader const&) = delete;
 
-    /// False where the text is refused; then `fault` says why. Its line and column are 0 unless the
-    /// text is not JSON.
+    /// False where the document is invalid; then `fault` says why. Line and column are 0 unless it
+    /// is not JSON.
     bool read(std::string_view text);
     DocumentError fault;
 
-    // The events.
+    // Parser events.
     bool null();
     bool boolean(bool value);
     bool number_integer(nlohmann::json::number_integer_t value);
@@ -56,21 +56,21 @@ public:
                      nlohmann::json::exception const& error);
 
 protected:
-    // What a reader does with them while nothing is captured. All but `keyOf` answer false where
-    // they refuse the text.
+    // Handlers for events while nothing is captured. All except `keyOf` return false to reject the
+    // document.
     virtual bool onScalar(Scalar& scalar) = 0;
     virtual bool onString(std::string& text) = 0;
     virtual bool onOpen(bool isObject) = 0;
     virtual bool onKey(std::string& key) = 0;
     virtual bool onClose() = 0;
-    /// What was captured.
+    /// Receives the captured data.
     virtual bool onData(Scalar& captured) = 0;
     virtual bool onMap(Unstructured::Map map) = 0;
-    /// The JSON pointer of the value that is being read.
+    /// The JSON pointer of the current value.
     virtual std::string pointer() const = 0;
 
-    /// From `onOpen`: this object or array is captured, and `onData` gets it; or this object, and
-    /// `onMap` gets it; or nothing of it is looked at.
+    /// To be called from `onOpen`: captures this object or array for `onData`, or for `onMap`, or
+    /// skips it.
     bool capture(bool isObject) {
         return builder.open(isObject) || refuse("there are too many values");
     }
@@ -81,7 +81,7 @@ protected:
     }
     bool refuse(std::string problem) { return refuseAt(pointer(), std::move(problem)); }
     bool refuseAt(std::string place, std::string problem);
-    /// Decodes a text of our own form, or refuses it.
+    /// Decodes a string of our own format; false where it is invalid.
     bool decode(std::string& text);
 
     std::string_view input;
@@ -94,11 +94,11 @@ private:
     DataBuilder::Strictness strictness;
     DataBuilder builder;
     std::size_t ignoredLevels = 0;
-    bool hasBoolean = false;  // What is being captured.
+    bool hasBoolean = false;  // Of the captured data.
 };
 
-/// Fills in line and column from the pointer. The text is JSON up to there; one of spaces alone has
-/// no such place.
+/// Sets line and column from the pointer. The string must be valid JSON up to there; one of spaces
+/// only has no such place.
 void locate(std::string_view text, DocumentError& error);
 
 }  // namespace tarn::engine::detail

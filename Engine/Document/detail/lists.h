@@ -1,4 +1,4 @@
-// Engine/Document/detail/lists.h: lists of records that are read one after the other.
+// Engine/Document/detail/lists.h: lists of records that grow while a document is parsed.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_LISTS_H
@@ -13,8 +13,8 @@
 
 namespace tarn::engine::detail {
 
-/// The elements in a list that has just their size. Both take up little more memory than one: what
-/// has been moved is let go of on the way.
+/// Moves the elements into a list of exactly their number. Memory is released while moving, so that
+/// both lists together take little more than one.
 template <class T>
 std::vector<T> takeAll(std::deque<T>& elements) {
     std::vector<T> result;
@@ -26,7 +26,7 @@ std::vector<T> takeAll(std::deque<T>& elements) {
     return result;
 }
 
-/// A list that costs nothing while it has no elements.
+/// A list that allocates nothing while it is empty.
 template <class T>
 class LazyList {
 public:
@@ -39,7 +39,7 @@ public:
     T& back() { return elements->back(); }
     T& operator[](std::size_t i) { return (*elements)[i]; }
     T const& operator[](std::size_t i) const { return (*elements)[i]; }
-    /// The first element, which is taken out.
+    /// Removes and returns the first element.
     T takeFirst() {
         T result = std::move(elements->front());
         elements->pop_front();
@@ -50,7 +50,7 @@ private:
     std::unique_ptr<std::deque<T>> elements;
 };
 
-/// The same as `takeAll` for a field of a record that has an empty list so far: it shares that one.
+/// Same as `takeAll` for a field of a record: an empty list stays the shared one.
 template <class T>
 void takeInto(Array<T>& field, std::deque<T>& elements) {
     if (!elements.empty()) field = arrayOf(takeAll(elements));

@@ -16,11 +16,11 @@ namespace tarn::engine::detail {
 namespace {
 
 constexpr std::size_t kMostPatches = 1000000;
-// What all copies of shared definitions may take, about: a small document is not to fill the
+// The approximate limit for all copies of shared definitions: a small document must not exhaust
 // memory.
 constexpr std::size_t kMostCopiedBytes = std::size_t(256) << 20;
 constexpr std::size_t kMostNotes = 100;
-// How links of a definition name its own inputs and outputs.
+// The pseudo nodes that stand for a definition's own inputs and outputs in its links.
 constexpr long long kInputNode = -10;
 constexpr long long kOutputNode = -20;
 
@@ -29,7 +29,7 @@ std::string lowerCase(std::string text) {
     return text;
 }
 
-// "math/Add" is our "add"; what we do not implement is of no kind.
+// "math/Add" is our "add"; kinds that we do not have are unknown.
 unsigned long long kindOf(std::string const& nodeType) {
     std::string const name = lowerCase(nodeType.substr(nodeType.find_last_of('/') + 1));
     if (name == "const") return *stringToKind("constant");
@@ -39,7 +39,7 @@ unsigned long long kindOf(std::string const& nodeType) {
     return kUnknownKind;
 }
 
-// Their type names differ from editor to editor: what we do not know is free-form data.
+// Editors have different type names. Unknown ones become unstructured data.
 TypeInfo typeInfoOf(Unstructured const& type) {
     TypeInfo info;
     info.type = Type::Unstructured;
@@ -53,7 +53,7 @@ TypeInfo typeInfoOf(Unstructured const& type) {
     return info;
 }
 
-// A setting as a port's value: converted where that keeps it, so that "5" is 5 for a number.
+// Converts a setting to the type of a port where nothing is lost: "5" becomes 5 for a number.
 Value asDefault(Unstructured const& setting, Type type) {
     if (std::string const* const text = setting.ifString()) return Value(*text).asType(type);
     return Value(setting).asType(type);
@@ -63,9 +63,9 @@ std::string shown(NodeName const& name) {
     return name.text ? "\"" + printable(*name.text) + "\"" : std::to_string(name.number);
 }
 
-// About what data takes in memory.
+// The approximate size of the data in memory.
 std::size_t bytesOf(Unstructured const& data) {
-    constexpr std::size_t kEntry = 64;  // Of a map, beside its key.
+    constexpr std::size_t kEntry = 64;  // Of a map, without the key.
     std::size_t bytes = 0;
     std::vector<Unstructured const*> pending{&data};
     while (!pending.empty()) {
@@ -102,7 +102,7 @@ std::size_t bytesOfPorts(Ports const& ports) {
     return bytes;
 }
 
-// What each definition becomes, with those inside it.
+// The size of each definition, with the definitions inside it.
 class Sizes {
 public:
     Sizes(std::deque<Definition> const& all,
@@ -142,7 +142,7 @@ public:
         return true;
     }
 
-    // Of the whole: the nodes themselves are no copies.
+    // For the whole document, whose own nodes are not copies.
     Size sizeOf(NodeGraph const& graph) const { return sizeOf(graph, false); }
 
 private:
@@ -159,14 +159,14 @@ private:
 
     Size sizeOf(Definition const& definition) const {
         Size size = sizeOf(definition.graph, true);
-        size.patches += 2;  // The ends.
+        size.patches += 2;  // The input and output patches.
         size.copiedBytes += 2 * sizeof(Patch) + definition.id.size() + definition.title.size() +
                             bytesOfPorts(definition.inputs) + bytesOfPorts(definition.outputs) +
                             bytesOf(definition.graph.attributes);
         return size;
     }
 
-    // No sum of these overflows.
+    // Sums cannot overflow.
     Size sizeOf(NodeGraph const& graph, bool isCopied) const {
         Size size;
         if (isCopied) size.copiedBytes = graph.links.size() * sizeof(Connection);
@@ -241,7 +241,7 @@ public:
           DocumentInfo& made)
         : definitions(all), positions(byId), uses(all.size(), 0), info(made) {}
 
-    // The root's own identifier comes last, so that nodes keep theirs.
+    // The root gets its identifier last, so that nodes keep theirs.
     void make(NodeGraph& graph, Patch& root) {
         claim(graph);
         fill(root, graph, nullptr, true);
@@ -250,8 +250,7 @@ public:
     }
 
 private:
-    // Nodes keep their identifiers before any other gets a free one, and the outer ones before the
-    // inner ones.
+    // Existing identifiers are assigned before new ones, outer nodes before inner ones.
     void claim(NodeGraph& graph) {
         for (std::size_t i = 0; i < graph.nodes.size(); ++i) {
             graph.nodes[i].id = claimed(graph.nodes[i].name);
@@ -261,18 +260,18 @@ private:
         }
     }
 
-    // The identifier of that number where it is still free, else 0.
+    // The identifier with that number if it is still free, else 0.
     unsigned long long claimed(NodeName const& name) {
         if (name.text || name.number <= 0) return 0;
         auto const id = static_cast<unsigned long long>(name.number);
         return patchIds.insert(id).second ? id : 0;
     }
 
-    // Where the nodes of a name are among the patches of a level.
+    // The positions of the nodes of a name in the list of patches.
     using Places = std::vector<std::pair<NodeName, std::size_t>>;
 
-    // The patches and connections of `graph` become those of `patch`. What is used for the last
-    // time is moved and not copied.
+    // Fills `patch` with the patches and connections of `graph`. At the last use of a definition
+    // its content is moved instead of copied.
     void fill(Patch& patch, NodeGraph& graph, Definition const* definition, bool isLastUse) {
         Places places;
         std::size_t const count = graph.nodes.size();
@@ -282,7 +281,7 @@ private:
         for (std::size_t i = 0; i < count; ++i) {
             GraphNode const& node = graph.nodes[i];
             places.emplace_back(node.name, i);
-            // Those of a copy have not been claimed before.
+            // Copies get their identifiers here.
             ids.push_back(isLastUse ? node.id : claimed(node.name));
         }
         for (unsigned long long& id : ids) {
@@ -299,7 +298,7 @@ private:
             addEnd(children, places, definition->inputNode, kGroupInputKind, definition->inputs);
             addEnd(children, places, definition->outputNode, kGroupOutputKind, definition->outputs);
         }
-        // Of nodes of one name the first comes first.
+        // Nodes of the same name stay in order.
         std::sort(places.begin(), places.end());
         std::vector<Connection> connections;
         connections.reserve(graph.links.size());
@@ -325,13 +324,13 @@ private:
         }
     }
 
-    // Under that key, or the first like it that is free.
+    // Uses that key, or the first free variant of it.
     static void addAttribute(Patch& patch, std::string key, Unstructured value) {
         while (patch.attributes.count(key) != 0) key += "_";
         patch.attributes.emplace(std::move(key), std::move(value));
     }
 
-    // The tags of a group's ports, by their names.
+    // The tags of a group's ports by name.
     struct GroupTags {
         std::unordered_map<std::string, unsigned long long> inputs;
         std::unordered_map<std::string, unsigned long long> outputs;
@@ -368,7 +367,8 @@ private:
         return patch;
     }
 
-    // Those of an inline subgraph become its node's, and stay apart where the node has the same.
+    // Members of an inline subgraph become members of its node, under other keys where the node has
+    // them.
     static void addMembers(Patch& patch, std::map<std::string, Unstructured> members) {
         auto const id = members.find("id");
         Unstructured::Map apart;
@@ -421,7 +421,7 @@ private:
         if (patch.name.empty()) patch.name = patch.descriptor;
     }
 
-    // The inside of the definition becomes that of the patch.
+    // Fills the patch with the content of the definition.
     void use(std::size_t position, Patch& patch) {
         Definition& definition = definitions[position];
         ++uses[position];
@@ -440,12 +440,12 @@ private:
         fill(patch, definition.graph, &definition, false);
     }
 
-    // Whether what is said of that end is said of a patch, or nothing is said.
+    // Whether that end of the definition is used.
     static bool hasEnd(Unstructured const& node, std::vector<Port> const& ports) {
         return node.isNull() || (node.isMap() && !ports.empty());
     }
 
-    // Of a definition: the patch inside it that stands for its inputs or its outputs.
+    // Adds the patch that represents the inputs or outputs inside a definition.
     void addEnd(std::vector<Patch>& children, Places& places, Unstructured const& node,
                 unsigned long long kind, std::vector<Port> const& ofGroup) {
         if (ofGroup.empty()) return;
@@ -465,8 +465,8 @@ private:
         children.push_back(std::move(patch));
     }
 
-    // Identifiers, tags, types and defaults. A property is the default of the first port of its
-    // name.
+    // Sets identifiers, tags, types and defaults. A property is the default of the first port with
+    // its name.
     void finishPorts(std::deque<Port>& ports, Unstructured const* properties) {
         std::unordered_set<std::string_view> names;
         for (std::size_t i = 0; i < ports.size(); ++i) {
@@ -487,14 +487,14 @@ private:
         }
     }
 
-    // Editors give the same time in one unit or two; our kind knows them by tag.
+    // Editors give the time in one unit or in two; our kind identifies them by tag.
     static void retagTime(std::deque<Port>& outputs) {
         for (Port& port : outputs) {
             port.tag = lowerCase(port.name).find("ms") != std::string::npos ? 3 : 1;
         }
     }
 
-    // The ends of a group find the group's ports by name; here that is turned into tags.
+    // The inner ends of a group match the group's ports by name; this sets their tags.
     static void retagEnd(std::deque<Port>& ends,
                          std::unordered_map<std::string, unsigned long long> const& tags,
                          std::string const& name) {
@@ -502,8 +502,8 @@ private:
         if (!ends.empty() && tag != tags.end()) ends[0].tag = tag->second;
     }
 
-    // A use has some of its definition's ports, in any order: each gets the tag of the first one of
-    // its name that is not taken, and those of no such name tags of their own.
+    // A use may have only some of its definition's ports, in any order. Each gets the tag of the
+    // first unused port with its name; others get new tags.
     static void joinByName(std::deque<Port>& ports, std::vector<Port> const& ofDefinition) {
         std::unordered_map<std::string, std::vector<std::size_t>> byName;
         for (std::size_t i = ofDefinition.size(); i-- > 0;)
@@ -520,7 +520,7 @@ private:
         }
     }
 
-    // Fills `connection` in, or names what is not there.
+    // Fills `connection` in, or returns what does not exist.
     static std::string connect(GraphLink const& link, Places const& places,
                                std::vector<Patch> const& patches, Connection& connection) {
         if (!link.hasEnds) return "node at one of its ends";
@@ -538,7 +538,7 @@ private:
         return "";
     }
 
-    // The first of the name.
+    // The first patch with this name.
     static Patch const* find(NodeName const& name, Places const& places,
                              std::vector<Patch> const& patches) {
         auto const place =

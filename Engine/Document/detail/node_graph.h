@@ -1,5 +1,4 @@
-// Engine/Document/detail/node_graph.h: a graph as browser-based node editors export it, and the
-// patches that it becomes.
+// Engine/Document/detail/node_graph.h: a parsed node graph, and its conversion to patches.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_NODE_GRAPH_H
@@ -19,10 +18,10 @@ namespace tarn::engine::detail {
 
 struct NodeGraph;
 
-/// How deep groups may nest.
+/// The limit of nested groups.
 constexpr std::size_t kDeepestGroups = 1000;
 
-/// How links name a node: by a number or by a text.
+/// The name of a node in links: a number or a string.
 struct NodeName {
     long long number = 0;
     std::shared_ptr<std::string const> text = nullptr;
@@ -32,23 +31,23 @@ struct NodeName {
 
 struct GraphNode {
     NodeName name;
-    /// The identifier that it keeps, or 0.
+    /// The patch identifier that it keeps, or 0.
     unsigned long long id = 0;
     std::string type;
-    /// All other members, the title among them.
+    /// All other members, including the title.
     std::map<std::string, Unstructured> attributes;
     struct Ports {
         std::deque<Port> inputs;
         std::deque<Port> outputs;
     };
-    /// Null where there are none.
+    /// Null where there are no ports.
     std::unique_ptr<Ports> ports;
     /// Null for a node without an inline subgraph.
     std::unique_ptr<NodeGraph> inside;
 };
 
 struct GraphLink {
-    std::size_t position = 0;  // In its list.
+    std::size_t position = 0;  // In the list of nodes.
     long long id = 0;
     NodeName from;
     long long fromSlot = 0;
@@ -63,33 +62,33 @@ struct NodeGraph {
     LazyList<GraphLink> links;
     /// All other members.
     std::map<std::string, Unstructured> attributes;
-    /// What there is of its links beside their ends, an object for each that has more.
+    /// For each link with additional members, an object with those.
     Unstructured::Array linkMembers;
 
-    /// The graph that has it inside a node, and the position of that node; or else, of a shared
-    /// definition, its position in the list of them.
+    /// For an inline subgraph, the graph around it and the position of its node there. For a shared
+    /// definition, null and its position in the list of definitions.
     NodeGraph const* around = nullptr;
     std::size_t position = 0;
     bool isDefinition = false;
 };
 
-/// A graph that nodes use by its `id`.
+/// A graph that nodes refer to by its `id`.
 struct Definition {
     NodeGraph graph;
     std::string id;
     std::string title;
     std::vector<Port> inputs;
     std::vector<Port> outputs;
-    /// What is said of the nodes that stand for these ports inside.
+    /// The nodes that represent the inputs and the outputs inside.
     Unstructured inputNode;
     Unstructured outputNode;
 };
 
-/// The JSON pointer to the graph. Linear in how deep it is.
+/// The JSON pointer of the graph. Linear in its depth.
 std::string pointerTo(NodeGraph const& graph);
 
-/// Makes patches of a graph and of the shared definitions that its nodes use. False where that is
-/// impossible; then `error` says why. The graph is used up.
+/// Converts a graph and the shared definitions that its nodes use. False where that is impossible;
+/// then `error` says why. The graph is consumed.
 bool toPatches(NodeGraph& graph, std::deque<Definition>& definitions, Patch& root,
                DocumentInfo& info, DocumentError& error);
 

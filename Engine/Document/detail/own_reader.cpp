@@ -49,7 +49,7 @@ enum class OwnReader::Key : unsigned char {
 
 namespace {
 
-// At the key's position.
+// Names indexed by `Key`.
 constexpr std::array<std::string_view, 30> kKeyNames{"",
                                                      "$schema",
                                                      "version",
@@ -86,7 +86,7 @@ constexpr std::uint32_t setOf(Keys... keys) {
     return ((std::uint32_t(1) << static_cast<unsigned>(keys)) | ...);
 }
 
-// A graph is destroyed level by level on the stack, of which browsers give little.
+// Destroying a graph is recursive, and browsers have small stacks.
 #if defined(TARN_ENGINE_DOCUMENT_DEEPEST)
 constexpr std::size_t kDeepest = TARN_ENGINE_DOCUMENT_DEEPEST;
 #else
@@ -106,7 +106,7 @@ bool isNumberOf(Unstructured const& data, long long& number) {
 
 }  // namespace
 
-// Where the reader is
+// Position
 
 std::string OwnReader::pointer() const {
     std::string result;
@@ -142,7 +142,7 @@ bool OwnReader::push(Place place) {
     return true;
 }
 
-// What is read
+// Parsing
 
 char const* OwnReader::wantedFor(Key key) {
     switch (key) {
@@ -231,7 +231,7 @@ bool OwnReader::onKey(std::string& key) {
     if (level.place != Place::Document) {
         return refuseAt(pointer() + pointerStep(key), "unknown key \"" + printable(key) + "\"");
     }
-    // It may be a node graph.
+    // A node graph, probably.
     if (key == "nodes") {
         isNodeGraph = true;
         return false;
@@ -298,7 +298,7 @@ bool OwnReader::openLayer() {
 }
 
 bool OwnReader::onString(std::string& text) {
-    // Around the root it may be a text of a node graph, which has no such escapes.
+    // Around the root it may be a string of a node graph, which has no such escapes.
     bool const isAround = !levels.empty() && isAt(Place::Document);
     if (!isAround && !decode(text)) return false;
     if (!levels.empty()) {
@@ -325,7 +325,7 @@ bool OwnReader::onScalar(Scalar& scalar) {
         return refuse("an integer beyond 64 bits");
     }
     if (levels.empty()) return refuseType(scalar.data);
-    // A field that is null is not there, but for what has to be.
+    // A field that is null counts as missing, except where it is required.
     Key const key = levels.back().key;
     switch (levels.back().place) {
         case Place::Document: setDocumentField(scalar); return true;
@@ -375,7 +375,7 @@ void OwnReader::setDocumentField(Scalar const& scalar) {
             }
             break;
         case Key::Schema: isOfType = data.isString(); break;
-        case Key::None: isOfType = true; break;  // An unknown key.
+        case Key::None: isOfType = true; break;  // Unknown key.
         default: break;
     }
     if (!isOfType) {
@@ -422,7 +422,7 @@ bool OwnReader::setEnd(Scalar const& scalar) {
     std::size_t const position = levels.back().position++;
     Connection& c = connection;
     bool const isFrom = levels[levels.size() - 2].key == Key::From;
-    if (position > 1) return true;  // Refused at the end.
+    if (position > 1) return true;  // Rejected at the end.
     unsigned long long& id = position == 0 ? (isFrom ? c.fromPatchId : c.toPatchId)
                                            : (isFrom ? c.fromPortId : c.toPortId);
     --levels.back().position;
@@ -528,7 +528,7 @@ bool OwnReader::onMap(Unstructured::Map map) {
     return true;
 }
 
-// What is complete
+// Completing records
 
 bool OwnReader::onClose() {
     Place const place = levels.back().place;
@@ -553,7 +553,7 @@ bool OwnReader::closeList() {
             break;
         case Place::Ports: {
             Patch& patch = openPatches.back();
-            // What they were read into is used again: lists of ports are many and short.
+            // Lists are reused: lists of ports are many and short.
             if (!ports.empty()) {
                 (key == Key::Inputs ? patch.inputs : patch.outputs) = arrayOf(std::vector<Port>(
                     std::make_move_iterator(ports.begin()), std::make_move_iterator(ports.end())));

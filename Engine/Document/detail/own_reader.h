@@ -1,4 +1,4 @@
-// Engine/Document/detail/own_reader.h: reads documents of our own form.
+// Engine/Document/detail/own_reader.h: parses documents of our own format.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_OWN_READER_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_OWN_READER_H
@@ -15,16 +15,16 @@
 
 namespace tarn::engine::detail {
 
-/// Reads a document record by record: what is complete waits in a list for the record around it.
+/// Parses a document record by record. Finished records wait in a list for the record around them.
 class OwnReader : public JsonReader {
 public:
     OwnReader() : JsonReader(DataBuilder::Strictness::Own) {}
 
-    /// After `read` was true: whether the document is right as a whole.
+    /// After a successful `read`: validates the document as a whole.
     bool finish();
     Patch root;
     double framesPerSecond = 60.0;
-    /// Why `read` was false, where it was since the document has "nodes".
+    /// After a failed `read`: whether the document has "nodes" and may be a node graph.
     bool isNodeGraph = false;
 
 private:
@@ -44,11 +44,11 @@ private:
     enum class Key : unsigned char;
     struct Level {
         Place place;
-        Key key;               // Of a record: the field that is being read.
-        std::uint32_t seen;    // Of a record: a bit for each field that is there.
-        std::size_t position;  // Of a list: of the element that is being read.
+        Key key;               // Records: the current field.
+        std::uint32_t seen;    // Records: a bit for each field that was seen.
+        std::size_t position;  // Lists: the current element.
     };
-    // What a port's values are read from, once its type is known.
+    // The fields of a port that can only be converted once its type is known.
     struct PortFields {
         Optional<unsigned char> subtype;
         Pending defaultValue, min, max, extra;
@@ -92,16 +92,16 @@ private:
 
     std::vector<Level> levels;
     std::deque<Patch> openPatches;
-    std::deque<std::deque<Patch>> patches;  // Of each open list.
+    std::deque<std::deque<Patch>> patches;  // One for each open list.
     std::deque<ModelLayer> openLayers;
     std::deque<std::deque<ModelLayer>> layers;
     Port port;
-    PortFields portFields;  // As new between ports.
+    PortFields portFields;  // Reset after each port.
     bool areFieldsSet = false;
     std::vector<Port> ports;
     Connection connection;
     std::deque<Connection> connections;
-    // What is wrong around the root: it counts unless the document turns out to be a node graph.
+    // An error outside the root, which only counts if the document is not a node graph.
     Optional<DocumentError> deferred;
     bool hasRoot = false;
     bool mayHaveAnyIdentifiers = false;

@@ -19,7 +19,7 @@ std::uint64_t bitsOf(double number) {
     return bits;
 }
 
-// Whether all of the text is that number, as it would be written.
+// Whether the whole string is that number, in the form in which it would be written.
 template <class Integer>
 bool isDecimal(std::string_view text, Integer& number) {
     char const* const end = text.data() + text.size();

@@ -1,4 +1,4 @@
-// Engine/Document/detail/values.h: the values of ports from their form in documents.
+// Engine/Document/detail/values.h: parses the values of ports.
 
 #ifndef TARN_ENGINE_DOCUMENT_DETAIL_VALUES_H
 #define TARN_ENGINE_DOCUMENT_DETAIL_VALUES_H
@@ -10,26 +10,26 @@
 
 namespace tarn::engine::detail {
 
-/// A value that was read and waits for its type.
+/// A parsed value whose type is not known yet.
 struct Pending {
     Scalar content = {};
     bool isGiven = false;
-    /// Its own type, where it is not the usual one, and whether its payload is none.
+    /// The explicit type, where it is not that of the port, and whether the payload is null.
     Optional<Type> type = {};
     bool isNullPayload = false;
 };
 
-/// Why something is not such a value, and the JSON pointer from it to the part that is to blame.
+/// Why a value is invalid, and the JSON pointer to the part that is wrong.
 struct ValueFault {
     std::string problem;
     std::string step;
 };
 
-/// The value of this type that the content stands for. False where it stands for none.
+/// Converts the content to a value of this type. False where that is impossible.
 bool toValue(Scalar const& content, Type type, Value& value, ValueFault& fault);
 
-/// A value of this type with a null payload, as one that was moved from has; of types without a
-/// payload the default value.
+/// A value of this type with a null payload, as a moved-from one has; for types without a payload
+/// the default value.
 Value nullValue(Type type);
 
 }  // namespace tarn::engine::detail
