@@ -1,4 +1,4 @@
-// Make values, read them as something else, compare them and print them.
+// Constructs values, converts, compares and prints them.
 //
 //     value_tour
 
@@ -11,7 +11,7 @@
 using namespace tarn::engine;
 
 int main() {
-    // Make: one of fourteen types, known by `type()`.
+    // Construct: `type()` tells one of fourteen types.
     Loop const values{Value(),
                       Value(2.5),
                       Value(-7),
@@ -22,7 +22,8 @@ int main() {
                       Value(PathBuilder().circle({0.0, 0.0}, 5.0).build()),
                       Value(Unstructured(Unstructured::Map{{"X", 30}, {"Y", 40}}))};
 
-    // Read: every value as every type. What has no answer is zero, false or empty, never an error.
+    // Convert: every value to every type. Conversions without a sensible result return zero, false
+    // or empty values, never an error.
     for (Value const& value : values) {
         double const number = value;
         long long const integer = value;
@@ -32,18 +33,18 @@ int main() {
                   << (value ? ", true\n" : ", false\n");
     }
 
-    // Read in place, without a copy: null where the value is of another type.
+    // Access without a copy: null where the value has another type.
     if (std::string const* text = values[6].ifString()) std::cout << text->size() << " bytes\n";
-    if (values[1].ifString() == nullptr) std::cout << values[1] << " is no text\n";
+    if (values[1].ifString() == nullptr) std::cout << values[1] << " is not a string\n";
 
-    // Convert: into another type, or into a port's type within its bounds.
+    // Convert to another type, or clamp to the bounds of a port.
     std::cout << values[8] << " as a position: " << values[8].asType(Type::Vec2) << "\n";
     TypeInfo port;
     port.type = Type::Float;
     port.max = Value(2.0);
     std::cout << values[1] << " at most 2: " << castValueToType(values[1], port) << "\n";
 
-    // Compare: values of different types differ, whatever they read as.
+    // Compare: values of different types differ, whatever they convert to.
     std::cout << std::boolalpha << "1 and 1.0: " << (Value(1) == Value(1.0)) << "\n"
               << "2.5 and 2.5: " << (Value(2.5) == values[1]) << "\n";
 }

@@ -1,4 +1,4 @@
-// What each operation takes from the heap: a table of blocks, exact, for every module.
+// The number of heap allocations of each operation, exactly, for every module.
 
 #include <Engine/Base/easing.h>
 #include <Engine/Base/patch_index.h>
@@ -48,7 +48,7 @@ std::string withRoom(std::size_t bytes) {
     return text;
 }
 
-// Results are kept until the count is read: what they hold was allocated too.
+// Results live until the count is read, since their content was allocated too.
 struct Kept {
     Value value;
     Unstructured data;
@@ -73,7 +73,7 @@ double sum(Vector v) {
 }
 
 std::vector<Row> const kRows{
-    // Values: nothing for what is held inline, one block for what is shared.
+    // Values: nothing for inline content, one allocation for shared content.
     {"value of nothing", 0, [](Inputs const&, Kept& k) { k.value = Value(); }},
     {"value of a double", 0, [](Inputs const&, Kept& k) { k.value = 2.5; }},
     {"value of an integer", 0, [](Inputs const&, Kept& k) { k.value = 7; }},
@@ -175,7 +175,8 @@ std::vector<Row> const kRows{
     {"number as a text", 1,
      [](Inputs const& in, Kept& k) { k.value = in.number.asType(Type::String); }},
 
-    // Data: a block for each map, array and text, those of the standard containers, and no more.
+    // Unstructured data: one allocation for each map, array and string, plus those of the standard
+    // containers.
     {"null data", 0, [](Inputs const&, Kept& k) { k.data = Unstructured(); }},
     {"data of a number", 0, [](Inputs const&, Kept& k) { k.data = 2.5; }},
     {"data of integers", 0,
@@ -204,7 +205,7 @@ std::vector<Row> const kRows{
     {"equality of data", 0,
      [](Inputs const& in, Kept& k) { k.number += in.map == in.map && in.numbers != in.word; }},
 
-    // Paths: the list of elements alone.
+    // Paths: only the list of elements.
     {"path of 100 elements of up to three points", 1,
      [](Inputs const&, Kept& k) {
          k.path.elements.reserve(100);
@@ -258,7 +259,7 @@ std::vector<Row> const kRows{
          k.value = ease(EasingFunction::CubicIn, in.number, in.number, 0.5);
      }},
 
-    // Graphs: queries allocate for the sets that they return, queries of an index never.
+    // Graphs: queries allocate only the sets that they return, queries of an index nothing.
     {"copy of a patch", 0, [](Inputs const& in, Kept& k) { k.patch = in.root; }},
     {"equality of patches", 0,
      [](Inputs const& in, Kept& k) { k.number += in.root == in.root ? 1 : 0; }},
@@ -281,7 +282,7 @@ std::vector<Row> const kRows{
 
 }  // namespace
 
-TEST(Allocations, AreTheseForEachOperation) {
+TEST(Allocations, MatchTheTable) {
     Inputs const inputs;
     for (Row const& row : kRows) {
         Kept kept;
@@ -291,12 +292,12 @@ TEST(Allocations, AreTheseForEachOperation) {
     }
 }
 
-TEST(Allocations, AreGivenBack) {
+TEST(Allocations, AreFreed) {
     auto const use = [](Row const& row) {
         Inputs const inputs;
         Kept kept;
         row.run(inputs, kept);
-        // Over what is there already, by copy and by move.
+        // Assignments to existing objects, by copy and by move.
         Kept const copy = kept;
         row.run(inputs, kept);
         kept = copy;
@@ -310,7 +311,7 @@ TEST(Allocations, AreGivenBack) {
         kept.path = Path();
     };
     for (Row const& row : kRows) {
-        use(row);  // What is made at first use stays.
+        use(row);  // Lazily initialised statics stay allocated.
         AllocationCounter const counter;
         use(row);
         EXPECT_EQ(counter.held(), 0u) << row.operation;

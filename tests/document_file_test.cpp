@@ -1,4 +1,4 @@
-// Files of documents: what is there after each way in which saving can end.
+// Saving documents to files: the content of the file after each way in which saving can end.
 
 #include <Engine/Document/document.h>
 
@@ -61,7 +61,7 @@ protected:
 
 }  // namespace
 
-TEST_F(ReplaceFile, MakesAFileAndReplacesIt) {
+TEST_F(ReplaceFile, CreatesAndReplacesAFile) {
     for (std::string const& content : {std::string("first"), std::string(),
                                        std::string(3000000, 'x'), std::string("\0\r\n", 3)}) {
         DocumentError error;
@@ -81,7 +81,7 @@ TEST_F(ReplaceFile, SavesAndLoadsDocuments) {
     EXPECT_EQ(contentsOf(file), writeDocument(root, 24.0));
 }
 
-TEST_F(ReplaceFile, SaysWhyAFileCannotBeLoaded) {
+TEST_F(ReplaceFile, ReportsWhyAFileCannotBeLoaded) {
     DocumentError error;
     EXPECT_FALSE(loadDocument((folder / "none").string(), &error));
     EXPECT_EQ(error.message, "there is no such file");
@@ -96,7 +96,7 @@ TEST_F(ReplaceFile, SaysWhyAFileCannotBeLoaded) {
 
 #if !defined(_WIN32) && !defined(__EMSCRIPTEN__)
 
-TEST_F(ReplaceFile, TakesTheLongestNames) {
+TEST_F(ReplaceFile, AcceptsTheLongestFileNames) {
     fs::path const longest = folder / std::string(255, 'n');
     EXPECT_TRUE(replaceFile(longest.string(), "x"));
     EXPECT_EQ(contentsOf(longest), "x");
@@ -126,7 +126,7 @@ TEST_F(ReplaceFile, KeepsPermissionsAndLinks) {
     EXPECT_EQ(fs::status(folder / "new.json").permissions(), fs::perms(0640));
 }
 
-TEST_F(ReplaceFile, LeavesTheFileWhereTheFolderMayNotBeWritten) {
+TEST_F(ReplaceFile, KeepsTheFileWhenTheFolderIsReadOnly) {
     if (::geteuid() == 0) GTEST_SKIP() << "root may write everywhere";
     std::ofstream(file) << "old";
     fs::permissions(folder, fs::perms(0500));
@@ -137,9 +137,9 @@ TEST_F(ReplaceFile, LeavesTheFileWhereTheFolderMayNotBeWritten) {
     EXPECT_EQ(files(), 1u);
 }
 
-TEST_F(ReplaceFile, LeavesTheFileWhereNoMoreMayBeWritten) {
+TEST_F(ReplaceFile, KeepsTheFileAtTheSizeLimitOfTheProcess) {
     std::ofstream(file) << "old";
-    // In a process of its own: the limit is one of processes.
+    // In a child process, because the limit is per process.
     pid_t const child = ::fork();
     ASSERT_GE(child, 0);
     if (child == 0) {
@@ -157,7 +157,7 @@ TEST_F(ReplaceFile, LeavesTheFileWhereNoMoreMayBeWritten) {
     EXPECT_EQ(files(), 1u);
 }
 
-TEST_F(ReplaceFile, LeavesTheFileOnAFullDisk) {
+TEST_F(ReplaceFile, KeepsTheFileWhenTheDiskIsFull) {
     fs::path const disk = folder / "disk";
     fs::create_directory(disk);
     if (::mount("tmpfs", disk.c_str(), "tmpfs", 0, "size=256k") != 0) {
@@ -176,7 +176,7 @@ TEST_F(ReplaceFile, LeavesTheFileOnAFullDisk) {
     EXPECT_EQ(::umount(disk.c_str()), 0);
 }
 
-TEST_F(ReplaceFile, LeavesTheOldFileOrTheNewOne) {
+TEST_F(ReplaceFile, ShowsReadersTheOldOrTheNewContent) {
     tests::Random random(50);
     constexpr std::size_t kSize = 2000000;
     ASSERT_TRUE(replaceFile(file.string(), std::string(kSize, 'a')));
@@ -188,7 +188,7 @@ TEST_F(ReplaceFile, LeavesTheOldFileOrTheNewOne) {
                 replaceFile(file.string(), std::string(kSize, c));
             }
         }
-        // The first is let go on until it has replaced the file.
+        // The first writer waits here until it has replaced the file.
         while (i == 0 && contentsOf(file)[0] == 'a') std::this_thread::yield();
         std::this_thread::sleep_for(std::chrono::microseconds(random.below(20000)));
         ::kill(child, SIGKILL);

@@ -1,4 +1,4 @@
-// The page and the picture that the example program writes of a document.
+// The HTML report and the picture that the example program writes.
 
 #include "support/document_road.h"
 
@@ -17,10 +17,10 @@ std::string const kDocuments = TARN_DOCUMENTS_DIR "/";
 
 }  // namespace
 
-TEST_F(DocumentRoadPage, WritesAPageThatNeedsNothingElse) {
+TEST_F(DocumentRoadPage, WritesASelfContainedPage) {
     struct Row {
         char const* arguments;
-        // What the page shows of the document.
+        // The parts of the document that the page shows.
         std::vector<std::string> shown;
     };
     for (Row const& row : {
@@ -64,7 +64,7 @@ TEST_F(DocumentRoadPage, WritesAPageThatNeedsNothingElse) {
     }
 }
 
-TEST_F(DocumentRoadPage, ShowsNamesInThePageAsTheyAre) {
+TEST_F(DocumentRoadPage, EscapesNamesInThePage) {
     std::string const name = R"(</script><img src=x>\"&'{{TITLE}})";
     std::string const file =
         write("names.json", document(R"({"id":2,"kind":"text","name":")" + name +
@@ -94,7 +94,7 @@ TEST_F(DocumentRoadPage, WritesAPageForEveryRootThatHasAtMostOnePatch) {
     }
 }
 
-TEST_F(DocumentRoadPage, SaysWhyAPageOrPictureCannotBeWritten) {
+TEST_F(DocumentRoadPage, ReportsWhyAPageOrPictureCannotBeWritten) {
     std::string const nowhere = (folder / "nowhere" / "file").string();
     for (char const* option : {" --report ", " --picture "}) {
         SCOPED_TRACE(option);
@@ -114,7 +114,7 @@ TEST_F(DocumentRoadPage, SaysWhyAPageOrPictureCannotBeWritten) {
     EXPECT_EQ(contentsOf(file), "as it was");
 }
 
-TEST_F(DocumentRoadPage, WritesPagesThatAreNoFilesAndKeepsTheDocument) {
+TEST_F(DocumentRoadPage, WritesToDevicesAndNeverOverwritesTheDocument) {
     std::string const contents = document(R"({"id":2})");
     std::string const file = write("document.json", contents);
     for (char const* option : {" --report ", " --picture "}) {
@@ -133,8 +133,8 @@ TEST_F(DocumentRoadPage, WritesPagesThatAreNoFilesAndKeepsTheDocument) {
               0);
 }
 
-TEST_F(DocumentRoadPage, KeepsAPageSmallWhereTheFramesAreNot) {
-    // A loop of a thousand circles that move.
+TEST_F(DocumentRoadPage, LimitsTheSizeOfAPage) {
+    // A loop of a thousand moving circles.
     std::string const file = write("loop.json", R"({"framesPerSecond":60,"root":{"id":1,
         "outputs":[{"id":2,"type":"path","name":"dots"}],"children":[
         {"id":3,"kind":"loop","inputs":[{"id":31,"type":"int","default":1000}],

@@ -1,4 +1,4 @@
-// The example program, as its users run it: what it prints, and what it says to bad input.
+// The example program, run from the command line: its output, and its messages for invalid input.
 
 #include "support/document_road.h"
 #include "support/random.h"
@@ -50,7 +50,7 @@ TEST_F(DocumentRoad, PrintsTheBundledDocuments) {
     }
 }
 
-TEST_F(DocumentRoad, RefusesBadInputInOneLine) {
+TEST_F(DocumentRoad, RejectsInvalidInputInOneLine) {
     std::string deep = R"({"root":)";
     for (int i = 0; i < 1000; ++i) deep += R"({"id":)" + std::to_string(i + 1) + R"(,"children":[)";
     deep += R"({"id":1001})";
@@ -63,7 +63,7 @@ TEST_F(DocumentRoad, RefusesBadInputInOneLine) {
     for (Row const& row : {
              Row{"empty", "", "it is empty"},
              Row{"truncated", "{\"root\":\n {\"id\": 1,",
-                 "line 2, column 11: /root/id: the JSON ends too early"},
+                 "line 2, column 11: /root/id: the JSON is incomplete"},
              Row{"another object", "{}",
                  "line 1, column 1: neither a document (it has no \"root\") nor a node graph (it "
                  "has no "
@@ -87,7 +87,7 @@ TEST_F(DocumentRoad, RefusesBadInputInOneLine) {
     }
 }
 
-TEST_F(DocumentRoad, SavesWhatItReadInTheOwnForm) {
+TEST_F(DocumentRoad, SavesInTheOwnFormat) {
     for (std::string const name : {"animation.json", "small.json", "node_graph.json"}) {
         SCOPED_TRACE(name);
         std::string const copy = (folder / "copy.json").string();
@@ -96,7 +96,7 @@ TEST_F(DocumentRoad, SavesWhatItReadInTheOwnForm) {
         Outcome const second = run(copy + " --debug --frames 3 --write " + copy);
         EXPECT_EQ(second.status, 0);
         EXPECT_EQ(second.errors, "");
-        // The graph, its notes aside, and what it computes.
+        // The graph without its notes, and its results.
         EXPECT_EQ(second.output.substr(second.output.find("\n\n")),
                   first.output.substr(first.output.find("\n\n")));
         std::string const saved = contentsOf(copy);
@@ -110,7 +110,7 @@ TEST_F(DocumentRoad, SavesWhatItReadInTheOwnForm) {
     EXPECT_NE(refused.errors.find("cannot be written"), std::string::npos);
 }
 
-TEST_F(DocumentRoad, RefusesWhatIsNoFile) {
+TEST_F(DocumentRoad, RejectsFoldersAndMissingFiles) {
     struct Row {
         std::string file;
         char const* line;
@@ -126,7 +126,7 @@ TEST_F(DocumentRoad, RefusesWhatIsNoFile) {
     }
 }
 
-TEST_F(DocumentRoad, RefusesAHundredMegabytesOfBracketsAtOnce) {
+TEST_F(DocumentRoad, RejectsAHundredMegabytesOfBracketsQuickly) {
     for (std::string const bracket : {"[", "{"}) {
         std::string const file = write("brackets.json", std::string(100 << 20, bracket[0]));
         Outcome const outcome = run(file);
@@ -138,7 +138,7 @@ TEST_F(DocumentRoad, RefusesAHundredMegabytesOfBracketsAtOnce) {
     }
 }
 
-TEST_F(DocumentRoad, RefusesIdentifiersAndOptionsThatItDoesNotKnow) {
+TEST_F(DocumentRoad, RejectsUnknownIdentifiersAndOptions) {
     struct Row {
         char const* arguments;
         char const* line;
@@ -165,7 +165,7 @@ TEST_F(DocumentRoad, RefusesIdentifiersAndOptionsThatItDoesNotKnow) {
     EXPECT_EQ(run("--help").status, 0);
 }
 
-TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
+TEST_F(DocumentRoad, ReadsNodeGraphsAndReportsWhatIsMissing) {
     std::string const file = write(
         "graph.json",
         graph(R"([{"id":5,"type":"basic/const","outputs":[{"name":"value","type":"number"}],
@@ -208,7 +208,7 @@ TEST_F(DocumentRoad, ReadsNodeGraphsAndNamesWhatIsMissing) {
                               "0\n");
 }
 
-TEST_F(DocumentRoad, ReadsTheDocumentThatItsFormIsExplainedWith) {
+TEST_F(DocumentRoad, ReadsTheExampleInTheFormatsDocumentation) {
     std::string const page = contentsOf(kDocuments + "README.md");
     std::string const open = "```json\n";
     std::size_t const begin = page.find(open);
@@ -223,7 +223,7 @@ TEST_F(DocumentRoad, ReadsTheDocumentThatItsFormIsExplainedWith) {
                               "frame  radius\n0      0\n");
 }
 
-TEST_F(DocumentRoad, TellsTheOutputsOfTimeNodesApart) {
+TEST_F(DocumentRoad, DistinguishesTheOutputsOfTimeNodes) {
     Outcome const outcome = run(write("time.json", graph(R"([{"id":1,"type":"basic/time","outputs":[
         {"name":"in ms","type":"number"},{"name":"in sec","type":"number"}]}])")) +
                                 " --frames 31 --every 30");
@@ -233,7 +233,7 @@ TEST_F(DocumentRoad, TellsTheOutputsOfTimeNodesApart) {
 }
 
 TEST_F(DocumentRoad, EvaluatesEveryKind) {
-    // The outputs of each kind from constant inputs, as the table of frame 3 shows them.
+    // The outputs of each kind for constant inputs, as the table of frame 3 prints them.
     struct Row {
         char const* kind;
         char const* inputs;
@@ -330,7 +330,7 @@ TEST_F(DocumentRoad, EvaluatesEveryKind) {
     }
 }
 
-TEST_F(DocumentRoad, EvaluatesCirclesOfConnectionsWithTheFrameBefore) {
+TEST_F(DocumentRoad, EvaluatesCyclesWithThePreviousFrame) {
     std::string const counter = document(
         R"({"id":2,"kind":"add","inputs":[{"id":21,"type":"int"},{"id":22,"type":"int","default":1}],
             "outputs":[{"id":23,"type":"int"},{"id":24,"type":"int","tag":1}]})",
@@ -343,7 +343,7 @@ TEST_F(DocumentRoad, EvaluatesCirclesOfConnectionsWithTheFrameBefore) {
                               "frame  2\n0      1\n1      2\n2      3\n3      4\n");
 }
 
-TEST_F(DocumentRoad, EvaluatesGraphsWhoseConnectionsLeadNowhere) {
+TEST_F(DocumentRoad, EvaluatesGraphsWithDanglingConnections) {
     std::string const file =
         write("nowhere.json", R"({"identifiers":"any","root":{"id":1,"children":[
             {"id":2,"kind":"add","inputs":[{"id":21,"type":"int","default":3}],
@@ -355,8 +355,8 @@ TEST_F(DocumentRoad, EvaluatesGraphsWhoseConnectionsLeadNowhere) {
     EXPECT_NE(outcome.output.find("2 connections\n"), std::string::npos) << outcome.output;
 }
 
-// Whatever stands in a file, the answer is a document or one line.
-TEST_F(DocumentRoad, SurvivesDamagedDocuments) {
+// For any file the result is a document or an error of one line.
+TEST_F(DocumentRoad, SurvivesCorruptedDocuments) {
     tests::Random random(77);
     std::string const original = contentsOf(kDocuments + "node_graph.json");
     std::string const own = contentsOf(kDocuments + "small.json");
@@ -408,9 +408,9 @@ TEST_F(DocumentRoad, ComparesTwoDocuments) {
                  ""},
              Row{"a foreign one", foreign + " --compare " + foreign, 0, "", ""},
              Row{"a wrong one", first + " --compare " + wrong, 2, "",
-                 "document_road: " + wrong + ": line 1, column 2: the JSON ends too early\n"},
+                 "document_road: " + wrong + ": line 1, column 2: the JSON is incomplete\n"},
              Row{"a wrong first one", wrong + " --compare " + first, 2, "",
-                 "document_road: " + wrong + ": line 1, column 2: the JSON ends too early\n"},
+                 "document_road: " + wrong + ": line 1, column 2: the JSON is incomplete\n"},
              Row{"none", first + " --compare " + first + "x", 2, "",
                  "document_road: " + first + "x: there is no such file\n"},
              Row{"a page over it", first + " --compare " + second + " --report " + second, 2, "",
@@ -431,7 +431,7 @@ TEST_F(DocumentRoad, ComparesTwoDocuments) {
           "<a href=\"#patch-3\">patch 3 from patch 1</a>", "id=\"patch-3\"", "id=\"changes\""}) {
         EXPECT_NE(page.find(part), std::string::npos) << part;
     }
-    // There is nothing to play, nothing to plot, and no attribute.
+    // A page without animation, plots and attributes.
     for (char const* part : {"id=\"animation\"", "id=\"outputs\"", "id=\"attributes\"", "{{"}) {
         EXPECT_EQ(page.find(part), std::string::npos) << part;
     }

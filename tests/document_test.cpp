@@ -34,7 +34,7 @@ std::string errorOf(std::string_view text) {
     return stream.str();
 }
 
-// A document of a root and one child, with holes for what is to be wrong.
+// A document with a root and one child; the arguments are the parts that a test varies.
 std::string document(std::string const& child, std::string const& connections = "[]") {
     return R"({"root":{"id":1,"children":[)" + child + R"(],"connections":)" + connections + "}}";
 }
@@ -47,7 +47,7 @@ std::string graph(std::string const& nodes, std::string const& links = "[]") {
     return R"({"nodes":)" + nodes + R"(,"links":)" + links + "}";
 }
 
-// Whether everything is the same to the last bit: NaNs equal themselves, and 0.0 is not -0.0.
+// Equal to the last bit: a NaN equals itself, and 0.0 differs from -0.0.
 bool same(double a, double b) { return tests::bits(a) == tests::bits(b); }
 
 bool same(Unstructured const& a, Unstructured const& b) {
@@ -140,7 +140,7 @@ bool same(Patch const& a, Patch const& b) {
     return true;
 }
 
-// Records that hold whatever they can hold.
+// Random records with every kind of content.
 class AnyRecords {
 public:
     explicit AnyRecords(std::uint64_t seed) : random(seed) {}
@@ -313,8 +313,8 @@ private:
 
 }  // namespace
 
-TEST(WriteDocument, IsReadBackToTheLastBit) {
-    // Some of them for whoever wants to look at them: tests/schema does.
+TEST(WriteDocument, RoundTripsToTheLastBit) {
+    // tests/schema validates these documents.
     char const* const folder = std::getenv("TARN_WRITTEN_DOCUMENTS");
     AnyRecords any(40);
     for (int i = 0; i < 3000; ++i) {
@@ -332,7 +332,7 @@ TEST(WriteDocument, IsReadBackToTheLastBit) {
     }
 }
 
-TEST(WriteDocument, HasALineForEachRecord) {
+TEST(WriteDocument, WritesOneLinePerRecord) {
     Patch root;
     root.id = 1;
     root.builtin = 1;
@@ -367,7 +367,7 @@ TEST(WriteDocument, HasALineForEachRecord) {
         "{\"version\":1,\"identifiers\":\"any\",\"root\":\n{\"id\":0,\"kind\":\"unknown\"}}\n");
 }
 
-TEST(WriteDocument, WritesWhatJsonHasNoFormOf) {
+TEST(WriteDocument, EncodesWhatJsonCannotExpress) {
     struct Row {
         char const* what;
         Value value;
@@ -411,7 +411,7 @@ TEST(WriteDocument, WritesWhatJsonHasNoFormOf) {
     }
 }
 
-TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
+TEST(ReadDocument, RejectsInvalidDocuments) {
     std::string const float2 = R"({"id":2,"outputs":[{"id":3,"type":"float"}]})";
     struct Row {
         char const* what;
@@ -423,8 +423,8 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
             Row{"empty", "", "it is empty"},
             Row{"blank", " \n\t\n", "it is empty"},
             Row{"truncated", "{\"root\":\n {\"id\": 1,",
-                "line 2, column 11: /root/id: the JSON ends too early"},
-            Row{"truncated text", "{\"root", "line 1, column 7: the JSON ends too early"},
+                "line 2, column 11: /root/id: the JSON is incomplete"},
+            Row{"truncated text", "{\"root", "line 1, column 7: the JSON is incomplete"},
             Row{"no JSON", "{\"root\": nonsense}",
                 "line 1, column 11: /root: this is not valid JSON"},
             Row{"two documents", "{}{}", "line 1, column 3: this is not valid JSON"},
@@ -449,7 +449,8 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
             Row{"root is a list", R"({"root":[[1],2]})",
                 "line 1, column 9: /root: expected an object, found array"},
             Row{"another version", R"({"version":2,"root":{"id":1}})",
-                "line 1, column 12: /version: version 2 of the form; the only one that is known is "
+                "line 1, column 12: /version: version 2 of the format is not supported; the latest "
+                "is "
                 "1"},
             Row{"version is a text", R"({"root":{"id":1},"version":"1"})",
                 "line 1, column 28: /version: expected an integer, found string \"1\""},
@@ -457,17 +458,16 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "line 1, column 16: /identifiers: expected \"unique\" or \"any\", found string "
                 "\"all\""},
             Row{"schema", R"({"$schema":1,"root":{"id":1}})",
-                "line 1, column 12: /$schema: expected a text, found number 1"},
+                "line 1, column 12: /$schema: expected a string, found number 1"},
             Row{"unknown key beside the root", R"({"extra":{"a":[{}]},"root":{"id":1}})",
                 "line 1, column 10: /extra: unknown key \"extra\""},
             Row{"frame rate", R"({"framesPerSecond":0,"root":{"id":1}})",
                 "line 1, column 20: /framesPerSecond: expected a number above 0"},
             Row{"key twice", R"({"root":{"id":1,"id":1}})",
-                "line 1, column 15: /root/id: the key \"id\" is there twice"},
+                "line 1, column 15: /root/id: the key \"id\" is repeated"},
             Row{"no identifier", R"({"root":{}})", "line 1, column 9: /root: \"id\" is missing"},
             Row{"identifier 0", R"({"root":{"id":0}})",
-                "line 1, column 15: /root/id: the identifier 0 stands for nothing; identifiers "
-                "start at 1"},
+                "line 1, column 15: /root/id: identifier 0 is reserved; identifiers start at 1"},
             Row{"negative identifier", R"({"root":{"id":-1}})",
                 "line 1, column 15: /root/id: expected an identifier, an integer from 0 on, found "
                 "number -1"},
@@ -493,8 +493,8 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "line 1, column 75: /root/children/0/inputs/1/id: the port identifier 3 is used "
                 "twice"},
             Row{"port 0", port(R"("type":"int"},{"id":0,"type":"int")"),
-                "line 1, column 75: /root/children/0/inputs/1/id: the identifier 0 stands for "
-                "nothing; identifiers start at 1"},
+                "line 1, column 75: /root/children/0/inputs/1/id: identifier 0 is reserved; "
+                "identifiers start at 1"},
             Row{"unknown key", document(R"({"id":2,"a/b~c":1})"),
                 "line 1, column 45: /root/children/0/a~1b~0c: unknown key \"a/b~c\""},
             Row{"child is a number", document("5"),
@@ -515,7 +515,7 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "line 1, column 62: /root/children/0/inputs/0/type: expected an integer from 0 to "
                 "255"},
             Row{"value type is null", port(R"("type":null)"),
-                "line 1, column 62: /root/children/0/inputs/0/type: expected a text, found null"},
+                "line 1, column 62: /root/children/0/inputs/0/type: expected a string, found null"},
             Row{"no value type", port(R"("name":"x")"),
                 "line 1, column 47: /root/children/0/inputs/0: \"type\" is missing"},
             Row{"subtype beyond a byte", port(R"("type":"int","subtype":-1)"),
@@ -525,12 +525,13 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "line 1, column 74: /root/children/0/inputs/0/tag: expected an identifier, an "
                 "integer from 0 on, found string \"x\""},
             Row{"name is a number", port(R"("type":"int","name":5)"),
-                "line 1, column 75: /root/children/0/inputs/0/name: expected a text, found number "
+                "line 1, column 75: /root/children/0/inputs/0/name: expected a string, found "
+                "number "
                 "5"},
             Row{"name has half an escape", R"({"root":{"id":1,"name":"\u001af"}})",
-                "line 1, column 24: /root/name: U+001A stands before two hexadecimal digits"},
+                "line 1, column 24: /root/name: U+001A must be followed by two hexadecimal digits"},
             Row{"key has half an escape", R"({"root":{"id":1,"attributes":{"\u001a":0}}})",
-                "line 1, column 30: /root/attributes: U+001A stands before two hexadecimal "
+                "line 1, column 30: /root/attributes: U+001A must be followed by two hexadecimal "
                 "digits"},
             Row{"children is a text", R"({"root":{"id":1,"children":"x"}})",
                 "line 1, column 28: /root/children: expected an array, found string \"x\""},
@@ -583,9 +584,8 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
                 "found "
                 "null"},
             Row{"path element", port(R"("type":"path","default":[[]])"),
-                "line 1, column 80: /root/children/0/inputs/0/default/0: a path element begins "
-                "with "
-                "its name"},
+                "line 1, column 80: /root/children/0/inputs/0/default/0: a path element starts "
+                "with its name"},
             Row{"path element by number", port(R"("type":"path","default":[[1]])"),
                 "line 1, column 81: /root/children/0/inputs/0/default/0/0: expected the name of a "
                 "path instruction, found number 1"},
@@ -603,10 +603,10 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
             Row{"min", port(R"("type":"float","min":null,"max":[])"),
                 "line 1, column 87: /root/children/0/inputs/0/max: expected a number, found array"},
             Row{"type of no value", port(R"("type":"float","minType":"int")"),
-                "line 1, column 80: /root/children/0/inputs/0/minType: it does not go with the "
+                "line 1, column 80: /root/children/0/inputs/0/minType: it does not match the "
                 "value"},
             Row{"null payload and a value", port(R"("type":"float","min":1,"minType":"null path")"),
-                "line 1, column 88: /root/children/0/inputs/0/minType: it does not go with the "
+                "line 1, column 88: /root/children/0/inputs/0/minType: it does not match the "
                 "value"},
             Row{"null payload of a number", port(R"("type":"float","minType":"null int")"),
                 "line 1, column 80: /root/children/0/inputs/0/minType: unknown value type \"null "
@@ -614,10 +614,10 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
             Row{"attributes", document(R"({"id":2,"attributes":[]})"),
                 "line 1, column 50: /root/children/0/attributes: expected an object, found array"},
             Row{"attribute twice", document(R"({"id":2,"attributes":{"a":{"b":1,"b":2}}})"),
-                "line 1, column 55: /root/children/0/attributes/a: the key \"b\" is there twice"},
+                "line 1, column 55: /root/children/0/attributes/a: the key \"b\" is repeated"},
             Row{"attribute with a mark", document(R"({"id":2,"attributes":{"a":{"$x":1}}})"),
-                "line 1, column 55: /root/children/0/attributes/a: the key \"$x\" has no meaning; "
-                "one that begins with $ is written with $$"},
+                "line 1, column 55: /root/children/0/attributes/a: the key \"$x\" is unknown; a "
+                "key that begins with $ is written with $$"},
             Row{"no such number", document(R"({"id":2,"attributes":{"a":{"$float":1}}})"),
                 "line 1, column 55: /root/children/0/attributes/a: \"$float\" has no such value"},
             Row{"model layer", R"({"root":{"id":1,"modelLayer":{"id":1,"children":[{}]}}})",
@@ -646,7 +646,7 @@ TEST(ReadDocument, RefusesWhatIsNotTheOwnForm) {
     }
 }
 
-TEST(ReadDocument, TakesFieldsInAnyOrderAndNullForNone) {
+TEST(ReadDocument, AcceptsFieldsInAnyOrderAndNullForMissing) {
     Optional<Patch> const plain = readDocument(
         R"({"root":{"children":[{"inputs":[{"default":[1,2],"type":"vec2","id":3}],"kind":"add",
         "id":2}],"id":1},"version":1,"$schema":"document.schema.json","framesPerSecond":null})");
@@ -660,14 +660,14 @@ TEST(ReadDocument, TakesFieldsInAnyOrderAndNullForNone) {
               readDocument(R"({"root":{"id":1}})"));
 }
 
-TEST(ReadDocument, TakesRepeatedIdentifiersWhereTheDocumentSaysSo) {
+TEST(ReadDocument, AcceptsRepeatedIdentifiersWhereDeclared) {
     Optional<Patch> const root = readDocument(R"({"identifiers":"any","root":{"id":0,"children":[
         {"id":0}],"connections":[{"from":[1,2],"to":[3,4]}]}})");
     ASSERT_TRUE(root.hasValue());
     EXPECT_EQ(*root->connections, (std::vector<Connection>{{1, 2, 3, 4}}));
 }
 
-TEST(ReadDocument, TellsFormAndFrameRate) {
+TEST(ReadDocument, ReportsFormatAndFrameRate) {
     DocumentInfo info;
     ASSERT_TRUE(readDocument(R"({"framesPerSecond":12,"root":{"id":1}})", nullptr, &info));
     EXPECT_EQ(info.form, DocumentInfo::Form::Own);
@@ -690,7 +690,7 @@ TEST(ReadDocument, TellsFormAndFrameRate) {
     EXPECT_FALSE(readDocument("[]"));
 }
 
-TEST(ReadDocument, RefusesNodeGraphsOfAnotherShape) {
+TEST(ReadDocument, RejectsInvalidNodeGraphs) {
     struct Row {
         char const* what;
         std::string text;
@@ -706,7 +706,7 @@ TEST(ReadDocument, RefusesNodeGraphsOfAnotherShape) {
              Row{"no identifier", graph(R"([{"type":"x"}])"),
                  "line 1, column 11: /nodes/0: \"id\" is missing"},
              Row{"identifier", graph(R"([{"id":[],"type":"x"}])"),
-                 "line 1, column 17: /nodes/0/id: expected a number or a text, found array"},
+                 "line 1, column 17: /nodes/0/id: expected a number or a string, found array"},
              Row{"properties", graph(R"([{"id":1,"type":"x","properties":[]}])"),
                  "line 1, column 43: /nodes/0/properties: expected an object, found array"},
              Row{"inputs", graph(R"([{"id":1,"type":"x","inputs":5}])"),
@@ -714,11 +714,12 @@ TEST(ReadDocument, RefusesNodeGraphsOfAnotherShape) {
              Row{"port", graph(R"([{"id":1,"type":"x","inputs":[[]]}])"),
                  "line 1, column 40: /nodes/0/inputs/0: expected an object, found array"},
              Row{"port type", graph(R"([{"id":1,"type":"x","inputs":[{"type":{}}]}])"),
-                 "line 1, column 48: /nodes/0/inputs/0/type: expected a text, a number or a list"},
+                 "line 1, column 48: /nodes/0/inputs/0/type: expected a string, a number or a "
+                 "list"},
              Row{"port name", graph(R"([{"id":1,"type":"x","inputs":[{"name":5}]}])"),
-                 "line 1, column 48: /nodes/0/inputs/0/name: expected a text, found number 5"},
+                 "line 1, column 48: /nodes/0/inputs/0/name: expected a string, found number 5"},
              Row{"title", graph(R"([{"id":1,"type":"x","title":5}])"),
-                 "line 1, column 38: /nodes/0/title: expected a text, found number 5"},
+                 "line 1, column 38: /nodes/0/title: expected a string, found number 5"},
              Row{"links", R"({"nodes":[],"links":{}})",
                  "line 1, column 21: /links: expected an array, found object"},
              Row{"link", graph("[]", "[[1,2]]"),
@@ -734,7 +735,7 @@ TEST(ReadDocument, RefusesNodeGraphsOfAnotherShape) {
              Row{"number", graph("[1e999]"),
                  "line 1, column 11: /nodes/0: a number beyond the range of a double"},
              Row{"cut", R"({"nodes":[{"id":1,)",
-                 "line 1, column 19: /nodes/0/id: the JSON ends too early"},
+                 "line 1, column 19: /nodes/0/id: the JSON is incomplete"},
          }) {
         EXPECT_EQ(errorOf(row.text), row.error) << row.what;
     }
@@ -799,7 +800,7 @@ std::string withDefinitions(std::string const& nodes, std::string const& definit
 
 }  // namespace
 
-TEST(ReadDocument, LetsNodesKeepTheirIdentifiersBeforeOthersGetAFreeOne) {
+TEST(ReadDocument, KeepsExistingIdentifiersBeforeAssigningNewOnes) {
     DocumentInfo info;
     Optional<Patch> const root = readDocument(
         graph(R"([{"id":"a","type":"x"},{"id":1,"type":"y","subgraph":{"nodes":[{"id":0,"type":"z"},
@@ -813,11 +814,11 @@ TEST(ReadDocument, LetsNodesKeepTheirIdentifiersBeforeOthersGetAFreeOne) {
     EXPECT_EQ((*children[1].children)[1].id, 3u);
     EXPECT_EQ(children[2].id, 2u);
     EXPECT_EQ(info.renumberedNodes, 2u);
-    // A definition without a name is used by nobody.
+    // Nothing can use a definition without a name.
     EXPECT_TRUE(readDocument(
                     withDefinitions(R"([{"id":1,"type":""}])", R"({"nodes":[{"id":1,"type":""}]})"))
                     .hasValue());
-    // Whatever a node says twice, its nodes are there.
+    // Nodes with repeated members are kept.
     EXPECT_EQ(
         (*readDocument(graph(R"([{"id":1,"type":"g","subgraph":{"nodes":[{"id":2,"type":"x"}]},
                   "subgraph":{"nodes":[{"id":3,"type":"x"}]}}])"))
@@ -826,7 +827,7 @@ TEST(ReadDocument, LetsNodesKeepTheirIdentifiersBeforeOthersGetAFreeOne) {
         2u);
 }
 
-TEST(ReadDocument, PutsSharedDefinitionsIntoTheirUses) {
+TEST(ReadDocument, ExpandsSharedDefinitions) {
     DocumentInfo info;
     Optional<Patch> const root = readDocument(
         withDefinitions(R"([{"id":5,"type":"PAIR","inputs":[{"name":"b","type":"number"},
@@ -870,11 +871,11 @@ TEST(ReadDocument, PutsSharedDefinitionsIntoTheirUses) {
     EXPECT_EQ(info.summary(), "2 nodes renumbered, 1 definition not used");
 }
 
-TEST(ReadDocument, KeepsWhatHasTwoPlacesOrNone) {
+TEST(ReadDocument, KeepsAmbiguousAndUnknownMembersAsAttributes) {
     struct Row {
         char const* what;
         std::string text;
-        char const* patch;  // As it is written, all of the first child.
+        char const* patch;  // The complete first child, as written.
     };
     for (
         Row const& row : {
@@ -937,7 +938,7 @@ TEST(ReadDocument, KeepsWhatHasTwoPlacesOrNone) {
                               "/links/0: link 4 left out: there is no node at one of its ends"});
 }
 
-TEST(ReadDocument, FindsNodesOfAnyName) {
+TEST(ReadDocument, ConnectsNodesWithAnyNumberAsIdentifier) {
     Optional<Patch> const root =
         readDocument(graph(R"([{"id":18446744073709552000,"type":"x","outputs":[{"name":"o"}]},
                   {"id":18446744073709551615,"type":"x","inputs":[{"name":"i"}]},
@@ -948,7 +949,7 @@ TEST(ReadDocument, FindsNodesOfAnyName) {
     EXPECT_EQ(*root->connections, (std::vector<Connection>{{1, 1, 2, 2}, {1, 1, 3, 3}}));
 }
 
-TEST(ReadDocument, TakesDefinitionsInsideOthers) {
+TEST(ReadDocument, ExpandsNestedDefinitions) {
     std::string const outer = R"({"id":"OUTER","name":"Outer","nodes":[{"id":1,"type":"PAIR"},
         {"id":2,"type":"PAIR"},{"id":3,"type":"inline","subgraph":{"nodes":[{"id":4,"type":"PAIR"}]}}]})";
     Optional<Patch> const root = readDocument(withDefinitions(
@@ -959,12 +960,13 @@ TEST(ReadDocument, TakesDefinitionsInsideOthers) {
         for (Patch const& child : *patch.children) result += count(child);
         return result;
     };
-    // In each of two uses: itself, three pairs with three patches inside, and the inline group.
+    // In each of two uses: the node itself, three pairs with three patches inside, and the inline
+    // group.
     EXPECT_EQ(count(*root), 1u + 2 * (1 + 3 * 4 + 1));
     EXPECT_EQ(readDocument(writeDocument(*root)), root);
 }
 
-TEST(ReadDocument, RefusesDefinitionsWithoutEnd) {
+TEST(ReadDocument, RejectsRecursiveAndHugeDefinitions) {
     auto const definition = [](std::string const& id, std::string const& nodes) {
         return R"({"id":")" + id + R"(","name":"N)" + id + R"(","nodes":[)" + nodes + "]}";
     };
@@ -979,7 +981,7 @@ TEST(ReadDocument, RefusesDefinitionsWithoutEnd) {
                 definition("C", R"({"id":1,"type":"y","subgraph":{"nodes":[)" + use("B") + "]}}"))),
         "line 1, column 227: /definitions/subgraphs/2/nodes/0/subgraph/nodes/0: the shared "
         "definition \"NB\" contains itself: \"NB\" > \"NC\" > \"NB\"");
-    // Each twice in the next: a million million nodes.
+    // Each definition uses the next one twice: a million million nodes.
     std::string many = definition("D0", use("x"));
     for (int i = 1; i <= 40; ++i) {
         std::string const inner = use("D" + std::to_string(i - 1));
@@ -1006,12 +1008,12 @@ TEST(ReadDocument, RefusesDefinitionsWithoutEnd) {
               "line 1, column 1: groups nest deeper than 1000 levels");
 }
 
-TEST(ReadDocument, SurvivesDocumentsCutAnywhere) {
+TEST(ReadDocument, SurvivesTruncatedDocuments) {
     AnyRecords any(41);
     std::vector<std::string> texts{writeDocument(any.patch(2)), writeDocument(any.patch(2)),
                                    withDefinitions(R"([{"id":5,"type":"PAIR"}])", kPair)};
     for (std::string const& text : texts) {
-        // Without the end of the line that a document of ours has after its last bracket.
+        // Without the line end after the last bracket.
         std::string const whole = text.substr(0, text.find_last_of('}') + 1);
         ASSERT_TRUE(readDocument(whole).hasValue());
         for (std::size_t length = 0; length < whole.size(); ++length) {
@@ -1023,7 +1025,7 @@ TEST(ReadDocument, SurvivesDocumentsCutAnywhere) {
     }
 }
 
-TEST(ReadDocument, SurvivesChangedBytes) {
+TEST(ReadDocument, SurvivesCorruptedBytes) {
     AnyRecords any(42);
     tests::Random random(43);
     for (int i = 0; i < 3000; ++i) {
@@ -1084,7 +1086,7 @@ TEST(ReadDocument, ReadsDataOfAnyDepth) {
     });
 }
 
-TEST(ReadDocument, RefusesHugeTextsInLittleMemory) {
+TEST(ReadDocument, RejectsHugeInputsWithLittleMemory) {
     constexpr std::size_t kSize = 2 << 20;
     auto const repeated = [](std::string const& begin, std::string const& part) {
         std::string text = begin;
@@ -1167,7 +1169,7 @@ TEST(ReadDocument, SurvivesFailingAllocations) {
     EXPECT_EQ(text, own);
 }
 
-TEST(Kind, HasItsNameAndItsNumber) {
+TEST(Kind, MapsBetweenNamesAndNumbers) {
     char const* const names[] = {"unknown",   "group",   "input",      "output",   "time",
                                  "constant",  "ease",    "oscillator", "add",      "multiply",
                                  "compose",   "split",   "loop",       "pulse",    "choose",

@@ -30,8 +30,8 @@ constexpr double EC = 1.0009775171065494;
 
 EF outOfRange(int number) { return EF(number); }
 
-// The curves, one line for each as they are defined: `a` the start, `D` the difference, `m` the
-// midpoint of the in-out exponential curve.
+// The definitions of the curves: `a` is the start, `D` the difference, `m` the midpoint of the
+// in-out exponential curve.
 double curve(int f, double a, double b, double t) {
     double const D = b - a;
     double const u = 2 * t;
@@ -107,7 +107,7 @@ long long integerCurve(int f, long long from, long long to, double t) {
     }
 }
 
-// Equal to the last bit; every NaN is like every other.
+// Equal to the last bit; all NaNs count as equal.
 void expectSame(double actual, double expected) {
     if (std::isnan(expected)) {
         EXPECT_TRUE(std::isnan(actual));
@@ -127,7 +127,7 @@ double randomProgress(tests::Random& random) {
 
 }  // namespace
 
-TEST(EasingFunction, HasItsNumberAndItsName) {
+TEST(EasingFunction, HasItsNumberAndName) {
     struct Row {
         int number;
         EF function;
@@ -159,7 +159,7 @@ TEST(EasingFunction, HasItsNumberAndItsName) {
     static_assert(std::is_same_v<std::underlying_type_t<EF>, std::int32_t>);
 }
 
-TEST(EasingFunction, IsWrittenByItsName) {
+TEST(EasingFunction, IsPrintedByName) {
     std::vector<std::string> const names = easingFunctionNames();
     for (std::size_t i = 0; i < names.size(); ++i) {
         std::ostringstream stream;
@@ -171,7 +171,7 @@ TEST(EasingFunction, IsWrittenByItsName) {
     EXPECT_EQ(others.str(), "EasingFunction(13) EasingFunction(-1)");
 }
 
-TEST(EasingFunction, IsFoundByItsName) {
+TEST(EasingFunction, IsFoundByName) {
     std::vector<std::string> const names = easingFunctionNames();
     for (std::size_t i = 0; i < names.size(); ++i) {
         EXPECT_EQ(stringToEasingFunction(names[i]), EasingFunction(i)) << names[i];
@@ -183,7 +183,7 @@ TEST(EasingFunction, IsFoundByItsName) {
     EXPECT_FALSE(stringToEasingFunction(std::string("Linear\0", 7)).hasValue());
 }
 
-TEST(Ease, GivesKnownPoints) {
+TEST(Ease, MatchesKnownPoints) {
     struct Row {
         EF function;
         double from, to, t, expected;
@@ -206,7 +206,7 @@ TEST(Ease, GivesKnownPoints) {
     }
 }
 
-TEST(Ease, ExponentialCurvesGiveTheEndsThemselves) {
+TEST(Ease, ExponentialCurvesAreExactAtTheirEnds) {
     double const a = -0.0;
     double const b = 1e-320;
     EXPECT_EQ(tests::bits(ease(EF::ExponentialIn, a, 7.0, 0.0)), tests::bits(a));
@@ -220,7 +220,7 @@ TEST(Ease, ExponentialCurvesGiveTheEndsThemselves) {
     EXPECT_EQ(ease(EF::ExponentialInOut, 0LL, LLONG_MAX - 1, 1.0), LLONG_MAX - 1);
 }
 
-TEST(Ease, OfDoublesIsItsFormulaToTheLastBit) {
+TEST(Ease, DoublesMatchTheFormulaToTheLastBit) {
     tests::Random random(51);
     for (int i = 0; i < 200000; ++i) {
         bool const wild = random.below(4) == 0;
@@ -235,7 +235,7 @@ TEST(Ease, OfDoublesIsItsFormulaToTheLastBit) {
     }
 }
 
-TEST(Ease, OfIntegersIsCutTowardsZero) {
+TEST(Ease, IntegersAreTruncatedTowardsZero) {
     struct Row {
         char const* what;
         EF function;
@@ -267,7 +267,7 @@ TEST(Ease, OfIntegersIsCutTowardsZero) {
     }
 }
 
-TEST(Ease, OfIntegersIsItsFormula) {
+TEST(Ease, IntegersMatchTheFormula) {
     tests::Random random(52);
     for (int i = 0; i < 200000; ++i) {
         bool const wild = random.below(3) == 0;
@@ -287,7 +287,7 @@ TEST(Ease, OfIntegersIsItsFormula) {
     }
 }
 
-TEST(Ease, OfVectorsIsThatOfTheirComponents) {
+TEST(Ease, VectorsAreEasedByComponent) {
     tests::Random random(53);
     for (int i = 0; i < 100000; ++i) {
         double from[4];
@@ -325,7 +325,7 @@ void expectEachIsTheSingleOne(T const& from, T const& to) {
     while (progress.size() < 150)
         progress.push_back(static_cast<double>(random.below(30001)) / 10000.0 - 1.0);
     for (int f = -1; f <= kCurves; ++f) {
-        // Around the size of the blocks that are computed at once.
+        // Around the block size of the implementation.
         for (std::size_t const count : {0u, 1u, 31u, 32u, 33u, 64u, 65u, 150u}) {
             SCOPED_TRACE("curve " + std::to_string(f) + ", " + std::to_string(count));
             std::vector<T> results(count + 1, from);
@@ -334,13 +334,13 @@ void expectEachIsTheSingleOne(T const& from, T const& to) {
                 T const single = ease(EF(f), from, to, progress[i]);
                 ASSERT_EQ(std::memcmp(&results[i], &single, sizeof(T)), 0) << progress[i];
             }
-            // Nothing behind them is written.
+            // Nothing is written past the end.
             ASSERT_EQ(std::memcmp(&results[count], &from, sizeof(T)), 0);
         }
     }
 }
 
-TEST(EaseEach, GivesTheBitsOfSingleCalls) {
+TEST(EaseEach, MatchesSingleCallsBitForBit) {
     expectEachIsTheSingleOne(3.0, 7.25);
     expectEachIsTheSingleOne(1e300, -1e300);
     expectEachIsTheSingleOne<long long>(-7, 1000000);
@@ -350,7 +350,7 @@ TEST(EaseEach, GivesTheBitsOfSingleCalls) {
     expectEachIsTheSingleOne(FloatVec4{1, -2, 3, -4}, FloatVec4{0.1, 0.3, -0.7, 1e9});
 }
 
-TEST(EaseEach, MayReplaceTheProgress) {
+TEST(EaseEach, MayOverwriteItsInput) {
     for (int f = 0; f < kCurves; ++f) {
         std::vector<double> progress;
         for (int i = 0; i < 100; ++i) progress.push_back(i * 0.01);
@@ -361,7 +361,7 @@ TEST(EaseEach, MayReplaceTheProgress) {
     }
 }
 
-TEST(Ease, StaysAtTheStartOutOfRange) {
+TEST(Ease, UndefinedEnumeratorsStayAtTheStart) {
     for (int number : {-1, 13, 14, 1000, INT_MIN, INT_MAX}) {
         EF const f = outOfRange(number);
         EXPECT_EQ(ease(f, 5.0, 9.0, 0.5), 5.0);
@@ -374,7 +374,7 @@ TEST(Ease, StaysAtTheStartOutOfRange) {
     }
 }
 
-TEST(Ease, PassesNaNProgressOn) {
+TEST(Ease, PropagatesNaNProgress) {
     for (int f = 0; f < kCurves; ++f) {
         EXPECT_TRUE(std::isnan(ease(EF(f), 1.0, 2.0, double(NAN)))) << f;
         EXPECT_TRUE(std::isnan(ease(EF(f), FloatVec2{1, 2}, FloatVec2{3, 4}, double(NAN)).y)) << f;
@@ -382,7 +382,7 @@ TEST(Ease, PassesNaNProgressOn) {
     }
 }
 
-TEST(EaseValue, IsTheCurveOfItsType) {
+TEST(EaseValue, MatchesTheCurvesOfEachType) {
     tests::Random random(54);
     for (int i = 0; i < 20000; ++i) {
         double const t = randomProgress(random);
@@ -411,7 +411,7 @@ TEST(EaseValue, IsTheCurveOfItsType) {
     }
 }
 
-TEST(EaseValue, IsDecidedByTheEndsType) {
+TEST(EaseValue, TheTypeOfTheEndDecides) {
     struct Row {
         char const* what;
         Value from;

@@ -15,7 +15,7 @@
 using namespace tarn::engine;
 using namespace tests;
 
-TEST(EvalPort, IsEmptyAtFirst) {
+TEST(EvalPort, IsInitiallyEmpty) {
     EvalPort const port;
     EXPECT_EQ(port.id, 0u);
     EXPECT_EQ(port.tag, 0u);
@@ -26,7 +26,7 @@ TEST(EvalPort, IsEmptyAtFirst) {
     EXPECT_EQ(port.name, "");
 }
 
-TEST(EvalPort, TakesOverAPort) {
+TEST(EvalPort, ConvertsAPort) {
     Port source = port(5, 6);
     source.typeInfo = {Type::Int, 1, Value(0), {}, Value("e")};
     source.defaultValue = 7;
@@ -43,7 +43,7 @@ TEST(EvalPort, TakesOverAPort) {
     }
 }
 
-TEST(EvalPort, EqualsFieldByField) {
+TEST(EvalPort, ComparesAllFields) {
     struct Row {
         char const* what;
         void (*change)(EvalPort&);
@@ -67,7 +67,7 @@ TEST(EvalPort, EqualsFieldByField) {
     }
 }
 
-TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
+TEST(EvalPatch, ConvertsAPatchAndItsSubtree) {
     Patch source = sampleDocument();
     source.modelLayer = {3, {{4, {}, {}}}, {{5, {}, {}}}};
     Patch child = source.children->at(1);
@@ -95,7 +95,7 @@ TEST(EvalPatch, TakesOverAPatchAndItsSubtree) {
     }
 }
 
-TEST(EvalPatch, RecordsWhetherPortsAreCounted) {
+TEST(EvalPatch, RecordsWhetherPortCountsAreSet) {
     struct Row {
         char const* what;
         std::map<std::string, Unstructured> attributes;
@@ -137,7 +137,7 @@ TEST(EvalPatch, SharesListsWithCopiesAndNotWithOtherConversions) {
     EXPECT_NE(first, second);
 }
 
-TEST(EvalPatch, TakesSharedListsForEqualAndNothingElse) {
+TEST(EvalPatch, TreatsOnlySharedListsAsEqual) {
     Port nan = port(1);
     nan.defaultValue = double(NAN);
     for (Patch const& source : {withPorts(patch(1), {nan}, {}), withPorts(patch(1), {}, {nan}),
@@ -148,7 +148,7 @@ TEST(EvalPatch, TakesSharedListsForEqualAndNothingElse) {
     }
 }
 
-TEST(EvalPatch, EqualsFieldByField) {
+TEST(EvalPatch, ComparesAllFields) {
     struct Row {
         char const* what;
         void (*change)(EvalPatch&);

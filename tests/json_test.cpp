@@ -21,7 +21,7 @@ using List = Unstructured::Array;
 
 }  // namespace
 
-TEST(Json, BecomesData) {
+TEST(Json, ConvertsToUnstructured) {
     struct Row {
         char const* text;
         Unstructured data;
@@ -51,14 +51,14 @@ TEST(Json, BecomesData) {
          }) {
         Unstructured const data = fromJson(json::parse(row.text));
         EXPECT_EQ(data, row.data) << row.text;
-        EXPECT_EQ(data.toText(), row.data.toText()) << row.text;  // The sign of zero too.
+        EXPECT_EQ(data.toText(), row.data.toText()) << row.text;  // Compares the sign of zero too.
     }
     EXPECT_EQ(fromJson(json::binary({1, 2})), Unstructured());
     EXPECT_EQ(fromJson(json(json::value_t::discarded)), Unstructured());
-    EXPECT_EQ(fromJson(json(5u)), 5);  // However it was made.
+    EXPECT_EQ(fromJson(json(5u)), 5);  // An integer constructed as unsigned.
 }
 
-TEST(Json, IsMadeFromData) {
+TEST(Json, ConvertsFromUnstructured) {
     struct Row {
         Unstructured data;
         char const* text;
@@ -88,7 +88,7 @@ TEST(Json, IsMadeFromData) {
     EXPECT_EQ(toJson("\xff").get<std::string>(), "\xff");
 }
 
-TEST(Json, GoesThereAndBack) {
+TEST(Json, RoundTrips) {
     tests::Random random(31);
     std::function<json(std::size_t)> const randomJson = [&](std::size_t depth) -> json {
         switch (random.below(depth == 0 ? 5 : 7)) {
@@ -123,7 +123,7 @@ TEST(Json, GoesThereAndBack) {
     }
 }
 
-TEST(Json, MayBeDeep) {
+TEST(Json, HandlesDeepTrees) {
     constexpr std::size_t kLevels = 200000;
     for (char const* ends : {"[]", "{}"}) {
         std::string text;

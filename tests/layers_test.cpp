@@ -24,7 +24,7 @@ RenderLayerHierarchy hierarchy(unsigned long long id,
 
 }  // namespace
 
-TEST(ModelLayer, EqualsDeeplyInOrder) {
+TEST(ModelLayer, ComparesDeeplyAndInOrder) {
     ModelLayer const base{1, {{2, {}, {}}, {3, {}, {}}}, {{4, {}, {}}, {6, {}, {}}}};
     struct Row {
         char const* what;
@@ -73,20 +73,20 @@ TEST(ModelLayer, CopiesAreIndependent) {
     EXPECT_EQ(copy, (ModelLayer{1, {{2, {{9, {}, {}}}, {}}}, {{4, {{5, {}, {}}}, {}}}}));
 }
 
-TEST(ModelLayer, WritesItsTreeWithoutAdditionalLayers) {
+TEST(ModelLayer, PrintsItsTreeWithoutAdditionalLayers) {
     EXPECT_EQ(written(ModelLayer{7, {}, {}}), "7\n");
     ModelLayer const tree{1, {{2, {{3, {}, {}}}, {{8, {}, {}}}}, {4, {}, {}}}, {{9, {}, {}}}};
     EXPECT_EQ(written(tree), "1\n-2\n--3\n-4\n");
 }
 
-TEST(RenderLayer, WritesItsIdAlone) {
+TEST(RenderLayer, PrintsOnlyItsId) {
     EXPECT_EQ(written(RenderLayer{3, 12}), "12");
     EXPECT_EQ(RenderLayer(), (RenderLayer{0, 0}));
     EXPECT_NE((RenderLayer{0, 1}), (RenderLayer{0, 2}));
     EXPECT_NE((RenderLayer{1, 1}), (RenderLayer{2, 1}));
 }
 
-TEST(RenderLayerHierarchy, WritesLeadingLayersMarkedAndChildrenDeeper) {
+TEST(RenderLayerHierarchy, PrintsLeadingLayersMarkedAndChildrenDeeper) {
     struct Row {
         char const* what;
         RenderLayerHierarchy tree;
@@ -118,7 +118,7 @@ TEST(RenderLayerHierarchy, HelperTakesAPrefixAndAMark) {
     EXPECT_EQ(stream.str(), "---v2\n---v1\n----v3\n");
 }
 
-TEST(RenderLayerHierarchy, EqualsDeeplyInOrder) {
+TEST(RenderLayerHierarchy, ComparesDeeplyAndInOrder) {
     auto const base = [] { return hierarchy(1, {hierarchy(2)}, {hierarchy(3)}); };
     EXPECT_EQ(base(), base());
     EXPECT_NE(base(), hierarchy(9, {hierarchy(2)}, {hierarchy(3)}));
@@ -127,7 +127,7 @@ TEST(RenderLayerHierarchy, EqualsDeeplyInOrder) {
     EXPECT_NE(base(), hierarchy(1, {hierarchy(2)}));
 }
 
-TEST(LayerTexts, FollowTheStreamsFlagsAndFlushEachLine) {
+TEST(LayerOutput, FollowsStreamFlagsAndFlushesEachLine) {
     tests::FlushCounter buffer;
     std::ostream stream(&buffer);
     stream << std::hex << ModelLayer{255, {{16, {}, {}}}, {}};
@@ -139,7 +139,7 @@ TEST(LayerTexts, FollowTheStreamsFlagsAndFlushEachLine) {
     EXPECT_EQ(&(stream << RenderLayer{0, 1}), &stream);
 }
 
-TEST(LayerTexts, EndLinesAsTheStreamDoes) {
+TEST(LayerOutput, UsesTheStreamsNewline) {
     std::ostringstream stream;
     stream.imbue(tests::barForNewline());
     EXPECT_EQ(&(stream << ModelLayer{1, {{2, {}, {}}}, {}}), &stream);
@@ -147,7 +147,7 @@ TEST(LayerTexts, EndLinesAsTheStreamDoes) {
     EXPECT_EQ(stream.str(), "1|-2|-3|");
 }
 
-TEST(StrokeSettings, IsVisibleByItsThresholds) {
+TEST(StrokeSettings, IsVisibleAboveItsThresholds) {
     double const epsilon = std::numeric_limits<double>::epsilon();
     struct Row {
         char const* what;
@@ -185,7 +185,7 @@ TEST(StrokeSettings, IsVisibleByItsThresholds) {
     EXPECT_FALSE(StrokeSettings().isVisible());
 }
 
-TEST(Layers, AreZeroAndEmptyAtFirst) {
+TEST(Layers, AreInitiallyZeroAndEmpty) {
     StrokeSettings const stroke;
     EXPECT_EQ(stroke.cap, 0);
     EXPECT_EQ(stroke.join, 0);
@@ -200,7 +200,7 @@ TEST(Layers, AreZeroAndEmptyAtFirst) {
     EXPECT_EQ(ModelLayer().id, 0u);
 }
 
-TEST(StrokeSettings, EqualsFieldByField) {
+TEST(StrokeSettings, ComparesAllFields) {
     StrokeSettings const base{1, 2, 3, 4, 5, 6, 7, true};
     EXPECT_EQ(base, (StrokeSettings{1, 2, 3, 4, 5, 6, 7, true}));
     for (StrokeSettings const& other :
@@ -213,7 +213,8 @@ TEST(StrokeSettings, EqualsFieldByField) {
     }
 }
 
-// The innermost layer of `kDeepest`, each the only one in the other's `list`.
+// The innermost layer of `kDeepest` nested ones; each is the only element of the outer one's
+// `list`.
 template <class Layer>
 Layer nested(std::vector<Layer> Layer::*list, Layer innermost) {
     for (std::size_t i = 1; i < tests::kDeepest; ++i) {

@@ -6,7 +6,7 @@
 
 using namespace tarn::engine;
 
-TEST(KeyboardTypes, AreOneListOfTwelve) {
+TEST(KeyboardTypes, AreTheSameListOfTwelve) {
     EXPECT_EQ(keyboardTypes(),
               (std::vector<std::string>{"Default", "ASCII Only", "Numbers and Punctuation", "URL",
                                         "Number Pad", "Phone Pad", "Name or Phone", "Email Address",
@@ -14,7 +14,7 @@ TEST(KeyboardTypes, AreOneListOfTwelve) {
     EXPECT_EQ(&keyboardTypes(), &keyboardTypes());
 }
 
-TEST(CameraTypeNames, AreAFreshListOfTwo) {
+TEST(CameraTypeNames, AreANewListOfTwo) {
     std::vector<std::string> names = cameraTypeNames();
     EXPECT_EQ(names, (std::vector<std::string>{"Front-Facing", "Rear-Facing"}));
     names.clear();
@@ -95,7 +95,7 @@ TEST(MediaContainer, HasOneExtension) {
     }
 }
 
-TEST(Media, KindsAreWrittenByTheirEnumerators) {
+TEST(Media, FormatsArePrintedByEnumerator) {
     std::ostringstream formats;
     for (int number = 0; number < 5; ++number) formats << ImageFormat(number) << " ";
     formats << ImageFormat(255);

@@ -19,7 +19,7 @@
 
 using namespace tarn::engine;
 
-TEST(NumberText, IsShortenedForReading) {
+TEST(NumberText, HasNoTrailingZeros) {
     struct Row {
         double number;
         char const* text;
@@ -60,7 +60,7 @@ TEST(NumberText, IsShortenedForReading) {
     }
 }
 
-TEST(NumberText, IsAppendedAsToStringGivesIt) {
+TEST(NumberText, AppendTextMatchesToString) {
     Value const nullText = std::shared_ptr<Path const>();
     std::string text = "before ";
     std::string expected = text;
@@ -119,14 +119,14 @@ TEST(NumberText, IsCutAfter127Characters) {
     }
 }
 
-TEST(NumberText, OfWhatIsNoNumberIsTheSameEverywhere) {
+TEST(NumberText, NonFiniteNumbersLookTheSameEverywhere) {
     EXPECT_EQ(to_string(Value(double(INFINITY))), "inf");
     EXPECT_EQ(to_string(Value(-double(INFINITY))), "-inf");
     EXPECT_EQ(to_string(Value(std::copysign(double(NAN), 1.0))), "nan");
     EXPECT_EQ(to_string(Value(std::copysign(double(NAN), -1.0))), "-nan");
 }
 
-TEST(NumberText, AgreesWithDecimalDigitsWorkedOutByHand) {
+TEST(NumberText, MatchesAnExactDecimalModel) {
     tests::Random random(128);
     for (int i = 0; i < 60000; ++i) {
         double const number = random.anyDouble();
@@ -135,7 +135,7 @@ TEST(NumberText, AgreesWithDecimalDigitsWorkedOutByHand) {
     }
 }
 
-TEST(NumberText, TakesTheDecimalPointFromCoutAtEachCall) {
+TEST(NumberText, ReadsTheDecimalPointOfCoutAtEachCall) {
     EXPECT_EQ(to_string(Value(2.5)), "2.5");
     {
         tests::CoutDecimalPoint comma(',');
@@ -157,7 +157,7 @@ TEST(NumberText, TakesTheDecimalPointFromCoutAtEachCall) {
     EXPECT_EQ(to_string(Value(2.5)), "2.5");
 }
 
-TEST(NumberText, AgreesWithTheModelUnderEveryPairOfDecimalPoints) {
+TEST(NumberText, MatchesTheModelForEveryPairOfDecimalPoints) {
     tests::Random random(44);
     for (char cout : {'.', ',', '\'', 'n'}) {
         tests::CoutDecimalPoint point(cout);
@@ -188,7 +188,7 @@ TEST(NumberText, FollowsTheRoundingMode) {
     };
     for (Row const& row : {
              Row{"to the nearest", FE_TONEAREST, "0.12", "-0.12"},
-#if defined(FE_UPWARD)  // Where one can be chosen at all.
+#if defined(FE_UPWARD)  // Platforms with rounding modes.
                  Row{"up", FE_UPWARD, "0.13", "-0.12"}, Row{"down", FE_DOWNWARD, "0.12", "-0.13"},
                  Row{"towards zero", FE_TOWARDZERO, "0.12", "-0.12"},
 #endif
@@ -214,7 +214,7 @@ TEST(NumberText, FollowsTheRoundingMode) {
     }
 }
 
-TEST(NumberText, OfManyDigitsIsExact) {
+TEST(NumberText, IsExactForManyDigits) {
     struct Row {
         double number;
         char const* text;
@@ -232,7 +232,7 @@ TEST(NumberText, OfManyDigitsIsExact) {
     }
 }
 
-TEST(NumberText, FollowsNoStreamFlags) {
+TEST(NumberText, IgnoresStreamFlags) {
     std::ostringstream stream;
     stream << std::setprecision(10) << std::scientific << Value(2.5) << std::hex << Value(255);
     EXPECT_EQ(stream.str(), "2.5255");

@@ -13,7 +13,7 @@
 using tarn::engine::Optional;
 using tarn::engine::Value;
 
-TEST(Optional, IsEmptyUntilGivenAValue) {
+TEST(Optional, IsInitiallyEmpty) {
     Optional<std::string> text;
     EXPECT_FALSE(text.hasValue());
     EXPECT_FALSE(text.has_value());
@@ -79,7 +79,7 @@ TEST(Optional, ComparesWithAValue) {
     }
 }
 
-TEST(Optional, FallsBackOnAnotherValue) {
+TEST(Optional, ReturnsTheAlternativeWhenEmpty) {
     EXPECT_EQ(Optional<int>().value_or(3), 3);
     EXPECT_EQ(Optional<int>(2).value_or(3), 2);
     Optional<std::string> text(std::string("a text that is too long to be held in place"));
@@ -106,7 +106,7 @@ TEST(Optional, EmplacesAndSwaps) {
     static_assert(std::is_nothrow_swappable_v<Optional<Value>>);
 }
 
-TEST(Optional, GoesToAndFromTheStandardOne) {
+TEST(Optional, ConvertsToAndFromStdOptional) {
     Optional<int> const fromEmpty = std::optional<int>();
     EXPECT_FALSE(fromEmpty.hasValue());
     Optional<int> const fromSet = std::optional<int>(5);
@@ -117,7 +117,7 @@ TEST(Optional, GoesToAndFromTheStandardOne) {
     static_assert(!std::is_constructible_v<Optional<Value>, std::optional<double>>);
 }
 
-TEST(OptionalDeathTest, ReadingAnEmptyOneStopsTheProgram) {
+TEST(OptionalDeathTest, ReadingAnEmptyOneAborts) {
     Optional<std::string> empty;
     Optional<std::string> const constant;
     auto const line = tests::failedAssertion("hasValue()", "value", "Engine/Base/optional");

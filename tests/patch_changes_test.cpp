@@ -22,7 +22,7 @@ namespace {
 
 using Kind = PatchChange::Kind;
 
-// Every patch by its identifier, with what it is compared by, found without any sharing.
+// Every patch by its identifier, with what has to be compared; independent of sharing.
 struct Flat {
     Patch const* patch;
     unsigned long long parent;
@@ -66,7 +66,7 @@ portDifferences(std::vector<Port> const& before, std::vector<Port> const& after,
     return result;
 }
 
-// One line for each change, by looking at everything.
+// The expected changes, one line each, found by comparing everything.
 std::multiset<std::string> expectedChanges(Patch const& before, Patch const& after) {
     auto const was = flattened(before);
     auto const is = flattened(after);
@@ -119,7 +119,7 @@ std::multiset<std::string> expectedChanges(Patch const& before, Patch const& aft
     return result;
 }
 
-// The same line of a change.
+// The same line for a reported change.
 std::string lineOf(PatchChange const& change) {
     std::string const id = std::to_string(change.id);
     switch (change.kind) {
@@ -198,7 +198,7 @@ TEST(PatchChanges, FindsWhatRandomEditsChanged) {
         Patch const after = edit.commit();
         SCOPED_TRACE(i);
         expectChanges(index.root(), after);
-        // Read again, so that nothing is shared; the changes are the same.
+        // Parsed again, so that nothing is shared; the changes stay the same.
         Patch const apart = model.toPatch();
         EXPECT_EQ(linesOf(patchChanges(index.root(), apart)),
                   linesOf(patchChanges(index.root(), after)));
@@ -210,7 +210,7 @@ TEST(PatchChanges, FindsWhatRandomEditsChanged) {
 TEST(PatchChanges, AreEmptyExactlyForEqualDocuments) {
     Random random(13);
     for (int i = 0; i < 1000; ++i) {
-        // Few identifiers: they repeat, and there is 0.
+        // Few identifiers, so that they repeat, and 0.
         std::uint64_t const seed = random.below(40);
         Random one(seed);
         Random other(random.below(3) == 0 ? seed : random.below(40));
@@ -221,7 +221,7 @@ TEST(PatchChanges, AreEmptyExactlyForEqualDocuments) {
     }
 }
 
-TEST(PatchChanges, AreToldInWords) {
+TEST(PatchChanges, ArePrintedForPeople) {
     auto const base = [] {
         return withPorts(patch(1,
                                {withPorts(patch(2, {patch(4)}), {port(21, 1), port(22, 2)}, {}),
@@ -340,7 +340,7 @@ TEST(PatchChanges, AreToldInWords) {
     }
 }
 
-TEST(PatchChanges, SayThatThereIsOneWhereTheTextIsTheSame) {
+TEST(PatchChanges, ReportChangesThatPrintTheSame) {
     Patch before = patch(1);
     before.attributes["k"] = std::string(100, 'x') + "1";
     Patch after = before;
@@ -351,7 +351,7 @@ TEST(PatchChanges, SayThatThereIsOneWhereTheTextIsTheSame) {
               "changed patch 1 \"n1\": attribute \"k\" removed\n");
 }
 
-TEST(PatchChanges, LookAtNothingThatIsShared) {
+TEST(PatchChanges, SkipSharedLists) {
     std::vector<Patch> groups;
     for (unsigned long long g = 0; g < 50; ++g) {
         std::vector<Patch> children;
@@ -367,11 +367,11 @@ TEST(PatchChanges, LookAtNothingThatIsShared) {
     AllocationCounter counter;
     std::vector<PatchChange> const changes = patchChanges(index.root(), after);
     EXPECT_EQ(changes.size(), 1u);
-    // Of two lists of fifty.
+    // For two lists of fifty.
     EXPECT_LT(counter.peakBytes(), 20000u);
 }
 
-TEST(PatchChanges, OfDeepGraphsNeedNoDeepStack) {
+TEST(PatchChanges, NeedNoDeepStack) {
     onStackOf(kStack, [] {
         auto const deep = [](char const* name) {
             Patch root = patch(kDeepest);

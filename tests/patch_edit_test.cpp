@@ -34,7 +34,7 @@ Patch const& child(Patch const& patch, std::size_t position) {
     return patch.children->at(position);
 }
 
-// Every list that nothing has touched is the very object.
+// Expects every unchanged list to be the same object.
 void expectShared(Model const& model, Patch const& before, Patch const& after) {
     EXPECT_TRUE(before.inputs == after.inputs || model.hasOtherInputs) << after.id;
     EXPECT_TRUE(before.outputs == after.outputs || model.hasOtherOutputs) << after.id;
@@ -52,7 +52,7 @@ std::function<bool(Model const&, Patch const&)> const isUntouched = [](Model con
     return same;
 };
 
-// In the small graph.
+// A connection of the small graph.
 constexpr Connection kBack{3, 32, 2, 21};
 constexpr Connection kFurther{2, 22, 3, 33};
 
@@ -83,7 +83,7 @@ TEST(PatchEdit, ChangesFieldsAndPorts) {
     changed.defaultValue = 5.0;
     expected.inputs = arrayOf<Port>({changed});
     EXPECT_EQ(child(child(after, 0), 0), expected);
-    // The lists on the way are others, all the rest are the same objects.
+    // The lists on the path to the change are new, all others are the same objects.
     EXPECT_NE(after.children, before.children);
     EXPECT_NE(child(after, 0).children, child(before, 0).children);
     EXPECT_EQ(after.connections, before.connections);
@@ -93,7 +93,7 @@ TEST(PatchEdit, ChangesFieldsAndPorts) {
     EXPECT_EQ(child(child(after, 0), 0).outputs, child(child(before, 0), 0).outputs);
 }
 
-TEST(PatchEdit, IsDoneAfterItsCommit) {
+TEST(PatchEdit, IsFinishedAfterCommit) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     ASSERT_TRUE(edit.removePatch(4));
@@ -117,7 +117,7 @@ TEST(PatchEdit, IsDoneAfterItsCommit) {
     EXPECT_EQ(moved.commit(), root);
 }
 
-TEST(PatchEdit, ThatChangesNothingGivesTheSameLists) {
+TEST(PatchEdit, WithoutChangesKeepsTheLists) {
     Patch const before = smallGraph();
     PatchIndex const index(before);
     PatchEdit edit(index);
@@ -141,7 +141,7 @@ TEST(PatchEdit, ThatChangesNothingGivesTheSameLists) {
     EXPECT_EQ(after.outputs, before.outputs);
 }
 
-TEST(PatchEdit, AnswersWhatCannotBeDone) {
+TEST(PatchEdit, RejectsInvalidCalls) {
     struct Row {
         char const* what;
         std::function<bool(PatchEdit&)> change;
@@ -268,7 +268,7 @@ TEST(PatchEdit, RemovesConnectionsWithTheirEnds) {
     }
 }
 
-TEST(PatchEdit, AddsAndMovesToPlaces) {
+TEST(PatchEdit, AddsAndMovesToPositions) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     EXPECT_TRUE(edit.addPatch(1, withPorts(patch(90, {patch(91)}), {port(92)}, {}), 1));
@@ -291,7 +291,7 @@ TEST(PatchEdit, AddsAndMovesToPlaces) {
     EXPECT_EQ(edit.commit(), expected);
 }
 
-TEST(PatchEdit, TakesAListThatIsAssigned) {
+TEST(PatchEdit, AcceptsAnAssignedList) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     edit.patch(3)->inputs = arrayOf<Port>({port(77)});
@@ -304,7 +304,7 @@ TEST(PatchEdit, TakesAListThatIsAssigned) {
     EXPECT_EQ(child(after, 0).children->at(0), patch(78));
 }
 
-TEST(PatchEdit, SeesNoChangeInAnEmptyListForAnEmptyOne) {
+TEST(PatchEdit, IgnoresReplacingAnEmptyListByAnEmptyOne) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     EXPECT_TRUE(edit.addPatch(4, patch(79)));
@@ -322,7 +322,7 @@ TEST(PatchEdit, SeesNoChangeInAnEmptyListForAnEmptyOne) {
     EXPECT_EQ(*four.children, std::vector<Patch>{patch(79)});
 }
 
-TEST(PatchEdit, GivesFreshIdentifiers) {
+TEST(PatchEdit, ReturnsUnusedIdentifiers) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     EXPECT_EQ(edit.freshPatchId(), 5u);
@@ -341,7 +341,7 @@ TEST(PatchEdit, GivesFreshIdentifiers) {
     EXPECT_EQ(other.freshPortId(), 2u);
 }
 
-TEST(PatchEdit, GivesNoIdentifierTwice) {
+TEST(PatchEdit, NeverReturnsAnIdentifierTwice) {
     PatchIndex const index(patch(1, {patch(2)}));
     PatchEdit edit(index);
     EXPECT_EQ(edit.freshPatchId(), 3u);
@@ -351,7 +351,7 @@ TEST(PatchEdit, GivesNoIdentifierTwice) {
     EXPECT_EQ(edit.freshPortId(), 2u);
 }
 
-TEST(PatchEdit, SeesTheSignOfAZero) {
+TEST(PatchEdit, DistinguishesSignedZeros) {
     PatchIndex const index(smallGraph());
     {
         PatchEdit edit(index);
@@ -368,7 +368,7 @@ TEST(PatchEdit, SeesTheSignOfAZero) {
     EXPECT_TRUE(std::signbit(changed.findPatch(4)->attributes.at("a").asFloat()));
 }
 
-TEST(PatchEdit, KeepsWhatItHasHandedOut) {
+TEST(PatchEdit, KeepsReturnedPointersValid) {
     PatchIndex const index(smallGraph());
     PatchEdit edit(index);
     Patch* const patch = edit.patch(4);
@@ -380,7 +380,7 @@ TEST(PatchEdit, KeepsWhatItHasHandedOut) {
     EXPECT_EQ(edit.commit().children->size(), 1u);
 }
 
-TEST(PatchEdit, CopiesNoListForWhatIsGoneAgain) {
+TEST(PatchEdit, CopiesNoListForUndoneChanges) {
     Patch const before = smallGraph();
     PatchIndex const index(before);
     PatchEdit edit(index);
@@ -390,9 +390,9 @@ TEST(PatchEdit, CopiesNoListForWhatIsGoneAgain) {
     EXPECT_EQ(edit.commit().children, before.children);
 }
 
-// Adding to one list and editing documents whose identifiers repeat takes time that follows how
-// much is done.
-TEST(PatchEdit, TakesTimeThatFollowsWhatIsDone) {
+// Adding to one list, and editing documents with repeated identifiers, takes time proportional to
+// the changes.
+TEST(PatchEdit, TakesTimeProportionalToTheChanges) {
     std::vector<Patch> groups;
     for (unsigned long long id = 2; id < 20002; ++id) groups.push_back(patch(id, {patch(1)}));
     PatchIndex const index(patch(1, std::move(groups)));
@@ -403,11 +403,11 @@ TEST(PatchEdit, TakesTimeThatFollowsWhatIsDone) {
         ASSERT_TRUE(edit.addInputPort(2, port(id)));
     }
     edit.commit();
-    // Quadratic, it is seconds; under tools that look at everything it is one.
+    // Quadratic algorithms take minutes; sanitizers make this one second.
     EXPECT_LT(static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC, 10.0);
 }
 
-TEST(PatchEdit, WorksWhereIdentifiersRepeat) {
+TEST(PatchEdit, HandlesRepeatedIdentifiers) {
     Patch const twice = patch(5, {patch(7)});
     PatchIndex const index(patch(5, {patch(6, {twice}), twice, patch(0, {patch(8)})}));
     PatchEdit edit(index);
@@ -495,7 +495,7 @@ TEST(PatchEdit, SurvivesFailingAllocations) {
                   0u);
         EXPECT_EQ(root, expected);
     }
-    // What failed has left nothing behind.
+    // Failed calls have no effect.
     for (std::size_t succeeding = 0; succeeding < 60; ++succeeding) {
         PatchEdit edit(index);
         try {
@@ -530,12 +530,12 @@ TEST(PatchEdit, CopiesAListOnce) {
         }
         return counter.held();
     };
-    // The list itself and its owner, however many of its elements are changed.
+    // One allocation for the list and one for its elements, however many of them are changed.
     EXPECT_EQ(blocksFor(1), blocksFor(500));
     EXPECT_LE(blocksFor(500), 2u);
 }
 
-TEST(PatchEdit, OfADeepGraphNeedsNoDeepStack) {
+TEST(PatchEdit, NeedsNoDeepStack) {
     onStackOf(kStack, [] {
         Patch root = withPorts(patch(kDeepest), {port(1)}, {port(2)});
         for (unsigned long long id = kDeepest - 1; id > 0; --id) {

@@ -26,8 +26,8 @@ namespace {
 
 using Set = std::unordered_set<Connection>;
 
-// The connections of a list that are in the set, each once, in the order of the list, and the very
-// ones of the list.
+// Expects the view to contain exactly these connections, each once, in the order of the list, as
+// references into it.
 void expectView(ConnectionView const& view, Patch const* holder, Set expected) {
     std::vector<Connection const*> wanted;
     if (holder != nullptr) {
@@ -56,7 +56,7 @@ Patch smallGraph() {
                      {port(11)}, {port(12)});
 }
 
-// How many things a query finds.
+// The number of results of a query.
 std::size_t countOf(void const* found) { return found == nullptr ? 0 : 1; }
 std::size_t countOf(ConnectionView const& found) { return found.size(); }
 template <auto query>
@@ -66,7 +66,7 @@ std::size_t ask(PatchIndex const& index, unsigned long long id) {
 
 }  // namespace
 
-TEST(PatchIndexDeathTest, ANullListIsNamed) {
+TEST(PatchIndexDeathTest, NamesANullList) {
     struct Row {
         char const* condition;
         void (*damage)(Patch&);
@@ -88,7 +88,7 @@ TEST(PatchIndexDeathTest, ANullListIsNamed) {
     }
 }
 
-TEST(PatchIndex, AnswersAboutASmallGraph) {
+TEST(PatchIndex, FindsEverythingInASmallGraph) {
     PatchIndex const index(smallGraph());
     Patch const& root = index.root();
     EXPECT_EQ(root, smallGraph());
@@ -131,7 +131,7 @@ TEST(PatchIndex, AnswersAboutASmallGraph) {
     EXPECT_TRUE(ConnectionView().begin() == ConnectionView().end());
 }
 
-// A connection with the first fields as given, and a port to lead to that makes its hash `hash`.
+// A connection with these first fields, and a target port that gives it the hash `hash`.
 Connection withHash(unsigned long long fromPatchId, unsigned long long fromPortId,
                     unsigned long long toPatchId, std::uint64_t hash) {
     std::uint64_t seed = 0;
@@ -142,7 +142,7 @@ Connection withHash(unsigned long long fromPatchId, unsigned long long fromPortI
             (hash ^ seed) - 0x9e3779b9 - (seed << 6) - (seed >> 2)};
 }
 
-TEST(PatchIndex, TellsConnectionsOfOneHashApart) {
+TEST(PatchIndex, DistinguishesConnectionsWithEqualHashes) {
     std::vector<Connection> connections;
     for (unsigned long long i = 0; i < 40; ++i) {
         connections.push_back(withHash(2, 22, i % 15, i < 30 ? 77 : 78));
@@ -158,7 +158,7 @@ TEST(PatchIndex, TellsConnectionsOfOneHashApart) {
 
 namespace {
 
-// The identifier whose hash, but for a seed, is `hash`.
+// The identifier whose hash without a seed is `hash`.
 unsigned long long unmixed(std::uint64_t hash) {
     constexpr std::uint64_t kFactor = 0xd6e8feb86659fd93;
     std::uint64_t inverse = kFactor;
@@ -170,7 +170,7 @@ unsigned long long unmixed(std::uint64_t hash) {
     return hash;
 }
 
-// Seconds of the processor for the fastest of five runs.
+// CPU seconds of the fastest of five runs.
 template <class Operation>
 double secondsFor(Operation operation) {
     double fastest = 1e9;
@@ -187,7 +187,7 @@ double secondsToIndex(Patch const& root) {
 
 }  // namespace
 
-TEST(PatchIndex, IsNotSlowedByIdentifiersThatWereChosenForIt) {
+TEST(PatchIndex, IsNotSlowedByAdversarialIdentifiers) {
     constexpr unsigned long long kCount = 30000;
     struct Row {
         char const* label;
@@ -232,7 +232,7 @@ TEST(PatchIndex, IsNotSlowedByIdentifiersThatWereChosenForIt) {
 
 namespace {
 
-// What the walks answer about this identifier.
+// Compares all results for this identifier with the queries of patch.h.
 void expectAnswers(PatchIndex const& index, unsigned long long id) {
     Patch const& root = index.root();
     Patch const* const found = findPatchRecursive(root, id);
@@ -269,7 +269,7 @@ void expectAnswers(PatchIndex const& index, unsigned long long id) {
 
 }  // namespace
 
-TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {
+TEST(PatchIndex, AgreesWithTheQueriesOnRandomTrees) {
     tests::Random random(3);
     for (int i = 0; i < 1500; ++i) {
         PatchIndex const index(randomPatch(random, 4));
@@ -282,7 +282,7 @@ TEST(PatchIndex, AgreesWithTheWalksOnRandomTrees) {
     }
 }
 
-TEST(PatchIndex, AgreesWithTheWalksAfterChainsOfUpdates) {
+TEST(PatchIndex, AgreesWithTheQueriesAfterManyUpdates) {
     Random random(5);
     for (int i = 0; i < 60; ++i) {
         AnyDocument any(random);
@@ -295,7 +295,7 @@ TEST(PatchIndex, AgreesWithTheWalksAfterChainsOfUpdates) {
             switch (random.below(8)) {
                 case 0: next = history[random.below(history.size())]; break;
                 case 1: next = Model(former).toPatch(); break;  // Shares nothing.
-                case 2: next = randomPatch(random, 3); break;   // Identifiers repeat.
+                case 2: next = randomPatch(random, 3); break;   // With repeated identifiers.
                 default: {
                     Model model(former);
                     PatchEdit edit(index);
@@ -319,7 +319,7 @@ TEST(PatchIndex, AgreesWithTheWalksAfterChainsOfUpdates) {
     }
 }
 
-TEST(PatchIndex, FollowsUpdatesOfEachKind) {
+TEST(PatchIndex, HandlesUpdatesOfEachKind) {
     auto const base = [] {
         return patch(1,
                      {withPorts(patch(2, {patch(4)}), {port(21)}, {port(22)}),
@@ -422,7 +422,7 @@ TEST(PatchIndex, UpdatesSurviveFailingAllocations) {
     }
 }
 
-// Each is a little larger than the one before, and now and then one is made anew.
+// Each update adds a little; occasionally the index is rebuilt.
 TEST(PatchIndex, SurvivesManyUpdates) {
     PatchIndex index(patch(1, {withPorts(patch(2), {port(1)}, {port(2)})}));
     for (int i = 0; i < 3000; ++i) {
@@ -463,7 +463,7 @@ TEST(PatchIndex, QueriesAllocateNothing) {
     PatchIndex const index(smallGraph());
     struct Query {
         char const* name;
-        std::size_t found;  // In the small graph, of all identifiers together.
+        std::size_t found;  // In the small graph, for all identifiers together.
         std::size_t (*ask)(PatchIndex const&, unsigned long long id);
     };
     for (Query const& query : {
@@ -501,7 +501,7 @@ TEST(PatchIndex, SurvivesFailingAllocations) {
     EXPECT_EQ(index.findPatch(7), &evaluated.children->at(1));
 }
 
-TEST(EvalPatchIndex, AgreesWithTheWalksOnRandomTrees) {
+TEST(EvalPatchIndex, AgreesWithTheQueriesOnRandomTrees) {
     tests::Random random(4);
     for (int i = 0; i < 500; ++i) {
         EvalPatchIndex const index(EvalPatch(randomPatch(random, 4)));
@@ -532,7 +532,7 @@ TEST(EvalPatchIndex, AgreesWithTheWalksOnRandomTrees) {
     }
 }
 
-TEST(EvalPatchIndex, SeesChangesWhenItIsRebuilt) {
+TEST(EvalPatchIndex, SeesChangesAfterRebuild) {
     EvalPatch const evaluated{smallGraph()};
     EvalPatchIndex index(evaluated);
     EvalPatchIndex const asItWas = index;
@@ -544,7 +544,7 @@ TEST(EvalPatchIndex, SeesChangesWhenItIsRebuilt) {
     EXPECT_EQ(asItWas.findInputPort(77), nullptr);
 }
 
-TEST(PatchIndex, OfADeepGraphNeedsNoDeepStack) {
+TEST(PatchIndex, NeedsNoDeepStack) {
     onStackOf(kStack, [] {
         Patch root = withPorts(patch(kDeepest), {port(1)}, {port(2)});
         for (unsigned long long id = kDeepest - 1; id > 0; --id) {

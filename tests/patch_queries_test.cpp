@@ -20,7 +20,7 @@ using Set = std::unordered_set<Connection>;
 
 }  // namespace
 
-TEST(FindPatchRecursive, LooksAtALevelBeforeItEntersIt) {
+TEST(FindPatchRecursive, SearchesALevelBeforeDescending) {
     Patch deep = patch(7);
     deep.name = "deep";
     Patch shallow = patch(7);
@@ -64,7 +64,7 @@ TEST(FindPort, SearchesThePatchAndItsChildren) {
     EXPECT_EQ(findOutputPort(evaluated, 11), nullptr);
 }
 
-TEST(FindConnections, SearchThePatchsOwn) {
+TEST(FindConnections, SearchesTheConnectionsOfThePatch) {
     Connection const a{1, 10, 2, 20};
     Connection const b{3, 30, 2, 20};
     Connection const c{1, 10, 4, 40};
@@ -82,8 +82,8 @@ TEST(FindConnections, SearchThePatchsOwn) {
     EXPECT_EQ(findOutgoingConnectionsFromPatch(root, 2), Set());
 }
 
-TEST(FindOutgoingConnectionsFromPort, EndsAtTheParentOfThePortsPatch) {
-    Connection const wrongPatch{77, 10, 3, 30};  // Matched by the port alone.
+TEST(FindOutgoingConnectionsFromPort, StopsAtTheParentOfThePortsPatch) {
+    Connection const wrongPatch{77, 10, 3, 30};  // Only the port matches.
     Connection const twice{2, 10, 4, 40};
     Patch const deeper =
         patch(6, {withPorts(patch(7), {}, {port(10), port(60)})}, {{7, 10, 8, 80}, {7, 60, 8, 81}});
@@ -114,7 +114,7 @@ TEST(FindOutgoingConnectionsFromPort, EndsAtTheParentOfThePortsPatch) {
     EXPECT_FALSE(_findOutgoingConnectionsFromPort(patch(1), 1).hasValue());
 }
 
-TEST(PortForTag, IsTheFirstOfThePatchsOwn) {
+TEST(PortForTag, IsTheFirstPortOfThePatch) {
     Patch const root =
         withPorts(patch(1, {withPorts(patch(2), {port(21, 5)}, {port(22, 6)})}),
                   {port(11, 1), port(12, 2), port(13, 1)}, {port(14, 1), port(15, 3), port(16, 3)});
@@ -134,7 +134,7 @@ TEST(PortForTag, IsTheFirstOfThePatchsOwn) {
     EXPECT_EQ(outPortForTag(evaluated, 6), nullptr);
 }
 
-TEST(Queries, GiveWhatLivesAsLongAsTheLists) {
+TEST(Queries, ReturnPointersIntoTheLists) {
     Array<Patch> children;
     Patch const* child = nullptr;
     {

@@ -30,7 +30,7 @@ std::map<std::string, Unstructured> const kOtherKeys{{"A", 1}, {"b", "two"}};
 
 }  // namespace
 
-TEST(Records, HoldEmptyListsUntilGivenOthers) {
+TEST(Records, HaveEmptyListsInitially) {
     Patch const fresh;
     for (std::size_t size : {fresh.inputs->size(), fresh.outputs->size(), fresh.connections->size(),
                              fresh.children->size()}) {
@@ -47,7 +47,7 @@ TEST(Records, HoldEmptyListsUntilGivenOthers) {
     EXPECT_EQ(Connection(), (Connection{0, 0, 0, 0}));
 }
 
-TEST(Port, EqualsFieldByField) {
+TEST(Port, ComparesAllFields) {
     auto const base = [] {
         Port p = port(1, 2);
         p.typeInfo.min = Value(0.0);
@@ -93,7 +93,7 @@ TEST(Port, EqualsFieldByField) {
     }
 }
 
-TEST(Connection, EqualsAndHashesByAllFields) {
+TEST(Connection, ComparesAndHashesAllFields) {
     Connection const base{1, 2, 3, 4};
     EXPECT_EQ(base, (Connection{1, 2, 3, 4}));
     for (Connection const& other : {Connection{9, 2, 3, 4}, Connection{1, 9, 3, 4},
@@ -104,7 +104,7 @@ TEST(Connection, EqualsAndHashesByAllFields) {
     }
     struct Row {
         Connection connection;
-        std::uint64_t hash;  // Of which a `std::size_t` of 32 bits holds the lower half.
+        std::uint64_t hash;  // A 32-bit `std::size_t` holds the lower half.
     };
     for (Row const& row : {
              Row{{1, 2, 3, 4}, 0x28253c81ad382},
@@ -129,7 +129,7 @@ TEST(Connection, EqualsAndHashesByAllFields) {
 }
 
 TEST(Patch, SharesItsEmptyListsAndAllocatesNothing) {
-    Patch const first;  // What is made at first use.
+    Patch const first;  // Initialises statics.
     tests::AllocationCounter counter;
     {
         Patch const patch;
@@ -142,13 +142,13 @@ TEST(Patch, SharesItsEmptyListsAndAllocatesNothing) {
         EXPECT_TRUE(patch.inputs != nullptr && patch.inputs->empty());
         EXPECT_TRUE(patch.children != nullptr && patch.children->empty());
         EXPECT_TRUE(patch.connections != nullptr && patch.connections->empty());
-        // Without a count that threads would fight over.
+        // Without a reference count that threads would contend for.
         EXPECT_EQ(patch.inputs.use_count(), 0);
     }
     EXPECT_EQ(counter.count(), 0u);
 }
 
-TEST(Array, IsMadeOfAVectorOrInBraces) {
+TEST(Array, IsConstructedFromAVectorOrBraces) {
     Array<Port> const ofVector = arrayOf(std::vector<Port>{Port{1}, Port{2}});
     EXPECT_EQ(ofVector->size(), 2u);
     EXPECT_EQ((*ofVector)[1].id, 2u);
@@ -159,7 +159,7 @@ TEST(Array, IsMadeOfAVectorOrInBraces) {
     EXPECT_EQ(arrayOf(std::move(ports))->data(), before);
 }
 
-TEST(Map, TakesWhateverCanBeInvoked) {
+TEST(Map, AcceptsAnyCallable) {
     Array<Port> const list = arrayOf<Port>({Port{7}, Port{8, 0, "second"}});
     EXPECT_EQ(*map(&Port::id, list), (std::vector<unsigned long long>{7, 8}));
     EXPECT_EQ(*map(&Port::name, list), (std::vector<std::string>{"", "second"}));
@@ -167,7 +167,7 @@ TEST(Map, TakesWhateverCanBeInvoked) {
     EXPECT_EQ(*map(twice, list), (std::vector<unsigned long long>{14, 16}));
 }
 
-TEST(PatchDeathTest, ANullListIsNamed) {
+TEST(PatchDeathTest, NamesANullList) {
     auto const said = [](char const* condition) {
         return tests::failedAssertion(condition, "elementsOf", "Engine/Base/patch");
     };
@@ -199,7 +199,7 @@ TEST(PatchDeathTest, ANullListIsNamed) {
     EXPECT_ENDS(findInputPort(noEvalChildren, 1), said("children != nullptr"));
 }
 
-TEST(Patch, EqualsFieldByField) {
+TEST(Patch, ComparesAllFields) {
     auto const withAttributes = [] {
         Patch p = sampleDocument();
         p.attributes = {{"a", 1}, {"b", "two"}};
@@ -282,7 +282,7 @@ TEST(Patch, EqualsFieldByField) {
     }
 }
 
-TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
+TEST(Patch, TreatsOnlySharedListsAsEqual) {
     Port nan = port(1);
     nan.defaultValue = double(NAN);
     for (Array<Port> Patch::*ports : {&Patch::inputs, &Patch::outputs}) {
@@ -296,7 +296,7 @@ TEST(Patch, TakesSharedListsForEqualAndNothingElse) {
         EXPECT_TRUE(a == Patch(a));
         Patch c = patch(1, {a});
         EXPECT_TRUE(c == Patch(c));
-        // Children that are not shared are looked at, and share their own lists.
+        // Children that are not shared are compared, and share their own lists.
         EXPECT_TRUE(c == patch(1, {a}));
         EXPECT_FALSE(c == patch(1, {[&] {
                                     Patch d;
@@ -320,7 +320,7 @@ TEST(Patch, CopiesShareTheirLists) {
     EXPECT_EQ(copy.connections, original.connections);
 }
 
-TEST(Records, AreZeroAndEmptyAtFirst) {
+TEST(Records, AreInitiallyZeroAndEmpty) {
     Port const port;
     EXPECT_EQ(port.id, 0u);
     EXPECT_EQ(port.tag, 0u);
@@ -351,7 +351,7 @@ TEST(Map, AppliesAFunctionInOrderWithOneAllocationForTheList) {
     EXPECT_EQ(*ids, (std::vector<unsigned long long>{10, 20, 30}));
     tests::AllocationCounter counter;
     EXPECT_EQ(map([](Port const& p) { return p.id; }, ports)->size(), 3u);
-    EXPECT_EQ(counter.count(), 2u);  // The elements, and the list with its count.
+    EXPECT_EQ(counter.count(), 2u);  // The elements, and the list with its reference count.
     MutableArray<EvalPort> const none = map(toEvalPort, arrayOf<Port>({}));
     ASSERT_NE(none, nullptr);
     EXPECT_TRUE(none->empty());

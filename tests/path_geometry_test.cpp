@@ -17,7 +17,7 @@ PathElement element(PathInstruction instruction, Points points) {
     return {instruction, std::move(points)};
 }
 
-TEST(Bounds, AreThoseOfWhatIsDrawn) {
+TEST(Bounds, EncloseWhatIsDrawn) {
     struct Row {
         char const* what;
         Path path;
@@ -31,7 +31,7 @@ TEST(Bounds, AreThoseOfWhatIsDrawn) {
              Row{"a rectangle",
                  PathBuilder().roundRect({1, 2}, {10, 4}, 1).build(),
                  {{1, 2}, {11, 6}}},
-             // Handles at 4, the curve itself at 3.
+             // The control points are at 4, the curve reaches 3.
              Row{"a cubic curve",
                  PathBuilder().moveTo({0, 0}).curveTo({0, 4}, {8, 4}, {8, 0}).build(),
                  {{0, 0}, {8, 3}}},
@@ -80,7 +80,7 @@ TEST(Bounds, AreThoseOfWhatIsDrawn) {
         SCOPED_TRACE(row.what);
         Optional<Bounds> const box = bounds(row.path);
         ASSERT_TRUE(box.hasValue());
-        // What rounding leaves of a sum of a few terms of this size.
+        // Within the rounding errors of a sum of a few terms of this size.
         auto const near = [](double a, double b) {
             return a == b ||
                    std::abs(a - b) <=
@@ -99,8 +99,8 @@ TEST(Bounds, AreThoseOfWhatIsDrawn) {
     EXPECT_NE((Bounds{{0, 2}, {3, 4}}), (Bounds{{1, 2}, {3, 4}}));
 }
 
-// Every point of a curve lies inside, and some come close to each edge.
-TEST(Bounds, AgreeWithManyPointsOfRandomCurves) {
+// Every point of a curve is inside, and some are close to each edge.
+TEST(Bounds, EncloseRandomCurvesTightly) {
     tests::Random random(21);
     for (int i = 0; i < 3000; ++i) {
         auto const point = [&] { return FloatVec2{random.number(), random.number()}; };
@@ -113,7 +113,7 @@ TEST(Bounds, AgreeWithManyPointsOfRandomCurves) {
         FloatVec2 high = p[0];
         for (int step = 0; step <= 1000; ++step) {
             double const t = step / 1000.0;
-            // By repeated division of the polygon.
+            // De Casteljau's algorithm.
             auto const between = [t](double a, double b) { return a + (b - a) * t; };
             auto const at = [&](double a, double b, double c, double d) {
                 double const ab = between(a, b);
@@ -127,8 +127,8 @@ TEST(Bounds, AgreeWithManyPointsOfRandomCurves) {
             high = {std::max(high.x, q.x), std::max(high.y, q.y)};
         }
         double const rounding = 1e-9;
-        double const step =
-            0.05;  // What a curve of this size covers around a turn in a thousandth of it.
+        double const step = 0.05;  // The distance that a curve of this size covers around an
+                                   // extremum in a thousandth of its length.
         ASSERT_LE(box.min.x, low.x + rounding);
         ASSERT_LE(box.min.y, low.y + rounding);
         ASSERT_GE(box.max.x, high.x - rounding);

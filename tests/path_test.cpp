@@ -40,7 +40,7 @@ PathElement curve(FloatVec2 a, FloatVec2 b, FloatVec2 p) {
 }
 PathElement closed() { return {PathInstruction::close, {}}; }
 
-// Arguments of shapes where it does not matter which.
+// Arguments of shapes where the values do not matter.
 constexpr FloatVec2 kOrigin{0, 0};
 constexpr FloatVec2 kAside{1, 2};
 constexpr FloatVec2 kRadii{2, 1};
@@ -48,7 +48,7 @@ constexpr FloatVec2 kSize{30, 40};
 
 }  // namespace
 
-TEST(PathInstruction, HasItsNumberAndItsName) {
+TEST(PathInstruction, HasItsNumberAndName) {
     struct Row {
         int number;
         PathInstruction instruction;
@@ -69,7 +69,7 @@ TEST(PathInstruction, HasItsNumberAndItsName) {
     static_assert(std::is_same_v<std::underlying_type_t<PathInstruction>, unsigned char>);
 }
 
-TEST(PathInstruction, IsWrittenByItsName) {
+TEST(PathInstruction, IsPrintedByName) {
     std::ostringstream stream;
     for (unsigned char i = 0; i < 6; ++i) stream << PathInstruction(i) << " ";
     stream << PathInstruction(255);
@@ -77,7 +77,7 @@ TEST(PathInstruction, IsWrittenByItsName) {
               "moveTo lineTo curveTo quadCurveTo close PathInstruction(5) PathInstruction(255)");
 }
 
-TEST(PathInstruction, IsParsedWhereTheNameMayBeAnything) {
+TEST(PathInstruction, IsParsedFromAnyString) {
     for (unsigned char i = 0; i < 5; ++i) {
         EXPECT_EQ(parsePathInstruction(pathInstructionToString(PathInstruction(i))),
                   PathInstruction(i));
@@ -87,7 +87,7 @@ TEST(PathInstruction, IsParsedWhereTheNameMayBeAnything) {
     }
 }
 
-TEST(PathInstructionDeathTest, HasNoOtherNames) {
+TEST(PathInstructionDeathTest, RejectsOtherNames) {
     for (char const* name : {"Close", "close ", " close", "", "moveto", "curve"}) {
         SCOPED_TRACE(name);
         EXPECT_ENDS(stringToPathInstruction(name),
@@ -97,7 +97,7 @@ TEST(PathInstructionDeathTest, HasNoOtherNames) {
                 tests::failedAssertion("0", "pathInstructionToString", "Engine/Base/path"));
 }
 
-TEST(PathElement, EqualsByInstructionAndPoints) {
+TEST(PathElement, ComparesInstructionAndPoints) {
     struct Row {
         char const* what;
         PathElement a;
@@ -129,7 +129,7 @@ TEST(PathElement, EqualsByInstructionAndPoints) {
     }
 }
 
-TEST(Path, EqualsElementByElement) {
+TEST(Path, ComparesElementsInOrder) {
     Path const one{{move({1, 2})}};
     Path const two{{move({1, 2}), closed()}};
     EXPECT_EQ(Path(), Path());
@@ -157,7 +157,7 @@ TEST(Path, CopiesDeeplyAndMoves) {
     static_assert(std::is_nothrow_move_constructible_v<Path>);
 }
 
-TEST(EmptyPath, IsOneObject) {
+TEST(EmptyPath, IsTheSameObjectEveryTime) {
     EXPECT_TRUE(Path::EmptyPath()->elements.empty());
     EXPECT_EQ(Path::EmptyPath().get(), Path::EmptyPath().get());
     EXPECT_EQ(Value(Path::EmptyPath()).ifPath(), Path::EmptyPath().get());
@@ -195,13 +195,13 @@ TEST(PathBuilder, AppendsOneElementForEachCall) {
     EXPECT_EQ(&builder.hexaRect({0, 0}, {1, 1}, 1), &builder);
 }
 
-TEST(PathBuilder, TakesAnyCoordinatesInAnyOrder) {
+TEST(PathBuilder, AcceptsAnyCoordinatesInAnyOrder) {
     PathBuilder builder;
     builder.close().lineTo({NAN, INFINITY}).close();
     expectElements(builder.elements, {closed(), line({NAN, INFINITY}), closed()});
 }
 
-TEST(PathBuilder, AppendsAPathAndStaysWhereItWas) {
+TEST(PathBuilder, AppendsAPathAndKeepsItsCurrentPoint) {
     Path const other = PathBuilder().moveTo({5, 5}).lineTo({6, 6}).build();
     PathBuilder builder;
     builder.moveTo({1, 2}).append(other);
@@ -210,7 +210,7 @@ TEST(PathBuilder, AppendsAPathAndStaysWhereItWas) {
     expectElements(builder.elements, {move({1, 2}), move({5, 5}), line({6, 6}),
                                       curve({K + 1, 2}, {2, 0.447715251 + 2}, {2, 3})});
     EXPECT_EQ(other.elements.size(), 2u);
-    // A path of its own.
+    // Appends a copy of itself.
     builder.append(builder.build());
     EXPECT_EQ(builder.elements.size(), 8u);
 }
@@ -220,11 +220,11 @@ TEST(PathBuilder, AppendsInLinearTime) {
     PathBuilder builder;
     tests::AllocationCounter counter;
     for (int i = 0; i < 1000; ++i) builder.append(one);
-    // One for each copy of the argument, and few for the list that grows.
+    // One for each copy of the argument, plus a few for the growing list.
     EXPECT_LT(counter.count(), 1000u + 20u);
 }
 
-TEST(PathBuilder, BuildsAgainAndAgain) {
+TEST(PathBuilder, BuildsRepeatedly) {
     PathBuilder builder;
     Path const first = builder.moveTo({1, 2}).build();
     Path const second = builder.lineTo({3, 4}).build();
@@ -242,7 +242,7 @@ TEST(PathBuilder, BuildsAgainAndAgain) {
     EXPECT_NE(copy, moved);
 }
 
-TEST(PathBuilder, HandsItsElementsOverWhenItIsDone) {
+TEST(PathBuilder, MovesItsElementsOutOfAnRvalue) {
     PathBuilder builder;
     builder.circle({0, 0}, 1);
     Path const copy = builder.build();
@@ -265,8 +265,8 @@ TEST(PathShapes, ArcTo) {
                     curve({0, 5.52284749}, {4.47715251, 10}, {10, 10})});
 }
 
-TEST(PathShapes, ArcToMeetsTheEndsLineAtTheSumItComputed) {
-    // c + (p - c) is not p here, in either coordinate; the sum is kept.
+TEST(PathShapes, ArcToUsesTheSumAsComputed) {
+    // c + (p - c) differs from p here, in both coordinates; the sum is kept.
     FloatVec2 const c{0.7, 0.7};
     FloatVec2 const p{-1e-17, -1e-17};
     FloatVec2 const d{p.x - c.x, p.y - c.y};
@@ -293,8 +293,8 @@ TEST(PathShapes, Circle) {
     EXPECT_EQ(builder.currentPoint, (FloatVec2{1, 0}));
 }
 
-// The figures of docs/paths.md.
-TEST(PathShapes, ACircleIsAsFarOffAsDocumented) {
+// Compares the figures in docs/paths.md.
+TEST(PathShapes, ACircleDeviatesAsDocumented) {
     Path const circle = PathBuilder().circle({0, 0}, 1).build();
     FloatVec2 from = circle.elements.front().points[0];
     double outside = 0.0;
@@ -353,7 +353,7 @@ TEST(PathShapes, EllipseIsFourArcs) {
 
 TEST(PathShapes, RoundRect) {
     PathBuilder builder;
-    builder.roundRect({0, 0}, {10, 4}, 5);  // The radius becomes 2.
+    builder.roundRect({0, 0}, {10, 4}, 5);  // The radius is limited to 2.
     double const k = 2 * K;
     double const rest = 2 * 0.447715251;
     expectElements(builder.elements, {
@@ -404,7 +404,7 @@ TEST(PathShapes, RoundRectLimitsItsRadiusFromAbove) {
     }
 }
 
-TEST(PathShapes, TakeTheRoomTheyNeedAndTwiceThatWhenItIsMore) {
+TEST(PathShapes, GrowTheListGeometrically) {
     struct Row {
         char const* what;
         void (*append)(PathBuilder&);
@@ -425,12 +425,12 @@ TEST(PathShapes, TakeTheRoomTheyNeedAndTwiceThatWhenItIsMore) {
         EXPECT_EQ(builder.elements.capacity(), 2 * row.size);
         row.append(builder);
         EXPECT_EQ(builder.elements.capacity(), 4 * row.size);
-        row.append(builder);  // Which just fits.
+        row.append(builder);  // Exactly fills the capacity.
         EXPECT_EQ(builder.elements.capacity(), 4 * row.size);
     }
 }
 
-TEST(PathShapes, RoundRectTakesTheLaterOfTwoZeros) {
+TEST(PathShapes, RoundRectKeepsTheSignOfTheHeightsZero) {
     struct Row {
         char const* what;
         FloatVec2 size;
@@ -450,7 +450,7 @@ TEST(PathShapes, RoundRectTakesTheLaterOfTwoZeros) {
     }
 }
 
-TEST(PathShapes, RoundRectKeepsElementsOfNoLength) {
+TEST(PathShapes, RoundRectKeepsElementsOfZeroLength) {
     PathBuilder builder;
     builder.roundRect({0, 0}, {4, 4}, 0);
     ASSERT_EQ(builder.elements.size(), 10u);
@@ -476,7 +476,7 @@ TEST(PathShapes, HexaRect) {
                     line({7, 12}), line({1, 6}), line({1, 8}), closed()});
 }
 
-// The shapes again, from their elements' coordinates in full rather than from the primitives.
+// The shapes computed from their coordinates rather than from the builder's primitives.
 TEST(PathShapes, AgreeWithAModelOnRandomSizes) {
     tests::Random random(43);
     auto const quarter = [](FloatVec2 c, FloatVec2 p, bool vertical) {

@@ -43,7 +43,7 @@ void expectSame(Points const& points, std::vector<FloatVec2> const& expected) {
     }
 }
 
-// The points of `counted` from a source that cannot be read twice, such as a stream.
+// The points of `counted` through an input iterator, such as that of a stream.
 struct ReadOnce {
     using iterator_category = std::input_iterator_tag;
     using value_type = FloatVec2;
@@ -61,14 +61,14 @@ struct ReadOnce {
     bool operator!=(ReadOnce const& other) const { return position != other.position; }
 };
 
-// Arguments where it does not matter which; the longer list is as `counted` makes it.
+// Arguments whose values do not matter; `counted` makes the longer list.
 constexpr FloatVec2 kPoint{1, 2};
 constexpr std::initializer_list<FloatVec2> kPair{{1, 2}, {3, 4}};
 constexpr std::initializer_list<FloatVec2> kList{{0, 0}, {1, 0.5}, {2, 1}, {3, 1.5}};
 
 }  // namespace
 
-TEST(Points, AreMadeLikeAVector) {
+TEST(Points, AreConstructedLikeAVector) {
     expectSame(Points(), {});
     expectSame(Points(2), {{0, 0}, {0, 0}});
     expectSame(Points(2, {1, 2}), {{1, 2}, {1, 2}});
@@ -97,7 +97,7 @@ TEST(Points, AreMadeLikeAVector) {
     }
 }
 
-TEST(Points, OfUpToThreeAllocateNothing) {
+TEST(Points, AllocateNothingForUpToThree) {
     tests::AllocationCounter counter;
     Points points{{1, 2}, {3, 4}, {5, 6}};
     Points copy = points;
@@ -112,7 +112,7 @@ TEST(Points, OfUpToThreeAllocateNothing) {
     static_assert(sizeof(Points) <= 72);
 }
 
-TEST(Points, AreMadeInPlaceFromNumbersOfAnyKind) {
+TEST(Points, EmplaceFromNumbersOfAnyType) {
     Points points;
     FloatVec2& made = points.emplace_back(1, 2);
     EXPECT_EQ(made, (FloatVec2{1, 2}));
@@ -137,7 +137,7 @@ TEST(Points, AreErasedByValueAndByPredicate) {
     EXPECT_EQ(erase_if(points, [](FloatVec2 const&) { return true; }), 0u);
 }
 
-TEST(Points, FailNowhereThatAVectorDoesNot) {
+TEST(Points, ThrowOnlyWhereAVectorThrows) {
     Points points;
     static_assert(
         noexcept(points.begin(), points.end(), points.cbegin(), points.rbegin(), points.crend()));
@@ -148,7 +148,7 @@ TEST(Points, FailNowhereThatAVectorDoesNot) {
 }
 
 #if defined(_GLIBCXX_ASSERTIONS)
-TEST(PointsDeathTest, CheckTheirIndicesWhereAVectorDoes) {
+TEST(PointsDeathTest, CheckIndicesWhereAVectorDoes) {
     Points points{{1, 2}, {3, 4}};
     Points const constant;
     Points empty;
@@ -164,7 +164,7 @@ TEST(PointsDeathTest, CheckTheirIndicesWhereAVectorDoes) {
 }
 #endif
 
-TEST(Points, KeepRoomUntilTheyShrink) {
+TEST(Points, KeepTheirCapacityUntilTheyShrink) {
     EXPECT_EQ(Points().max_size(), sizeof(std::size_t) == 8 ? 4294967295u : 134217727u);
     try {
         Points().reserve(Points().max_size() + 1);
@@ -216,7 +216,7 @@ TEST(Points, GrowGeometricallyHoweverTheyAreAppended) {
     }
 }
 
-TEST(Points, AreAssignedIntoTheRoomThereIs) {
+TEST(Points, ReuseTheirCapacityInAssignments) {
     struct Row {
         char const* label;
         std::function<void(Points&)> assign;
@@ -258,7 +258,7 @@ TEST(Points, AreAssignedIntoTheRoomThereIs) {
     EXPECT_EQ(points.capacity(), 20u);
 }
 
-TEST(Points, AllocateOnceForARangeThatCanBeCounted) {
+TEST(Points, AllocateOnceForAForwardRange) {
     std::list<FloatVec2> const list(1000, {1, 2});
     tests::AllocationCounter counter;
     Points const points(list.begin(), list.end());
@@ -266,7 +266,7 @@ TEST(Points, AllocateOnceForARangeThatCanBeCounted) {
     EXPECT_EQ(points.capacity(), 1000u);
 }
 
-TEST(Points, GiveBackWhatARangeThatFailsHasTaken) {
+TEST(Points, FreeARangeThatThrows) {
     tests::AllocationCounter counter;
     EXPECT_EQ(tests::failEachAllocation([] { Points(ReadOnce{0}, ReadOnce{20}); },
                                         [&] { EXPECT_EQ(counter.held(), 0u); }),
@@ -274,7 +274,7 @@ TEST(Points, GiveBackWhatARangeThatFailsHasTaken) {
     expectSame(Points(ReadOnce{0}, ReadOnce{20}), counted(20));
 }
 
-TEST(Points, GiveBothEndsToThoseWhoOnlyRead) {
+TEST(Points, HaveConstFrontAndBack) {
     Points const few{{1, 2}, {3, 4}};
     Points const many{{1, 2}, {3, 4}, {5, 6}, {7, 8}};
     EXPECT_EQ(few.front(), (FloatVec2{1, 2}));
@@ -283,13 +283,13 @@ TEST(Points, GiveBothEndsToThoseWhoOnlyRead) {
     EXPECT_EQ(many.back(), (FloatVec2{7, 8}));
 }
 
-TEST(Points, CompareAsFloatingPointNumbersDo) {
+TEST(Points, CompareAsFloatingPointNumbers) {
     EXPECT_TRUE((Points{{0.0, 1}} == Points{{-0.0, 1}}));
     EXPECT_TRUE((Points{{NAN, 1}} != Points{{NAN, 1}}));
     EXPECT_TRUE((Points{{1, 1}} != Points{{1, 1}, {1, 1}}));
 }
 
-TEST(Points, AnswerWhereWhatWasInsertedBegins) {
+TEST(Points, ReturnThePositionOfAnInsertion) {
     Points points{{1, 1}, {2, 2}, {3, 3}};
     EXPECT_EQ(points.insert(points.begin() + 2, FloatVec2{9, 9}) - points.begin(), 2);
     EXPECT_EQ(points.insert(points.end(), 2, FloatVec2{8, 8}) - points.begin(), 4);
@@ -297,7 +297,7 @@ TEST(Points, AnswerWhereWhatWasInsertedBegins) {
     EXPECT_EQ(points, (Points{{1, 1}, {7, 7}, {6, 6}, {2, 2}, {9, 9}, {3, 3}, {8, 8}, {8, 8}}));
 }
 
-TEST(Points, RefuseAnIndexOutOfRange) {
+TEST(Points, RejectAnIndexOutOfRange) {
     Points points{{1, 2}};
     Points const& constant = points;
     EXPECT_THROW(points.at(1), std::out_of_range);
@@ -309,7 +309,7 @@ TEST(Points, RefuseAnIndexOutOfRange) {
     }
 }
 
-TEST(Points, StayAsTheyWereWhenAllocationFails) {
+TEST(Points, StayUnchangedWhenAllocationFails) {
     Points points = counted(3);
     auto const untouched = [&] { expectSame(points, counted(3)); };
     EXPECT_EQ(tests::failEachAllocation([&] { points.push_back({9, 9}); }, untouched), 1u);
@@ -326,7 +326,7 @@ TEST(Points, StayAsTheyWereWhenAllocationFails) {
     expectSame(points, std::vector<FloatVec2>(50, {9, 9}));
 }
 
-TEST(Points, DoWhatAVectorDoes) {
+TEST(Points, BehaveLikeAVector) {
     tests::Random random(42);
     for (int round = 0; round < 300; ++round) {
         Points points;
@@ -389,7 +389,7 @@ TEST(Points, DoWhatAVectorDoes) {
                     model.front() = p;
                     ASSERT_EQ(points.back(), model.back());
                     break;
-                case 13: {  // Of its own points.
+                case 13: {  // Inserts a range of its own points.
                     std::vector<FloatVec2> const own = model;
                     points.insert(points.begin() + offset, points.begin(), points.end());
                     model.insert(model.begin() + offset, own.begin(), own.end());

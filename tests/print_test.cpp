@@ -9,7 +9,7 @@
 using namespace tarn::engine;
 using testing::PrintToString;
 
-TEST(Print, OfAValueTellsItFromEveryOther) {
+TEST(Print, ShowsEveryDifferenceOfValues) {
     struct Row {
         Value value;
         char const* text;
@@ -48,7 +48,7 @@ TEST(Print, OfAValueTellsItFromEveryOther) {
     }
 }
 
-TEST(Print, OfTypesAndPartsIsNoListOfBytes) {
+TEST(Print, ShowsTypesInsteadOfBytes) {
     EXPECT_EQ(PrintToString(Type::Float), "float");
     EXPECT_EQ(PrintToString(FloatVec2{0.5, 1}), "(0.5, 1.0)");
     EXPECT_EQ(PrintToString(PathElement{PathInstruction::lineTo, {{1, 2}}}), "lineTo (1.0, 2.0)");

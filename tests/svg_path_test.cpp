@@ -21,7 +21,7 @@ PathElement element(PathInstruction instruction, Points points) {
     return {instruction, std::move(points)};
 }
 
-TEST(SvgPathData, HasOneLetterForEachElement) {
+TEST(SvgPathData, HasOneCommandPerElement) {
     struct Row {
         char const* what;
         Path path;
@@ -53,7 +53,7 @@ TEST(SvgPathData, HasOneLetterForEachElement) {
     }
 }
 
-TEST(SvgPathData, WritesTheShortestNumbersThatReadBack) {
+TEST(SvgPathData, WritesTheShortestExactNumbers) {
     struct Row {
         double number;
         char const* text;
@@ -86,7 +86,7 @@ TEST(SvgPathData, WritesTheShortestNumbersThatReadBack) {
     }
 }
 
-TEST(SvgPathData, DoesNotFollowTheRoundingMode) {
+TEST(SvgPathData, IgnoresTheRoundingMode) {
 #if defined(FE_UPWARD)
     for (int mode : {FE_UPWARD, FE_DOWNWARD, FE_TOWARDZERO}) {
         std::fesetround(mode);
@@ -105,7 +105,7 @@ TEST(SvgPathData, DoesNotFollowTheRoundingMode) {
     EXPECT_EQ(svgPathData(Path({element(PathInstruction(77), {{1, 2}})})), "");
 }
 
-TEST(SvgPathData, ReadsBackToTheSameDoubles) {
+TEST(SvgPathData, RoundTripsToTheSameDoubles) {
     tests::Random random(17);
     for (int i = 0; i < 3000; ++i) {
         auto const number = [&] {
@@ -139,7 +139,7 @@ TEST(SvgPathData, ReadsBackToTheSameDoubles) {
     }
 }
 
-TEST(SvgPathData, DoesNotFollowTheDecimalPointOfTheCLibrary) {
+TEST(SvgPathData, IgnoresTheDecimalPointOfTheCLibrary) {
     tests::CLocaleWithComma comma;
     ASSERT_TRUE(comma.isSet());
     EXPECT_EQ(svgPathData(PathBuilder().moveTo({1.5, 2.25}).build()), "M1.5 2.25");
@@ -147,7 +147,7 @@ TEST(SvgPathData, DoesNotFollowTheDecimalPointOfTheCLibrary) {
     EXPECT_EQ(*pathFromSvgPathData("M1,2"), PathBuilder().moveTo({1, 2}).build());
 }
 
-TEST(PathFromSvgPathData, ReadsEveryCommand) {
+TEST(PathFromSvgPathData, ParsesEveryCommand) {
     auto const from = [](double x, double y) { return PathBuilder().moveTo({x, y}); };
     struct Row {
         char const* data;
@@ -208,7 +208,7 @@ TEST(PathFromSvgPathData, ReadsEveryCommand) {
     }
 }
 
-TEST(PathFromSvgPathData, SaysWhereTheFaultIs) {
+TEST(PathFromSvgPathData, ReportsTheFirstInvalidByte) {
     struct Row {
         std::string data;
         std::size_t fault;
@@ -251,8 +251,8 @@ TEST(PathFromSvgPathData, SaysWhereTheFaultIs) {
     }
 }
 
-// Each piece of an arc is a cubic curve near the circle, and the pieces together cover the angle.
-TEST(PathFromSvgPathData, TurnsArcsIntoCurves) {
+// Each piece of an arc is a cubic curve close to the circle; together they cover the angle.
+TEST(PathFromSvgPathData, ConvertsArcsToCurves) {
     struct Row {
         char const* what;
         char const* data;
@@ -305,7 +305,7 @@ TEST(PathFromSvgPathData, TurnsArcsIntoCurves) {
     EXPECT_EQ(ellipse.elements.back().points[2], (FloatVec2{1, 0}));
     Path const turned = *pathFromSvgPathData("M2 0A1 2 90 0 0 0 1");
     EXPECT_EQ(turned.elements.size(), 2u);
-    // Beside a large radius the way is straight, however large.
+    // With a large radius the arc is nearly straight.
     for (char const* data :
          {"M0 0A1e9 1e9 0 0 1 1 0", "M0 0A1e17 1e17 0 0 1 1 0", "M0 0A1e160 1e160 0 0 1 1 0",
           "M0 0A1e300 1e300 0 0 1 1 0", "M0 0A1e307 1e307 30 0 0 1 0"}) {

@@ -1,5 +1,5 @@
-// Values, data and indexes shared among threads, and what is made at first use. ThreadSanitizer
-// watches when the tests are built with it.
+// Values, data and indexes shared among threads, and lazily initialised statics. To be run with
+// ThreadSanitizer too.
 
 #include <Engine/Base/easing.h>
 #include <Engine/Base/media.h>
@@ -26,7 +26,7 @@ namespace {
 
 constexpr int kThreads = 8;
 
-// Runs `work` on all threads, none before all are there.
+// Runs `work` on all threads, starting them together.
 void onManyThreads(std::function<void(int thread)> const& work) {
     std::atomic<int> waiting{kThreads};
     std::vector<std::thread> threads;
@@ -56,8 +56,8 @@ Loop sharedValues() {
 
 }  // namespace
 
-// First in its program, so that what is made at first use is made by all threads at once.
-TEST(Threads, TakeWhatIsMadeAtFirstUseAtOnce) {
+// The first test of the program, so that all threads initialise the statics at once.
+TEST(Threads, InitialiseStaticsConcurrently) {
     TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), {}};
     std::vector<Path const*> paths(kThreads);
     std::vector<Loop const*> loops(kThreads);
@@ -107,7 +107,7 @@ TEST(Threads, CopyReadComparePrintAndDestroySharedValues) {
     });
 }
 
-TEST(Threads, LeaveTheLastReferenceToAnyOfThem) {
+TEST(Threads, MayReleaseTheLastReference) {
     for (int round = 0; round < 50; ++round) {
         std::vector<Loop> loops(kThreads, sharedValues());
         for (Loop& loop : loops) loop = loops.front();

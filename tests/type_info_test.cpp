@@ -18,7 +18,7 @@
 
 using namespace tarn::engine;
 
-TEST(TypeInfo, IsAFloatPortWithoutBoundsUnlessGiven) {
+TEST(TypeInfo, IsAFloatWithoutBoundsByDefault) {
     TypeInfo const info;
     EXPECT_EQ(info.type, Type::Float);
     EXPECT_EQ(info.subtype, 0);
@@ -51,7 +51,7 @@ TEST(TypeInfo, CopiesItsOptionalsAndReleasesTheLastFirst) {
     EXPECT_EQ(released, "eai");
 }
 
-TEST(TypeInfo, EqualsFieldByField) {
+TEST(TypeInfo, ComparesAllFields) {
     TypeInfo const base{Type::Float, 0, Value(0.0), Value(1.0), Value("e")};
     struct Row {
         char const* what;
@@ -81,7 +81,7 @@ TEST(TypeInfo, EqualsFieldByField) {
     EXPECT_NE(nan, TypeInfo(nan));
 }
 
-TEST(TypeInfo, WritesItsTypeAlone) {
+TEST(TypeInfo, PrintsOnlyItsType) {
     for (Type type : tests::kAllTypes) {
         std::ostringstream stream;
         EXPECT_EQ(&(stream << TypeInfo{type, 1, Value(0.0), Value(1.0), Value(2)}), &stream);
@@ -126,7 +126,7 @@ TEST(TypeInfo, NamesItsPort) {
     }
 }
 
-TEST(TypeInfo, NamesItsPortByTheSubtypeOfTwoTypesAlone) {
+TEST(TypeInfo, SubtypesMatterForTwoTypesOnly) {
     for (Type type : tests::kAllTypes) {
         bool const marked = type == Type::Boolean || type == Type::Unstructured;
         for (int subtype = 0; subtype < 256; ++subtype) {
@@ -141,14 +141,14 @@ TEST(TypeInfo, NamesItsPortByTheSubtypeOfTwoTypesAlone) {
     }
 }
 
-TEST(TypeInfoDeathTest, OutOfRangeNamesNoPort) {
+TEST(TypeInfoDeathTest, RejectsUndefinedEnumerators) {
     TypeInfo info;
     info.type = tests::kNoType;
     EXPECT_ENDS(portNameForTypeInfo(info, false),
                 tests::failedAssertion("0", "portNameForTypeInfo", "Engine/Base/value"));
 }
 
-TEST(CastValueToType, ClampsFloatPortsAndKeepsTheAlternative) {
+TEST(CastValueToType, ClampsFloatPortsWithoutConverting) {
     Optional<Value> const none;
     struct Row {
         char const* what;
@@ -188,12 +188,12 @@ TEST(CastValueToType, ClampsFloatPortsAndKeepsTheAlternative) {
         Value const copy = castValueToType(std::move(argument), info);
         EXPECT_EQ(copy.type(), expected->type());
         EXPECT_EQ(to_string(copy), to_string(*expected));
-        // Copied, not moved from.
+        // Copied, not moved.
         EXPECT_EQ(to_string(argument), to_string(row.value));  // NOLINT(bugprone-use-after-move)
     }
 }
 
-TEST(CastValueToType, CopiesNothingAndLeavesOtherPortsAlone) {
+TEST(CastValueToType, CopiesNothingAndNeverClampsOtherPorts) {
     Value const value = -3.0;
     Value const text = "-3";
     for (Type type : tests::kAllTypes) {
@@ -217,7 +217,7 @@ TEST(IndexLoopCasting, WrapsAroundAndClamps) {
     EXPECT_EQ(&indexLoopCasting(loop, bounded, 5), &bounded.max.value());
 }
 
-TEST(IndexLoopCasting, OfARangeIsThatOfEachIndex) {
+TEST(IndexLoopCasting, ARangeMatchesSingleIndices) {
     TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), {}};
     TypeInfo const plain;
     for (Loop const& loop : {Loop(), Loop{0.5}, Loop{0.5, 1.5, 2.5}, Loop(100, 0.5)}) {
@@ -237,7 +237,7 @@ TEST(IndexLoopCasting, OfARangeIsThatOfEachIndex) {
     }
 }
 
-TEST(IndexLoopCasting, ReadsAnEmptyLoopAsZero) {
+TEST(IndexLoopCasting, TreatsAnEmptyLoopAsZero) {
     TypeInfo const plain;
     TypeInfo const bounded{Type::Float, 0, Value(1.0), {}, {}};
     Value const& zero = indexLoopCasting(nullLoop(), plain, 5);
@@ -246,12 +246,12 @@ TEST(IndexLoopCasting, ReadsAnEmptyLoopAsZero) {
     EXPECT_EQ(&indexLoopCasting(nullLoop(), bounded, 5), &bounded.min.value());
 }
 
-TEST(NullLoop, IsOneEmptyLoop) {
+TEST(NullLoop, IsTheSameEmptyLoopEveryTime) {
     EXPECT_TRUE(nullLoop().empty());
     EXPECT_EQ(&nullLoop(), &nullLoop());
 }
 
-// The clamp, written down a second time from its meaning: the lower bound first.
+// The definition of clamping: the lower bound is tested first.
 TEST(CastValueToType, AgreesWithAModelOnRandomNumbers) {
     tests::Random random(15);
     for (int i = 0; i < 100000; ++i) {

@@ -24,7 +24,7 @@ using Kind = Unstructured::Type;
 
 }  // namespace
 
-TEST(Unstructured, IsMadeFromEverySourceAsItsAlternative) {
+TEST(Unstructured, StoresEverySourceAsItsKind) {
     Map const map{{"a", 1}};
     List const list{1, 2.5, "three"};
     std::string const text = "text";
@@ -70,7 +70,7 @@ TEST(Unstructured, IsMadeFromEverySourceAsItsAlternative) {
     static_assert(std::is_nothrow_move_assignable_v<Unstructured>);
 }
 
-TEST(Unstructured, AnswersEveryReading) {
+TEST(Unstructured, ConvertsEveryKind) {
     Map const map{{"X", 1.0}};
     List const list{1, 2};
     double const two64 = 18446744073709551616.0;
@@ -140,7 +140,7 @@ TEST(Unstructured, AnswersEveryReading) {
     EXPECT_TRUE(std::isnan(nan.asFloat()));
 }
 
-TEST(Unstructured, GivesItsContentInPlace) {
+TEST(Unstructured, ReturnsPointersToItsContent) {
     Unstructured const map = Map{{"k", "v"}};
     Unstructured const list = List{1, 2};
     Unstructured const text = "text";
@@ -150,14 +150,14 @@ TEST(Unstructured, GivesItsContentInPlace) {
     EXPECT_EQ(map.asInteger() + list.asInteger() + text.asInteger(), 0);
 }
 
-TEST(Unstructured, OrdersKeysByTheirBytes) {
+TEST(Unstructured, OrdersKeysByBytes) {
     Unstructured const data = Map{{"\xff", 1}, {"b", 2}, {"B", 3}, {"", 4}, {"\x80", 5}};
     std::vector<std::string> keys;
     for (auto const& entry : *data.ifMap()) keys.push_back(entry.first);
     EXPECT_EQ(keys, (std::vector<std::string>{"", "B", "b", "\x80", "\xff"}));
 }
 
-TEST(Unstructured, HandsOutCopies) {
+TEST(Unstructured, ReturnsCopies) {
     Unstructured const map = Map{{"a", 1}};
     Unstructured const list = List{1};
     Map mapCopy = map.asMap();
@@ -168,7 +168,7 @@ TEST(Unstructured, HandsOutCopies) {
     EXPECT_EQ(list, Unstructured(List{1}));
 }
 
-TEST(Unstructured, ComparesWithWhatItIsMadeFrom) {
+TEST(Unstructured, ComparesWithConvertibleTypes) {
     Unstructured const five = 5;
     EXPECT_TRUE(five == 5 && 5 == five && five != 5u && 5u != five && five != 5.0);
     Unstructured const text = "text";
@@ -178,7 +178,7 @@ TEST(Unstructured, ComparesWithWhatItIsMadeFrom) {
     EXPECT_TRUE(point == (FloatVec2{1, 2}) && (FloatVec2{1, 2}) == point);
 }
 
-TEST(Unstructured, EqualsTheSameAlternativeWithEqualContent) {
+TEST(Unstructured, EqualsTheSameKindWithEqualContent) {
     struct Row {
         char const* what;
         Unstructured a;
@@ -248,7 +248,7 @@ TEST(Unstructured, CopiesDeeplyAndMovesInConstantTime) {
     EXPECT_EQ(counter.count(), 0u);
 }
 
-TEST(Unstructured, TakesContentByRvalueWithoutCopyingIt) {
+TEST(Unstructured, MovesItsContentIn) {
     Map map{{"a", List{1, 2, 3}}};
     List list{Map{{"b", 1}}, "text"};
     std::string text(100, 'x');
@@ -263,7 +263,7 @@ TEST(Unstructured, TakesContentByRvalueWithoutCopyingIt) {
     EXPECT_EQ(fromText.ifString()->data(), letters);
 }
 
-TEST(Unstructured, IsAssignedFromAPartOfItself) {
+TEST(Unstructured, CanBeAssignedAPartOfItself) {
     Unstructured tree = Map{{"inner", List{Map{{"leaf", "text"}}}}};
     Unstructured const inner = tree.ifMap()->at("inner");
     Unstructured copied = tree;
@@ -279,7 +279,7 @@ TEST(Unstructured, IsAssignedFromAPartOfItself) {
     EXPECT_EQ(tree.ifMap()->at("inner"), inner);
 }
 
-TEST(Unstructured, GivesBackWhatItHeld) {
+TEST(Unstructured, FreesItsContent) {
     std::string const text = "a text that is longer than a short one";
     tests::AllocationCounter counter;
     {
@@ -295,7 +295,7 @@ TEST(Unstructured, GivesBackWhatItHeld) {
     EXPECT_EQ(counter.held(), 0u);
 }
 
-TEST(Unstructured, RemovesEmptyValuesOneLevelDeep) {
+TEST(Unstructured, RemovesEmptyValuesOfTheTopLevel) {
     Unstructured const inner = Map{{"g", ""}};
     Map const map{{"a", ""}, {"b", List{}}, {"c", Map{}}, {"d", Unstructured::Undefined()},
                   {"e", 0},  {"f", inner}};
@@ -308,7 +308,7 @@ TEST(Unstructured, RemovesEmptyValuesOneLevelDeep) {
     EXPECT_EQ(Unstructured::removeEmptyValues(kept), kept);
 }
 
-TEST(Unstructured, ReadsAsAVector) {
+TEST(Unstructured, ConvertsToVectors) {
     struct Row {
         char const* what;
         Unstructured value;
@@ -343,7 +343,7 @@ TEST(Unstructured, ReadsAsAVector) {
     }
 }
 
-TEST(Unstructured, IsTheDataOfAValue) {
+TEST(Unstructured, ConvertsFromValues) {
     struct Row {
         char const* what;
         Value value;
@@ -375,7 +375,7 @@ TEST(Unstructured, IsTheDataOfAValue) {
     EXPECT_EQ(FloatVec2(Value(FloatVec2{1, 2}).asUnstructured()), (FloatVec2{1, 2}));
 }
 
-TEST(Unstructured, OfAMovedFromValueIsNeutral) {
+TEST(Unstructured, IsNeutralForAMovedFromValue) {
     Value text = "text";
     Value data = Unstructured(5);
     Value const takenText = std::move(text);
@@ -384,7 +384,7 @@ TEST(Unstructured, OfAMovedFromValueIsNeutral) {
     EXPECT_EQ(data.asUnstructured(), Unstructured());    // NOLINT(bugprone-use-after-move)
 }
 
-TEST(Unstructured, InAValueIsACopyOfItsOwn) {
+TEST(Unstructured, IsCopiedIntoAValue) {
     Unstructured tree = Map{{"a", 1}};
     Value const value = tree;
     tree = 5;
@@ -449,7 +449,7 @@ TEST(Unstructured, FindsAlongAPath) {
     EXPECT_EQ(data.find({"render", "scale", "deeper"}), nullptr);
 }
 
-TEST(Unstructured, ReadsWithADefaultAndTellsWhatItFound) {
+TEST(Unstructured, LooksUpWithADefault) {
     using Lookup = Unstructured::Lookup;
     Unstructured const data = settings();
     struct Row {
@@ -507,7 +507,7 @@ TEST(Unstructured, ReadsWithADefaultAndTellsWhatItFound) {
     }
 }
 
-TEST(Unstructured, KnowsItsKindAndItsSize) {
+TEST(Unstructured, HasAKindAndASize) {
     struct Row {
         Unstructured data;
         Kind kind;
@@ -570,8 +570,7 @@ TEST(Unstructured, SurvivesFailingAllocations) {
 
 namespace {
 
-// Levels around `leaf`, of arrays (`kind` 0), of maps (1), or of both in turn, with something
-// beside each of them.
+// Nests `leaf` in arrays (`kind` 0), maps (1), or both alternately, with a sibling on each level.
 Unstructured nested(std::size_t levels, int kind, Unstructured leaf) {
     for (std::size_t i = 0; i < levels; ++i) {
         if (kind == 0 || (kind == 2 && i % 2 == 0)) {
@@ -676,14 +675,14 @@ TEST(Unstructured, HandlesEveryDepthAlike) {
             }
         }
     }
-    // Deep on several branches.
+    // Several deep branches.
     auto const bushy = [](char const* leaf) {
         return Unstructured(List{nested(400, 0, 1), Map{{"x", nested(300, 1, leaf)}, {"y", 5}},
                                  nested(300, 2, leaf), List{}});
     };
     EXPECT_EQ(bushy("a"), bushy("a"));
     EXPECT_NE(bushy("a"), bushy("b"));
-    // Deep, and of other sizes or with other keys beside the deep part.
+    // Deep, and with other sizes or keys next to the deep part.
     Unstructured const deep = nested(400, 2, "leaf");
     std::vector<Unstructured> const different{List{deep},
                                               List{deep, 1},
@@ -706,7 +705,7 @@ TEST(Unstructured, HandlesEveryDepthAlike) {
     EXPECT_EQ(Unstructured(copy), bushy("c"));
 }
 
-TEST(Unstructured, OfDeepTreesSurvivesFailingAllocations) {
+TEST(Unstructured, DeepTreesSurviveFailingAllocations) {
     Unstructured const source = nested(300, 2, "a leaf that is long enough to be allocated");
     Unstructured target = 5;
     EXPECT_GT(tests::failEachAllocation([&] { target = source; },
@@ -717,7 +716,7 @@ TEST(Unstructured, OfDeepTreesSurvivesFailingAllocations) {
 
 namespace {
 
-// A second form of a tree: its kind and content spelt out in one text.
+// A model of a tree: its kind and content written into one string.
 struct Spelt {
     Unstructured tree;
     std::string text;
@@ -773,7 +772,7 @@ Spelt randomTree(tests::Random& random, int depth) {
 
 }  // namespace
 
-TEST(Unstructured, EqualsExactlyWhereRandomTreesSpellTheSame) {
+TEST(Unstructured, EqualsExactlyWhereAModelDoes) {
     tests::Random random(21);
     std::size_t equal = 0;
     for (int i = 0; i < 20000; ++i) {

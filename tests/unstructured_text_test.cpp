@@ -104,7 +104,7 @@ TEST(UnstructuredText, IsUtf8WithoutControlCharacters) {
     }
 }
 
-TEST(UnstructuredText, ShowsSoManyLevels) {
+TEST(UnstructuredText, LimitsTheLevels) {
     Unstructured const data = Map{{"a", List{Map{{"b", List{}}, {"c", List{1}}}}}, {"m", Map{}}};
     struct Row {
         std::size_t depth;
@@ -124,7 +124,7 @@ TEST(UnstructuredText, ShowsSoManyLevels) {
     EXPECT_EQ(Unstructured(List{}).toText(10, 0), "[]");
 }
 
-TEST(UnstructuredText, HasSoManyBytes) {
+TEST(UnstructuredText, LimitsTheBytes) {
     Unstructured const data = List{"caf\xc3\xa9", 12345};  // ["café", 12345], 16 bytes
     struct Row {
         std::size_t bytes;
@@ -148,7 +148,7 @@ TEST(UnstructuredText, HasSoManyBytes) {
     }
 }
 
-TEST(UnstructuredText, CostsWhatItShows) {
+TEST(UnstructuredText, CostIsProportionalToItsLength) {
     Unstructured const text = std::string(std::size_t(1) << 26, 'x');
     Unstructured const many = List(std::size_t(1) << 20, Unstructured(1));
     for (int i = 0; i < 10000; ++i) {
@@ -172,7 +172,7 @@ TEST(UnstructuredText, ShowsDeepTreesOnASmallStack) {
     });
 }
 
-TEST(UnstructuredText, FollowsNoLocaleAndNoRoundingMode) {
+TEST(UnstructuredText, IgnoresLocaleAndRoundingMode) {
     Unstructured const data = List{0.3, 1.5};
     {
         tests::CLocaleWithComma comma;
@@ -193,7 +193,7 @@ TEST(UnstructuredText, FollowsNoLocaleAndNoRoundingMode) {
 
 namespace {
 
-// A tree, and the text that it is to have.
+// A tree and its expected string.
 struct Told {
     Unstructured tree;
     std::string text;
@@ -231,7 +231,7 @@ Told randomTree(tests::Random& random, std::size_t depth) {
 
 }  // namespace
 
-TEST(UnstructuredText, OfRandomTreesIsThatOfItsParts) {
+TEST(UnstructuredText, MatchesAModelOnRandomTrees) {
     tests::Random random(24);
     for (int i = 0; i < 5000; ++i) {
         Told const told = randomTree(random, 5);
@@ -242,7 +242,7 @@ TEST(UnstructuredText, OfRandomTreesIsThatOfItsParts) {
             ASSERT_EQ(cut, told.text);
             continue;
         }
-        // At most three bytes of a character more than need be are left out.
+        // At most three bytes are left out to keep a character whole.
         ASSERT_LE(cut.size(), limit);
         ASSERT_GE(cut.size() + 3, limit);
         std::size_t const kept = cut.size() - std::min<std::size_t>(limit, 3);

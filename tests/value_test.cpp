@@ -50,7 +50,7 @@ Value movedFrom(Value value) {
     return value;  // NOLINT(bugprone-use-after-move): what is left is what is tested.
 }
 
-// One of each, not zero, and data of two kinds.
+// A value of each type, not zero, and unstructured data of two kinds.
 std::vector<Value> everyAlternative() {
     return {7,
             2.5,
@@ -69,7 +69,7 @@ std::vector<Value> everyAlternative() {
             "15"};
 }
 
-// Where the content is, for those that share it.
+// The address of shared content.
 void const* payload(Value const& value) {
     if (void const* path = value.ifPath()) return path;
     if (void const* text = value.ifString()) return text;
@@ -84,7 +84,7 @@ Value nullData() { return movedFrom(Unstructured(5)); }
 
 }  // namespace
 
-TEST(Type, HasItsNumberItsNameAndItsClasses) {
+TEST(Type, HasItsNumberNameAndProperties) {
     struct Row {
         int number;
         Type type;
@@ -126,19 +126,19 @@ TEST(Type, IsNotFoundByAnyOtherName) {
     EXPECT_FALSE(stringToType(std::string("int\0", 4)).hasValue());
 }
 
-TEST(Type, OutOfRangeIsInNoClass) {
+TEST(Type, UndefinedEnumeratorsHaveNoProperties) {
     for (int byte = 14; byte < 256; ++byte) {
         EXPECT_FALSE(typeIsResource(Type(byte))) << byte;
         EXPECT_FALSE(typeShouldCopyAcrossDeletedConnections(Type(byte))) << byte;
     }
 }
 
-TEST(TypeDeathTest, OutOfRangeHasNoName) {
+TEST(TypeDeathTest, RejectsUndefinedEnumerators) {
     EXPECT_ENDS(typeToString(tests::kNoType),
                 tests::failedAssertion("0", "typeToString", "Engine/Base/value"));
 }
 
-TEST(TarnType, NamesTheTypeOfANativeOne) {
+TEST(TarnType, MapsCppTypesToTypes) {
     static_assert(TarnType<double>() == Type::Float);
     static_assert(TarnType<FloatVec2>() == Type::Vec2);
     static_assert(TarnType<FloatVec3>() == Type::Vec3);
@@ -152,7 +152,7 @@ TEST(TarnType, NamesTheTypeOfANativeOne) {
     static_assert(TarnType<Unstructured>() == Type::Unstructured);
 }
 
-TEST(Vectors, CompareAsFloatingPointNumbersDo) {
+TEST(Vectors, CompareAsFloatingPointNumbers) {
     EXPECT_TRUE((FloatVec2{1, 0.0} == FloatVec2{1, -0.0}));
     EXPECT_TRUE((FloatVec2{1, 2} != FloatVec2{1, 3}));
     EXPECT_TRUE((FloatVec2{0, 2} != FloatVec2{1, 2}));
@@ -171,7 +171,7 @@ TEST(Vectors, CompareAsFloatingPointNumbersDo) {
     static_assert(std::is_aggregate_v<FloatVec2> && std::is_aggregate_v<FloatMat4>);
 }
 
-TEST(Value, IsMadeFromEverySourceAsItsAlternative) {
+TEST(Value, StoresEverySourceAsItsType) {
     struct Row {
         char const* what;
         Value value;
@@ -214,7 +214,7 @@ TEST(Value, IsMadeFromEverySourceAsItsAlternative) {
     EXPECT_EQ(tests::bits(double(Value())), tests::bits(0.0));
 }
 
-TEST(Value, MakersAreTheConstructorOfTheirType) {
+TEST(Value, FactoriesMatchTheConstructor) {
     EXPECT_EQ(Value::ResourceID<Type::Image>().id, 0u);
     EXPECT_EQ(Value::Image(42), Value(42, Type::Image));
     EXPECT_EQ(Value::Video(42), Value(42, Type::Video));
@@ -222,7 +222,7 @@ TEST(Value, MakersAreTheConstructorOfTheirType) {
     EXPECT_EQ(Value::Model(42), Value(42, Type::Model));
 }
 
-TEST(ValueDeathTest, AnIdentifierOfNoResourceIsRefused) {
+TEST(ValueDeathTest, RejectsIdentifiersOfOtherTypes) {
     for (Type type : {Type::Float, Type::Vec2, Type::Vec3, Type::Vec4, Type::Mat4, Type::Boolean,
                       Type::Int, Type::Path, Type::String, Type::Unstructured, tests::kNoType}) {
         SCOPED_TRACE(int(type));
@@ -261,7 +261,7 @@ TEST(Value, DefaultsAreNeutral) {
                 << qualifier;
         }
     }
-    // A new payload at each call.
+    // Returns a new payload at each call.
     Value const path = Value::defaultValue(Type::Path);
     EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), path.ifPath());
     EXPECT_NE(Value::defaultValue(Type::Path).ifPath(), Path::EmptyPath().get());
@@ -273,12 +273,12 @@ TEST(Value, DefaultsAreNeutral) {
     EXPECT_NE(Value::defaultValue(Type::Unstructured).ifUnstructured(), data.ifUnstructured());
 }
 
-TEST(ValueDeathTest, OutOfRangeHasNoDefault) {
+TEST(ValueDeathTest, HasNoDefaultForUndefinedEnumerators) {
     EXPECT_ENDS(Value::defaultValue(tests::kNoType),
                 tests::failedAssertion("0", "defaultValue", "Engine/Base/value"));
 }
 
-TEST(Value, IsIndependentOfWhatItWasMadeFrom) {
+TEST(Value, IsIndependentOfItsSource) {
     std::string text = "text";
     Path path = linePath();
     FloatMat4 matrix = countingMatrix();
@@ -309,7 +309,7 @@ TEST(Value, CopiesShareTheirPayload) {
     EXPECT_EQ(matrixCopy.asFloatMat4(), matrix.asFloatMat4());
 }
 
-TEST(Value, SharesAPathThatIsGivenByPointer) {
+TEST(Value, SharesAPathGivenByPointer) {
     auto const path = std::make_shared<Path const>(linePath());
     EXPECT_EQ(Value(path).ifPath(), path.get());
     EXPECT_EQ(Value(Path::EmptyPath()).ifPath(), Path::EmptyPath().get());
@@ -324,8 +324,8 @@ TEST(Value, PayloadsLiveAsLongAsTheLastCopy) {
     EXPECT_EQ(std::string(kept), std::string(100, 'x'));
 }
 
-// What every alternative reads as is in tables/readings.json, which readings_test.cpp compares.
-TEST(Value, ReadsANaNAsTheIntegerZeroAndAsTrue) {
+// conversions_test.cpp compares all other conversions with tables/conversions.json.
+TEST(Value, ConvertsANaNToZeroAndTrue) {
     EXPECT_EQ(static_cast<long long>(Value(FloatVec2{NAN, 0})), 0);
     EXPECT_EQ(static_cast<long long>(Value(FloatVec3{NAN, 0, 0})), 0);
     EXPECT_EQ(static_cast<long long>(Value(FloatVec4{NAN, 0, 0, 0})), 0);
@@ -336,7 +336,7 @@ TEST(Value, ReadsANaNAsTheIntegerZeroAndAsTrue) {
     EXPECT_TRUE(bool(Value(Unstructured(double(NAN)))));
 }
 
-TEST(Value, ReadsAStringBeyondDoublesAsInfinite) {
+TEST(Value, ConvertsHugeNumbersInStringsToInfinity) {
     errno = 0;
     EXPECT_EQ(double(Value("1e999")), INFINITY);
     EXPECT_EQ(errno, 0);
@@ -344,7 +344,7 @@ TEST(Value, ReadsAStringBeyondDoublesAsInfinite) {
     EXPECT_EQ(static_cast<long long>(Value("nan")), 0);
 }
 
-TEST(Value, ReadsAnyNumberBackFromItsDigits) {
+TEST(Value, ConvertsDigitsToTheExactNumber) {
     tests::Random random(161);
     for (int i = 0; i < 100000; ++i) {
         double const number = random.anyDouble();
@@ -360,14 +360,14 @@ TEST(Value, ReadsAnyNumberBackFromItsDigits) {
     }
 }
 
-TEST(Value, ReadsStringsWithTheDecimalPointOfTheCLibrary) {
+TEST(Value, ConvertsStringsWithTheDecimalPointOfTheCLibrary) {
     tests::CLocaleWithComma comma;
     ASSERT_TRUE(comma.isSet());
     EXPECT_EQ(double(Value("1,5")), 1.5);
     EXPECT_EQ(double(Value("1.5")), 1.0);
 }
 
-// Says what it is shown.
+// Returns the type that it was called with.
 struct Kinds {
     std::string operator()(long long const& i) const { return "integer " + std::to_string(i); }
     std::string operator()(double const& d) const { return "double " + to_string(Value(d)); }
@@ -401,7 +401,7 @@ struct Kinds {
     std::string operator()(T const&) const = delete;
 };
 
-TEST(Value, ShowsAVisitorWhatItHolds) {
+TEST(Value, PassesItsContentToAVisitor) {
     struct Row {
         char const* what;
         Value value;
@@ -497,7 +497,7 @@ TEST(Value, HasAHashThatAgreesWithEquality) {
         }
     }
     EXPECT_EQ(equal, values.size() + 2 * 8);
-    // Not the same for everything: the different ones among them have as many hashes, nearly.
+    // Hashes are spread: different values have nearly as many different hashes.
     std::set<std::size_t> hashes;
     for (Value const& value : values) hashes.insert(hash(value));
     EXPECT_GE(hashes.size(), values.size() - 8 - 3);
@@ -515,7 +515,7 @@ TEST(Value, HasAHashThatAgreesWithEquality) {
     }
 }
 
-TEST(Value, FailsNowhereThatItCannotFail) {
+TEST(Value, IsNoexceptWherePossible) {
     static_assert(std::is_nothrow_default_constructible_v<Value>);
     static_assert(std::is_nothrow_copy_constructible_v<Value>);
     static_assert(std::is_nothrow_copy_assignable_v<Value>);
@@ -529,7 +529,7 @@ TEST(Value, FailsNowhereThatItCannotFail) {
     static_assert(noexcept(FloatVec4(std::declval<Value const&>())));
     static_assert(noexcept(std::declval<Value const&>().type()));
     static_assert(noexcept(std::declval<Value const&>().ifPath()));
-    // Assigning between any two alternatives allocates nothing, so nothing can fail.
+    // Assigning between any two types allocates nothing, so nothing can fail.
     std::vector<Value> const values{
         1, 2.5, FloatVec4(), FloatMat4(), true, Value::Model(3), Path(), "text", Unstructured()};
     tests::AllocationCounter counter;
@@ -544,7 +544,7 @@ TEST(Value, FailsNowhereThatItCannotFail) {
     EXPECT_EQ(counter.count(), 0u);
 }
 
-TEST(Type, IsWrittenByItsName) {
+TEST(Type, IsPrintedByName) {
     std::ostringstream stream;
     for (int i = 0; i < 14; ++i) stream << Type(i) << " ";
     stream << Type(14) << " " << Type(255);
@@ -554,11 +554,11 @@ TEST(Type, IsWrittenByItsName) {
         "Type(14) Type(255)");
 }
 
-TEST(Value, OfANegativeZeroReadsAsAVectorOfThem) {
+TEST(Value, ConvertsANegativeZeroToAVectorOfThem) {
     EXPECT_EQ(tests::bits(FloatVec2(Value(-0.0)).y), tests::bits(-0.0));
 }
 
-TEST(Value, ReadsAsAMatrix) {
+TEST(Value, ConvertsToAMatrix) {
     EXPECT_TRUE(sameBytes(FloatMat4(Value(countingMatrix())), countingMatrix()));
     EXPECT_TRUE(sameBytes(FloatMat4(nullMatrix()), identityMatrix()));
     for (Value const& value : everyAlternative()) {
@@ -568,7 +568,7 @@ TEST(Value, ReadsAsAMatrix) {
     }
 }
 
-TEST(Value, ReadsAsAPath) {
+TEST(Value, ConvertsToAPath) {
     EXPECT_EQ(Path(Value(linePath())), linePath());
     EXPECT_EQ(Path(nullPath()), Path());
     for (Value const& value : everyAlternative()) {
@@ -578,7 +578,7 @@ TEST(Value, ReadsAsAPath) {
     }
 }
 
-TEST(Value, GivesItsPayloadInPlace) {
+TEST(Value, ReturnsPointersToItsPayload) {
     Value const matrix = countingMatrix();
     Value const path = linePath();
     Value const data = smallMap();
@@ -598,7 +598,7 @@ TEST(Value, GivesItsPayloadInPlace) {
     }
 }
 
-TEST(Value, SharesDataThatIsGivenByPointer) {
+TEST(Value, SharesDataGivenByPointer) {
     auto const tree = std::make_shared<Unstructured const>(smallMap());
     Value const value = tree;
     EXPECT_EQ(value.type(), Type::Unstructured);
@@ -606,7 +606,7 @@ TEST(Value, SharesDataThatIsGivenByPointer) {
     EXPECT_EQ(value, Value(smallMap()));
 }
 
-TEST(Value, SharesAnElementOfADocumentThatItKeeps) {
+TEST(Value, SharesAnElementAndKeepsItsDocumentAlive) {
     auto document = std::make_shared<Unstructured const>(
         Unstructured::Map{{"items", Unstructured::Array{1, Unstructured::Map{{"X", 2.5}}}}});
     std::weak_ptr<Unstructured const> const watched = document;
@@ -620,7 +620,7 @@ TEST(Value, SharesAnElementOfADocumentThatItKeeps) {
     EXPECT_EQ(FloatVec2(value).x, 2.5);
 }
 
-TEST(Value, GivesItsPayloadToBeShared) {
+TEST(Value, ReturnsSharedPointersToItsPayload) {
     std::vector<Value> const values{1,
                                     2.5,
                                     true,
@@ -663,7 +663,7 @@ TEST(Value, GivesItsPayloadToBeShared) {
     EXPECT_NE(null, Value(Unstructured()));
 }
 
-TEST(Value, BecomesAnyType) {
+TEST(Value, ConvertsToAnyType) {
     std::vector<Value> values = everyAlternative();
     for (Value const& value : {nullPath(), nullData(), nullString(), nullMatrix()}) {
         values.push_back(value);
@@ -698,7 +698,7 @@ TEST(Value, BecomesAnyType) {
     EXPECT_EQ(std::string(Value(smallMap()).asType(Type::String)), "??");
 }
 
-TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
+TEST(Value, ConvertsToATypeWithItsOwnPayload) {
     Value const matrix = countingMatrix();
     Value const path = linePath();
     Value const data = smallMap();
@@ -721,12 +721,12 @@ TEST(Value, BecomesATypeWithAPayloadOfItsOwn) {
     }
 }
 
-TEST(ValueDeathTest, BecomesNothingOutOfRange) {
+TEST(ValueDeathTest, RejectsConversionToUndefinedEnumerators) {
     EXPECT_ENDS(Value().asType(tests::kNoType),
                 tests::failedAssertion("0", "asType", "Engine/Base/value"));
 }
 
-TEST(Value, EqualsTheSameAlternativeWithEqualContent) {
+TEST(Value, EqualsTheSameTypeWithEqualContent) {
     FloatMat4 zeroMatrix;
     FloatMat4 negativeZeroMatrix;
     negativeZeroMatrix.elements[7] = -0.0;
@@ -828,7 +828,7 @@ TEST(Value, SurvivesFailingAllocations) {
     EXPECT_EQ(value, Value(tree));
 }
 
-TEST(Value, InBracesFillsAVectorsFirstNumber) {
+TEST(Value, BracesSetOnlyTheFirstComponent) {
     EXPECT_EQ(FloatVec2(Value(0.5)), (FloatVec2{0.5, 0.5}));
     EXPECT_EQ((FloatVec2{Value(0.5)}), (FloatVec2{0.5, 0}));
 }

@@ -36,7 +36,7 @@ void expectSameBits(FloatVec4 const& actual, double x, double y, double z, doubl
     EXPECT_EQ(bits(actual.w), bits(w));
 }
 
-TEST(VectorMath, IsThatOfTheComponentsToTheLastBit) {
+TEST(VectorMath, MatchesTheComponentsToTheLastBit) {
     tests::Random random(6);
     for (int i = 0; i < 10000; ++i) {
         double const a[] = {random.number(), random.number() / 3, random.number() / 7,
@@ -65,7 +65,7 @@ TEST(VectorMath, KeepsTheSignsOfZeros) {
     expectSameBits(FloatVec4{0.0, 0.0, 0.0, 0.0} * -1.0, -0.0, -0.0, -0.0, -0.0);
 }
 
-TEST(VectorMath, AssignsInPlaceAndReturnsWhatItChanged) {
+TEST(VectorMath, AssignsInPlaceAndReturnsAReference) {
     FloatVec2 v{1, 2};
     EXPECT_EQ(&(v += v), &v);
     EXPECT_EQ(v, (FloatVec2{2, 4}));

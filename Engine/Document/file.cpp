@@ -114,7 +114,7 @@ bool writeBeside(fs::path const& target, fs::path& beside, std::string_view cont
     fs::path name = nameBeside(target);
     Descriptor file(::open(name.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, mode));
     if (!file.isOpen()) {
-        problem = reason("no file can be made beside it", errno);
+        problem = reason("no file can be created next to it", errno);
         return false;
     }
     beside = std::move(name);
@@ -141,7 +141,7 @@ bool replaceFile(std::string const& fileName, std::string_view content, Document
     fs::path target = fs::weakly_canonical(fileName, failed);
     if (failed) target = fileName;
     if (fs::is_symlink(target, failed)) {
-        return refuse(error, "it is a symbolic link that leads nowhere");
+        return refuse(error, "it is a dangling symbolic link");
     }
     if (fs::exists(target, failed) && !fs::is_regular_file(target, failed)) {
         return refuse(error, "it is not a file that can be replaced");

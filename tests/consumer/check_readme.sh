@@ -1,7 +1,6 @@
 #!/bin/sh
-# Builds the program of README.md with the CMakeLists.txt of README.md, as a stranger's project that
-# adds this one as a folder, and compares what it prints with what README.md says. Runs the commands that install
-# the library.
+# Builds the program in README.md with the CMakeLists.txt in README.md, in a new project that adds this one as a
+# subdirectory, and compares its output with README.md. Then runs the installation commands.
 #
 #     check_readme.sh SOURCE_DIR COMPILER
 set -eu
@@ -26,11 +25,11 @@ diff "$work/expected" "$work/actual"
 [ -s "$work/expected" ]
 
 if grep -E -- '-W(all|extra|error)' "$work/build/compile_commands.json"; then
-    echo "our warnings reach those who use us"
+    echo "warning options leak into projects that use the library"
     exit 1
 fi
 if grep -E '_test\.cpp|document_road' "$work/build/compile_commands.json"; then
-    echo "tests or examples are built for those who use us"
+    echo "tests or examples are built in projects that use the library"
     exit 1
 fi
 for test in $(sed -n '/^## Guarantees/,$p' "$root/README.md" | grep -oE '`[A-Z][A-Za-z]+\.[A-Z][A-Za-z]+`' | tr -d '`'); do
@@ -45,4 +44,4 @@ cp -R "$root/CMakeLists.txt" "$root/LICENSE" "$root/Engine" "$root/cmake" "$root
 for file in include/Engine/Base/value.h share/doc/tarn-engine-base/LICENSE; do [ -e "$work/tarn/$file" ]; done
 if find "$work/tarn" -name 'changelog*' | grep .; then exit 1; fi
 lines=$(wc -l < "$work/main.cpp")
-echo "README.md: $lines lines compile and print what they say"
+echo "README.md: $lines lines compile and print the documented output"

@@ -1,4 +1,4 @@
-// A stranger's program that takes a document in and out.
+// A program outside this repository that reads and writes a document.
 
 #include <Engine/Document/document.h>
 

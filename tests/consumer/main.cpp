@@ -1,4 +1,5 @@
-// A stranger's program: a little of every module, from the installed headers and library.
+// A program outside this repository: a little of every module, from the installed headers and
+// library.
 
 #include <Engine/Base/easing.h>
 #include <Engine/Base/fwd.h>

@@ -1,5 +1,5 @@
 #!/bin/sh
-# What gdb shows of the values of a program, whole.
+# Compares everything that gdb prints for the objects of a program with a file.
 #
 #     check_gdb.sh PROGRAM PRINTERS EXPECTED
 set -eu
@@ -23,4 +23,4 @@ trap 'rm -f "$commands" "$commands.out"' EXIT
 } > "$commands"
 gdb -q -nx -batch -x "$commands" "$1" 2> /dev/null > "$commands.out"
 sed -n '/^integer$/,$p' "$commands.out" | diff "$3" -
-echo "as expected"
+echo "output as expected"

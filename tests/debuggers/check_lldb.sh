@@ -1,5 +1,5 @@
 #!/bin/sh
-# What lldb shows of the values of a program, whole.
+# Compares everything that lldb prints for the objects of a program with a file.
 #
 #     check_lldb.sh PROGRAM FORMATTERS EXPECTED
 set -eu
@@ -14,4 +14,4 @@ lldb -b -x -o "command script import $2" -o "breakpoint set -n here" \
     -o "process launch --no-stdio" -o finish \
     -o "frame variable $names" "$1" 2>&1 |
     sed -n 's/^(tarn::engine::[A-Za-z:<>]*) //; /^integer = /,$p' | diff "$3" -
-echo "as expected"
+echo "output as expected"

@@ -1,4 +1,4 @@
-// A program to be stopped in `here`, with one of everything that the debuggers' views show.
+// A program to break in `here`, with one object of every type that the debuggers' printers support.
 
 #include <Engine/Base/patch_index.h>
 #include <Engine/Base/path.h>
@@ -23,7 +23,7 @@ int volatile stops = 0;
 
 }  // namespace
 
-// Takes the addresses of everything, so that it is all there.
+// Takes the addresses of all objects, so that none is optimised away.
 extern "C" void here(std::initializer_list<void const*> everything) {
     stops = stops + static_cast<int>(everything.size());
 }

@@ -1,6 +1,6 @@
 #!/bin/sh
-# Compiles every program of the guide and the short use at the head of every header, and compares what the
-# programs print with what the guide says.
+# Compiles every program in the guide and every example at the top of a header, and compares the programs' output with
+# the guide.
 #
 #     check_guide.sh SOURCE_DIR COMPILER LIBRARY_DIR INCLUDE_DIR
 set -eu
@@ -42,7 +42,7 @@ for header in "$root"/examples/*.h "$root"/examples/*/*.h; do
         printf 'extern Document document;\nextern Document before;\nextern Document after;\nextern Evaluator evaluator;\n'
         printf 'extern Patch patch;\nextern EvalPort port;\nextern Film film;\n'
         use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
-        [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
+        [ -n "$use" ] || { echo "$name has no example" >&2; exit 1; }
         printf 'void shown() {\n%s\n}\n' "$use"
     } > "$work/use.cpp"
     "$compiler" -std=c++17 -fsyntax-only -I"$root" -I"$root/examples" $boost "$work/use.cpp" || {
@@ -59,7 +59,7 @@ for header in "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h; do
         printf 'using namespace tarn::engine;\nvoid follow(Connection const&);\nvoid use(Type);\nbool hasValue();\n'
         printf 'extern Patch root;\nextern Patch before;\nextern Patch after;\nextern unsigned long long portId;\nextern std::string text;\n'
         use=$(sed -n '/^\/\/     /s///p; /^#ifndef/q' "$header")
-        [ -n "$use" ] || { echo "$name shows no use" >&2; exit 1; }
+        [ -n "$use" ] || { echo "$name has no example" >&2; exit 1; }
         case $use in
             '#include'* | 'TARN_'*) printf '%s\n' "$use" ;;
             *) printf 'void shown() {\n%s\n}\n' "$use" ;;
@@ -71,4 +71,4 @@ for header in "$root"/Engine/Base/*.h "$root"/Engine/Document/*.h; do
     }
     headers=$((headers + 1))
 done
-echo "$programs programs of the guide and the uses of $headers headers"
+echo "$programs programs of the guide and the examples of $headers headers"

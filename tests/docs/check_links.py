@@ -1,6 +1,5 @@
 #!/usr/bin/env python3
-"""Looks at every relative link of HTML pages and of Markdown files: the file is there, and so is the place
-in it.
+"""Checks that the file and the anchor of every relative link in HTML pages and Markdown files exist.
 
     check_links.py HTML_FOLDER MARKDOWN_FILE...
 """
@@ -50,7 +49,7 @@ def main():
                 count += 1
                 if not (path.parent / link).exists():
                     broken.append(f"{name}: {link}: no such file")
-    print("\n".join(broken) if broken else f"{count} links lead somewhere")
+    print("\n".join(broken) if broken else f"{count} links are valid")
     return 1 if broken or count == 0 else 0
 
 

@@ -1,5 +1,5 @@
 #!/bin/sh
-# Runs an example and compares all that it prints with a file.
+# Compares the output of an example with a file.
 #
 #     check.sh EXPECTED PROGRAM [ARGUMENT...]
 set -eu

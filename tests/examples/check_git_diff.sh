@@ -1,5 +1,5 @@
 #!/bin/sh
-# Lets git compare versions of a document by tools/git/diff_documents.
+# Compares versions of a document by git with tools/git/diff_documents.
 #
 #     check_git_diff.sh SOURCE_DIR DOCUMENT_ROAD
 set -eu
@@ -38,7 +38,7 @@ git diff --no-renames HEAD > actual
 grep -v '^[-+@]' actual | diff expected -
 grep -q '^+{"other": 2}' actual
 
-# In the middle of a merge.
+# During a merge.
 git commit --quiet --all --message "Change documents"
 git checkout --quiet -b branch
 echo '{"root": {"id": 1, "name": "theirs"}}' > a.json

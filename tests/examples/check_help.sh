@@ -1,6 +1,6 @@
 #!/bin/sh
-# Compares what `document_road --help` prints with the file that scripts/demo shows. Versions of CLI11 write defaults as
-# "=13" or " [13] ", and end with a blank line or not.
+# Compares `document_road --help` with the file that scripts/demo prints. Versions of CLI11 write defaults as "=13" or
+# " [13] ", and end with a blank line or not.
 #
 #     check_help.sh EXPECTED PROGRAM
 set -eu

@@ -1,6 +1,6 @@
 #!/bin/sh
-# Has a program write a picture and compares it with a file: whole where Graphviz is of the series that laid
-# it out, and but for its numbers where it is of another, which puts things a little elsewhere.
+# Compares a picture that a program writes with a file: exactly where Graphviz has the version that made it; otherwise
+# without the numbers, since other versions place boxes differently.
 #
 #     check_picture.sh EXPECTED PROGRAM [ARGUMENT...]
 set -eu

@@ -1,6 +1,5 @@
-// The destructor of a caller's static still finds all that the library makes at first use: it is
-// made before and so destroyed after everything that a function of the library could have as a
-// static.
+// Uses the library in the destructor of a static. It is constructed before, and so destroyed after,
+// all function-local statics that the library might have.
 
 #include <Engine/Base/media.h>
 #include <Engine/Base/patch.h>
@@ -15,7 +14,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// What differs from what it has to be; null where nothing does.
+// The name of the first wrong result; null where all are right.
 char const* firstFault() {
     Value const null = std::shared_ptr<Path const>();
     if (!Path(null).elements.empty()) return "the path of a value without one";

@@ -1,6 +1,6 @@
 #!/bin/sh
-# Compiles the statements of table.txt, each in a function of its own: those that must compile as one
-# program, and the others as one in which the compiler must refuse every line.
+# Compiles the statements in table.txt, each in its own function: those that must compile as one program, the others
+# as one in which the compiler must reject every line.
 #
 #     check.sh COMPILER STANDARD INCLUDE_DIR...
 set -eu
@@ -55,10 +55,10 @@ CPP
 grep -n '^yes |' "$table" | cut -d: -f1 > "$work/yes"
 grep -n '^no  |' "$table" | cut -d: -f1 > "$work/no"
 [ -s "$work/yes" ] && [ -s "$work/no" ] || { echo "$table has no statements"; exit 1; }
-if grep -vn '^yes | .\|^no  | .\|^#\|^$' "$table"; then echo "$table: lines not understood"; exit 1; fi
+if grep -vn '^yes | .\|^no  | .\|^#\|^$' "$table"; then echo "$table: malformed lines"; exit 1; fi
 
-# program ANSWER: a program of the statements with that answer. Line N of it is the statement on line
-# N of the table.
+# program ANSWER: prints a program with the statements that have this answer. Its line N is the statement in line N of
+# the table.
 program() {
     awk -F ' [|] ' -v wanted="$1" '
         NR == 1 { print "#include \"prelude.h\""; next }
@@ -73,13 +73,13 @@ program no > "$work/no.cpp"
 
 limit=-fmax-errors=0
 "$compiler" --version | grep -q clang && limit=-ferror-limit=0
-# compile FILE: its errors, wherever they are.
+# compile FILE: prints the errors, wherever they are.
 compile() {
     # shellcheck disable=SC2086
     timeout 300 "$compiler" "-std=$standard" $includes "-I$work" $limit -w -fsyntax-only "$1" 2>&1
 }
 compile "$work/yes.cpp" || { echo "statements that must compile do not"; exit 1; }
-compile "$work/no.cpp" > "$work/errors" && { echo "the compiler refuses nothing"; exit 1; }
+compile "$work/no.cpp" > "$work/errors" && { echo "the compiler accepts statements that must not compile"; exit 1; }
 sed -n "s|^.*no\.cpp:\([0-9]*\):[0-9]*: \(fatal \)\{0,1\}error: .*|\1|p" "$work/errors" \
     | sort -nu > "$work/refused"
 

@@ -1,5 +1,5 @@
-// What the headers compute in place has to stand up to the flags that a caller compiles with: this
-// file is compiled with -ffast-math and its parts, and compares by bits what the library promises.
+// Inline functions of the headers must work with any compiler flags of the caller: this file is
+// compiled with -ffast-math and compares the results by bits.
 
 #include <Engine/Base/easing.h>
 #include <Engine/Base/path.h>
@@ -19,7 +19,7 @@ using tests::fromBits;
 
 namespace {
 
-// Where the compiler cannot see it: these flags let it take a NaN for a number.
+// Hides the value: with these flags the compiler assumes that there are no NaNs.
 double hidden(std::uint64_t all) {
     std::uint64_t const volatile kept = all;
     return fromBits(kept);
@@ -52,7 +52,7 @@ TEST(FastMath, ANaNIsUnequalToItself) {
     EXPECT_FALSE(path == path);
 }
 
-TEST(FastMath, NumbersAndInfinitiesCompareAsEverywhere) {
+TEST(FastMath, NumbersAndInfinitiesCompareCorrectly) {
     struct Row {
         char const* what;
         double a, b;
@@ -76,8 +76,8 @@ TEST(FastMath, NumbersAndInfinitiesCompareAsEverywhere) {
                   "still a constant expression");
 }
 
-// Expected are bits: these flags let the compiler take -0.0 for 0.0 where it is written.
-TEST(FastMath, TheClampLetsANaNThrough) {
+// Expected results are bits: with these flags the compiler may treat -0.0 as 0.0.
+TEST(FastMath, ClampingPassesANaN) {
     struct Row {
         char const* what;
         double in, min, max;
@@ -118,13 +118,12 @@ TEST(FastMath, ConversionsKeepEveryBit) {
     EXPECT_EQ(std::string(Value(number(-0.001))), "0");
 }
 
-TEST(FastMath, CurvesGiveTheSameBits) {
+TEST(FastMath, CurvesMatchBitForBit) {
     struct Row {
         EasingFunction function;
         std::uint64_t half, third;
     };
-    // Of the way from 0.1 to 0.7; formulas that round at every step, so that any change of their
-    // order shows.
+    // Eases from 0.1 to 0.7, where every step of a formula rounds, so that a changed order shows.
     for (Row const& row :
          {Row{EasingFunction::Linear, 0x3fd999999999999a, 0x3fd3333333333333},
           Row{EasingFunction::QuadraticOut, 0x3fe1999999999999, 0x3fdbbbbbbbbbbbbc}}) {

@@ -1,4 +1,4 @@
-// Records in braces, as callers write them where warnings are errors.
+// Braced initialisers of records, compiled with warnings as errors.
 
 #include <Engine/Base/layers.h>
 #include <Engine/Base/patch.h>

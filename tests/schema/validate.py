@@ -1,4 +1,4 @@
-"""Validates the documents named after the schema; refuses a schema that takes what is wrong.
+"""Validates the given documents against a schema, and checks that the schema rejects invalid ones.
 
     validate.py SCHEMA DOCUMENT ...
 """
@@ -48,7 +48,7 @@ def main():
     for text in WRONG:
         if validator.is_valid(json.loads(text)):
             sys.exit(f"the schema takes {text}")
-    print(f"{len(sys.argv) - 2} documents are valid, {len(WRONG)} are not")
+    print(f"{len(sys.argv) - 2} documents are valid, {len(WRONG)} are rejected")
 
 
 main()

@@ -1,6 +1,6 @@
 #!/bin/sh
-# A script that is given --no-install names the packages that are missing, installs none, and ends with 1; its other arguments
-# stay as they are.
+# With --no-install, a script prints the names of missing packages, installs nothing, and exits with 1; its other
+# arguments are not changed.
 #
 #     check_no_install.sh SCRIPTS
 set -eu
@@ -19,7 +19,7 @@ END
 chmod +x "$folder/script"
 status=0
 "$folder/script" "a b" --no-install "" > "$folder/output" 2> "$folder/errors" || status=$?
-command -v dpkg-query > /dev/null || exit 0  # Other systems have what they have.
+command -v dpkg-query > /dev/null || exit 0  # Other systems have other packages.
 [ $status = 1 ]
 [ "$(cat "$folder/output")" = "<a b><>" ]
 [ "$(cat "$folder/errors")" = "missing Debian packages: tarn-has-no-such-package" ]

@@ -40,7 +40,7 @@ void* allocate(std::size_t size) {
         countBytes(sizeOf(memory));
         return memory;
     }
-    releaseCount.fetch_add(1);  // It is not held.
+    releaseCount.fetch_add(1);  // Not counted as held.
     throw std::bad_alloc();
 }
 

@@ -1,4 +1,4 @@
-// tests/support/allocations.h: counts what the program allocates, and makes an allocation fail.
+// tests/support/allocations.h: counts allocations and makes them fail.
 //
 //     AllocationCounter counter;
 //     double d = value;
@@ -12,17 +12,17 @@
 
 namespace tests {
 
-/// Every allocation of the program since this was made.
+/// Counts the allocations of the program since its construction.
 class AllocationCounter {
 public:
     AllocationCounter();
     std::size_t count() const;
-    /// How many blocks more there are than when this was made: those not given back.
+    /// The number of allocations since construction that were not freed.
     std::size_t held() const;
-    /// How many bytes more there were at some time than when this was made; of the counter that was
-    /// made last.
+    /// The largest number of allocated bytes since construction, relative to then; only for the
+    /// counter that was constructed last.
     std::size_t peakBytes() const;
-    /// How many bytes more there are than when this was made.
+    /// The number of allocated bytes, relative to construction.
     std::size_t heldBytes() const;
 
 private:
@@ -31,8 +31,8 @@ private:
     std::size_t startBytes;
 };
 
-/// While it lives, the allocation after `succeeding` further ones throws `std::bad_alloc`; those
-/// after it succeed again.
+/// While it lives, one allocation throws `std::bad_alloc`, after `succeeding` successful ones; all
+/// later ones succeed again.
 class FailingAllocation {
 public:
     explicit FailingAllocation(std::size_t succeeding);
@@ -41,8 +41,8 @@ public:
     FailingAllocation& operator=(FailingAllocation const&) = delete;
 };
 
-/// Runs `operation` again and again, failing its first, second, ... allocation, until it gets
-/// through. After each failure `check` looks at what is left. Returns how often it failed.
+/// Runs `operation` repeatedly: its first, second, ... allocation fails, until none does. Calls
+/// `check` after each failure. Returns the number of failures.
 template <class Operation, class Check>
 std::size_t failEachAllocation(Operation operation, Check check) {
     for (std::size_t failures = 0;; ++failures) {

@@ -1,4 +1,4 @@
-// tests/support/death.h: the whole of what a program says when an assertion ends it.
+// tests/support/death.h: tests for assertion failures by their whole message.
 
 #ifndef TARN_TESTS_SUPPORT_DEATH_H
 #define TARN_TESTS_SUPPORT_DEATH_H
@@ -11,8 +11,8 @@
 #include <ostream>
 #include <string>
 
-/// The statement ends the program, and what it says matches. Skips the test where a program cannot
-/// be started again to be ended.
+/// Expects the statement to end the program with a matching message. Skips the test where a program
+/// cannot start itself again.
 #if GTEST_HAS_DEATH_TEST
 #define EXPECT_ENDS(statement, output) EXPECT_DEATH(statement, output)
 #else
@@ -26,11 +26,11 @@
 
 namespace tests {
 
-// Not known to the compiler, which would warn of what follows.
+// Not inlined, so that the compiler does not warn of unreachable code.
 inline bool hasNoDeathTests() { return true; }
 
-/// Accepts that output and no other. Patterns are of another kind on each platform, and an emulator
-/// of another machine adds a line of its own.
+/// Matches exactly that output. Each platform has its own regular expressions, and an emulator of
+/// another machine adds a line.
 class FailedAssertion : public testing::MatcherInterface<std::string const&> {
 public:
     FailedAssertion(std::string const& condition, std::string const& function,

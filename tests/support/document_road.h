@@ -1,4 +1,4 @@
-// tests/support/document_road.h: the example program, run in a folder that each test has to itself.
+// tests/support/document_road.h: runs the example program in a folder for each test.
 
 #ifndef TARN_TESTS_SUPPORT_DOCUMENT_ROAD_H
 #define TARN_TESTS_SUPPORT_DOCUMENT_ROAD_H
@@ -46,7 +46,7 @@ protected:
         return {WEXITSTATUS(status), contentsOf(folder / "out"), contentsOf(folder / "err")};
     }
 
-    // A document of a root and one child, with holes for what is to be wrong.
+    // A document with a root and one child; the arguments are the parts that a test varies.
     static std::string document(std::string const& child, std::string const& connections = "[]") {
         return R"({"root":{"id":1,"children":[)" + child + R"(],"connections":)" + connections +
                "}}";

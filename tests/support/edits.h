@@ -1,4 +1,4 @@
-// tests/support/edits.h: documents that are edited at random, by the library and once more by hand.
+// tests/support/edits.h: random edits of documents, by the library and by a model.
 
 #ifndef TARN_TESTS_SUPPORT_EDITS_H
 #define TARN_TESTS_SUPPORT_EDITS_H
@@ -16,16 +16,16 @@
 
 namespace tests {
 
-/// A document whose lists are plain ones and change in place.
+/// A document with ordinary lists that are changed in place.
 struct Model {
-    Patch fields;  // Its lists are not looked at.
+    Patch fields;  // Its lists are not used.
     std::vector<Port> inputs;
     std::vector<Port> outputs;
     std::vector<Connection> connections;
     std::list<Model> children;
-    // Whether it was there before the edits.
+    // Whether it existed before the edits.
     bool isOriginal = false;
-    // What has been touched since it was made.
+    // What has changed since construction.
     bool hasOtherInputs = false;
     bool hasOtherOutputs = false;
     bool hasOtherConnections = false;
@@ -66,7 +66,7 @@ struct Model {
         return found;
     }
 
-    /// The list that has the port, and the patch that has the list.
+    /// The list with the port, and the patch with the list.
     struct FoundPort {
         std::vector<Port>* list = nullptr;
         std::vector<Port>::iterator place = {};
@@ -93,7 +93,7 @@ struct Model {
         connections.erase(end, connections.end());
     }
 
-    // The operations of `PatchEdit`, on the root.
+    // The operations of `PatchEdit`, called on the root.
 
     bool addPort(unsigned long long patchId, Port const& port, std::size_t position,
                  std::vector<Port> Model::*ports) {
@@ -218,7 +218,7 @@ private:
     }
 };
 
-/// A random document in which every identifier is there once.
+/// A random document with distinct identifiers.
 class AnyDocument {
 public:
     explicit AnyDocument(Random& source) : random(source) {}
@@ -245,7 +245,7 @@ public:
         return result;
     }
 
-    /// One of the identifiers, or now and then none of them.
+    /// One of the identifiers, occasionally none of them.
     unsigned long long patchId() { return random.below(static_cast<std::size_t>(lastPatch) + 2); }
     unsigned long long portId() { return random.below(static_cast<std::size_t>(lastPort) + 2); }
 
@@ -262,7 +262,7 @@ private:
     unsigned long long lastPort = 0;
 };
 
-/// Does the same at random to both. False where they disagree about whether it can be done.
+/// Makes the same random change to both. False where they disagree about whether it is possible.
 inline bool editOnce(AnyDocument& any, tarn::engine::PatchEdit& edit, Model& model) {
     Random& random = any.random;
     unsigned long long const id = any.patchId();
@@ -286,7 +286,7 @@ inline bool editOnce(AnyDocument& any, tarn::engine::PatchEdit& edit, Model& mod
             if ((port == nullptr) != (found.owner == nullptr)) return false;
             if (port == nullptr) return true;
             port->defaultValue = found.place->defaultValue = random.number();
-            port->id = random.word();  // Without effect.
+            port->id = random.word();  // Ignored.
             (isInput ? found.owner->hasOtherInputs : found.owner->hasOtherOutputs) = true;
             return true;
         }
@@ -305,7 +305,7 @@ inline bool editOnce(AnyDocument& any, tarn::engine::PatchEdit& edit, Model& mod
         case 6: {
             Patch added = random.chance() ? any.patch(1) : patch(any.patchId());
             if (random.below(4) == 0) {
-                Patch copy = added;  // The same identifiers twice.
+                Patch copy = added;  // Repeated identifiers.
                 added.children = arrayOf<Patch>({copy});
             }
             return edit.addPatch(id, added, position) == model.addPatch(id, added, position);

@@ -1,4 +1,4 @@
-// tests/support/graph_model.h: the queries over graphs once more, by looking everywhere.
+// tests/support/graph_model.h: a model of the queries that searches everything.
 
 #ifndef TARN_TESTS_SUPPORT_GRAPH_MODEL_H
 #define TARN_TESTS_SUPPORT_GRAPH_MODEL_H
@@ -12,7 +12,7 @@
 
 namespace tests {
 
-// All patches of the tree in the order in which a search looks at them, by an explicit stack.
+// All patches of the tree in search order, by an explicit stack.
 template <class AnyPatch>
 std::vector<AnyPatch const*> searchOrder(AnyPatch const& root) {
     std::vector<AnyPatch const*> order{&root};
@@ -28,7 +28,7 @@ std::vector<AnyPatch const*> searchOrder(AnyPatch const& root) {
     return order;
 }
 
-// The patch whose children hold the very object, by looking everywhere.
+// The patch whose children contain the object itself.
 template <class AnyPatch>
 AnyPatch const* modelParent(AnyPatch const& root, AnyPatch const* wanted) {
     for (AnyPatch const* candidate : searchOrder(root)) {
@@ -72,7 +72,7 @@ AnyPatch const* modelFind(AnyPatch const& root, unsigned long long id) {
     return nullptr;
 }
 
-// The parents that a search for an output port enters, in order: depth first.
+// The parents in the order in which a search for an output port visits them: depth first.
 inline std::vector<Patch const*> depthFirst(Patch const& root) {
     std::vector<Patch const*> order;
     std::vector<Patch const*> stack{&root};

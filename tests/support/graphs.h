@@ -1,4 +1,4 @@
-// tests/support/graphs.h: graphs in few words, and random ones.
+// tests/support/graphs.h: short constructors for graphs, and random graphs.
 
 #ifndef TARN_TESTS_SUPPORT_GRAPHS_H
 #define TARN_TESTS_SUPPORT_GRAPHS_H
@@ -46,7 +46,7 @@ inline Patch withPorts(Patch base, std::vector<Port> inputs, std::vector<Port> o
     return base;
 }
 
-// Three levels, with everything that the debug text shows.
+// Three levels, with everything that the debug output prints.
 inline Patch sampleDocument() {
     Port number = port(11, 1);
     number.name = "";
@@ -70,8 +70,8 @@ inline Patch sampleDocument() {
     return root;
 }
 
-// A random tree with few identifiers, so that they occur often and in many places. `Source` gives
-// numbers below one that is named, as `Random` does.
+// A random tree with few identifiers, so that they repeat often. `Source` returns numbers below a
+// bound, as `Random` does.
 template <class Source>
 Patch randomPatch(Source& random, int depth) {
     auto const ports = [&] {

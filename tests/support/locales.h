@@ -1,4 +1,4 @@
-// tests/support/locales.h: decimal points other than the usual one, and back again.
+// tests/support/locales.h: sets other decimal points, and restores the usual one.
 
 #ifndef TARN_TESTS_SUPPORT_LOCALES_H
 #define TARN_TESTS_SUPPORT_LOCALES_H
@@ -40,7 +40,7 @@ public:
     CLocaleWithComma(CLocaleWithComma const&) = delete;
     CLocaleWithComma& operator=(CLocaleWithComma const&) = delete;
 
-    /// The tests' build makes the locale where the system has none of its own.
+    /// The build of the tests generates the locale where the system has none.
     bool isSet() const { return set; }
 
 private:

@@ -1,4 +1,4 @@
-// tests/support/number_text.h: the text of a number, worked out in decimal digits by hand.
+// tests/support/number_text.h: formats numbers with exact decimal arithmetic.
 //
 //     modelNumberText(2.5, '.', '.');  // "2.5"
 
@@ -10,9 +10,9 @@
 
 namespace tests {
 
-/// `formatted` is the decimal point that the number is written with, `trimmed` the one that
-/// trailing zeros are looked for behind. Rounds as `roundingMode` says, to the nearest
-/// with ties to even.
+/// `formatted` is the decimal point in the formatted number, `trimmed` the one after which trailing
+/// zeros are removed. Rounds according to `roundingMode`, by default to the nearest with ties to
+/// even.
 std::string modelNumberText(double number, char formatted, char trimmed,
                             int roundingMode = FE_TONEAREST);
 

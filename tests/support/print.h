@@ -1,6 +1,7 @@
-// tests/support/print.h: what a failing test shows: types, values, data and paths, each exactly.
+// tests/support/print.h: prints types, values, data and paths exactly in failing tests.
 //
-// Found by GoogleTest wherever it is included. A value shows its type: 1 and 1.0 differ.
+// GoogleTest finds these functions wherever this is included. A value is printed with its type: 1
+// and 1.0 differ.
 
 #ifndef TARN_TESTS_SUPPORT_PRINT_H
 #define TARN_TESTS_SUPPORT_PRINT_H
@@ -19,7 +20,7 @@
 
 namespace tests {
 
-/// As many digits as tell the number from every other one, and always with a point or an exponent.
+/// As many digits as needed to be exact, always with a point or an exponent.
 inline std::string exactly(double number) {
     char text[32];
     for (int digits = 1; digits <= 17; ++digits) {
@@ -80,7 +81,7 @@ inline void PrintTo(Unstructured const& data, std::ostream* stream) {
 
 namespace tests {
 
-/// Writes the content of a value.
+/// Prints the content of a value.
 struct ContentPrinter {
     std::ostream* stream;
 

@@ -34,8 +34,7 @@ public:
 
     bool chance() { return below(2) == 0; }
 
-    /// Of any magnitude, sign and kind: ties of the number text, round numbers, whatever the bits
-    /// say.
+    /// Any magnitude, sign and kind: ties in formatting, round numbers, random bits.
     double anyDouble() {
         switch (below(6)) {
             case 0: return fromBits(word());
@@ -56,7 +55,7 @@ public:
         }
     }
 
-    /// A moderate number, and never a NaN.
+    /// A number of moderate size, never a NaN.
     double number() {
         return static_cast<double>(static_cast<std::int64_t>(below(20001)) - 10000) / 16.0;
     }

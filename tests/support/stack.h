@@ -23,9 +23,9 @@
 
 namespace tests {
 
-/// Runs `work` on a thread with so many bytes of stack.
+/// Runs `work` on a thread with this many bytes of stack.
 #if defined(__EMSCRIPTEN__)
-/// Without threads: on the program's own, whose size the linker was told.
+/// Without threads: on the program's stack, whose size is set when linking.
 inline void onStackOf(std::size_t, std::function<void()> work) { work(); }
 #else
 inline void onStackOf(std::size_t bytes, std::function<void()> work) {
@@ -43,10 +43,9 @@ inline void onStackOf(std::size_t bytes, std::function<void()> work) {
 }
 #endif
 
-/// How deep graphs and layers may nest, and on how much stack. AddressSanitizer lays guards around
-/// every variable and needs a multiple of it; ThreadSanitizer knows 65,536 calls within one
-/// another. A browser's engine has a stack of its own, of about 1 MiB, which no option of ours
-/// moves.
+/// How deep graphs and layers may nest, and the stack for it. AddressSanitizer puts red zones
+/// around variables and needs a multiple of it. ThreadSanitizer supports 65,536 nested calls. A
+/// browser's engine has its own stack of about 1 MiB, which cannot be changed.
 #if defined(__EMSCRIPTEN__)
 constexpr std::size_t kDeepest = 1000;
 constexpr std::size_t kStack = 8 * 1024 * 1024;

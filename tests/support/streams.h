@@ -1,4 +1,4 @@
-// tests/support/streams.h: what is written to streams, and how.
+// tests/support/streams.h: output to streams, and its details.
 
 #ifndef TARN_TESTS_SUPPORT_STREAMS_H
 #define TARN_TESTS_SUPPORT_STREAMS_H
@@ -10,7 +10,7 @@
 
 namespace tests {
 
-/// What `what` is on a stream.
+/// The output of `what`.
 template <class T>
 std::string written(T const& what) {
     std::ostringstream stream;
@@ -27,7 +27,7 @@ struct FlushCounter : std::stringbuf {
     }
 };
 
-/// A locale in which a stream's newline is "|".
+/// A locale whose newline is "|".
 inline std::locale barForNewline() {
     struct Widening : std::ctype<char> {
         char do_widen(char c) const override { return c == '\n' ? '|' : c; }

@@ -1,4 +1,4 @@
-// tests/support/types.h: all types of values, and one that is none.
+// tests/support/types.h: all types of values, and an undefined one.
 
 #ifndef TARN_TESTS_SUPPORT_TYPES_H
 #define TARN_TESTS_SUPPORT_TYPES_H

@@ -1,4 +1,4 @@
-// Values, data and ports: the readings of the table that C++ and Python read too, and what is not a value.
+// Values, unstructured data and ports: the table of conversions shared with C++ and Python, and invalid values.
 
 import assert from "node:assert/strict";
 import { readFileSync } from "node:fs";
@@ -13,39 +13,39 @@ function bits(numbers) {
   return [...new BigUint64Array(Float64Array.from(numbers).buffer)];
 }
 
-// How each reading of the table is read.
-const readings = {
+// Compares a conversion of the table.
+const conversions = {
   integer: (value, expected) => assert.equal(value.integer, expected.asInteger()),
   number: (value, expected) => {
     assert.deepEqual(bits([value.number]), bits([expected.asFloat()]));
     assert.deepEqual(bits([Number(value)]), bits([expected.asFloat()]));
   },
-  truth: (value, expected) => assert.equal(value.boolean, expected.asInteger() === 1n),
+  boolean: (value, expected) => assert.equal(value.boolean, expected.asInteger() === 1n),
   identifier: (value, expected) => assert.equal(value.id, expected.asId()),
   vec2: (value, expected) => assert.deepEqual(bits(value.vec2), bits(expected.toJS())),
   vec3: (value, expected) => assert.deepEqual(bits(value.vec3), bits(expected.toJS())),
   vec4: (value, expected) => assert.deepEqual(bits(value.vec4), bits(expected.toJS())),
   string: (value, expected) => assert.equal(value.string, expected.asString()),
-  text: (value, expected) => {
+  to_string: (value, expected) => {
     assert.equal(value.toString(), expected.asString());
     assert.equal(`${value}`, expected.asString());
   },
 };
 
-test("values read as the table says", () => {
-  const root = engine.readDocument(readFileSync(new URL("readings.json", tables)));
+test("conversions match the table", () => {
+  const root = engine.readDocument(readFileSync(new URL("conversions.json", tables)));
   let compared = 0;
   for (const row of root.inputs) {
     assert.equal(row.defaultValue.type, row.typeInfo.type, row.name);
-    for (const reading of Object.keys(row.attributes.toJS())) {
-      readings[reading](row.defaultValue, row.attributes.find(reading));
+    for (const target of Object.keys(row.attributes.toJS())) {
+      conversions[target](row.defaultValue, row.attributes.find(target));
       ++compared;
     }
   }
   assert.equal(compared, 434);
 });
 
-test("values are made of what JavaScript has", () => {
+test("values are constructed from JavaScript's values", () => {
   for (const [content, type, text] of [
     [undefined, Type.Float, "0"], [2.5, Type.Float, "2.5"], [-0, Type.Float, "0"], [NaN, Type.Float, "nan"],
     [true, Type.Boolean, "1"], ["text", Type.String, "text"], ["", Type.String, ""], [7n, Type.Int, "7"],

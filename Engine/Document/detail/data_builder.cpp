@@ -47,7 +47,7 @@ bool DataBuilder::closeMap(std::size_t firstValue, std::size_t firstKey) {
         Unstructured& value = values[firstValue + i - firstKey];
         auto const entry = map.emplace_hint(map.end(), std::move(keys[i]), Unstructured());
         if (map.size() == before && strictness == Strictness::Own) {
-            problem = "the key \"" + printable(entry->first) + "\" is there twice";
+            problem = "the key \"" + printable(entry->first) + "\" is repeated";
             return false;
         }
         entry->second = std::move(value);
@@ -69,7 +69,7 @@ bool DataBuilder::decodeKeys(std::size_t firstKey) {
         if (name.empty() || name[0] != '$') continue;
         if (name.size() < 2 || name[1] != '$') {
             problem = "the key \"" + printable(name) +
-                      "\" has no meaning; one that begins with $ is "
+                      "\" is unknown; a key that begins with $ is "
                       "written with $$";
             return false;
         }

@@ -88,8 +88,8 @@ bool GraphReader::onOpen(bool isObject) {
         case Place::Node: return openInNode(isObject);
         case Place::Links: return capture(isObject);
         case Place::Port:
-            if (key == "name") return refuseType("a text", emptyContainer(isObject));
-            if (key == "type" && isObject) return refuse("expected a text, a number or a list");
+            if (key == "name") return refuseType("a string", emptyContainer(isObject));
+            if (key == "type" && isObject) return refuse("expected a string, a number or a list");
             return capture(isObject);
         case Place::Definitions:
             if (key == "subgraphs" && !isObject) return push(Place::DefinitionList);
@@ -127,7 +127,8 @@ bool GraphReader::openInGraph(bool isObject) {
         openDefinitionPorts = key == "inputs" ? &definition.inputs : &definition.outputs;
         return push(Place::Ports);
     }
-    if (level.isDefinition && key == "name") return refuseType("a text", emptyContainer(isObject));
+    if (level.isDefinition && key == "name")
+        return refuseType("a string", emptyContainer(isObject));
     if (levels.size() == 1 && key == "definitions" && isObject) return push(Place::Definitions);
     return capture(isObject);
 }
@@ -194,7 +195,7 @@ bool GraphReader::setGraphMember(Unstructured& data) {
             return true;
         }
         if (key == "name") {
-            if (!data.isString()) return data.isNull() || refuseType("a text", data);
+            if (!data.isString()) return data.isNull() || refuseType("a string", data);
             definition.title = *data.ifString();
             return true;
         }
@@ -223,13 +224,13 @@ bool GraphReader::setNodeMember(Unstructured& data) {
         return true;
     }
     if (key == "type") {
-        if (!data.isString()) return refuseType("a text", data);
+        if (!data.isString()) return refuseType("a string", data);
         level.hasType = true;
         node.type = *data.ifString();
         return true;
     }
     if (key == "title") {
-        if (!data.isString()) return data.isNull() || refuseType("a text", data);
+        if (!data.isString()) return data.isNull() || refuseType("a string", data);
         node.attributes[key] = std::move(data);
         return true;
     }
@@ -244,7 +245,7 @@ bool GraphReader::setPortMember(Unstructured& data) {
     Port& port = openPorts != nullptr ? openPorts->back() : openDefinitionPorts->back();
     std::string const& key = levels.back().key;
     if (key == "name") {
-        if (!data.isString()) return data.isNull() || refuseType("a text", data);
+        if (!data.isString()) return data.isNull() || refuseType("a string", data);
         port.name = *data.ifString();
         return true;
     }
@@ -264,7 +265,7 @@ bool GraphReader::setName(NodeName& name, Unstructured const& data, std::string 
         name.text = std::make_shared<std::string const>(data.toText());
         return true;
     }
-    if (!data.isString()) return refuseType("a number or a text", data, step);
+    if (!data.isString()) return refuseType("a number or a string", data, step);
     // Editors write the number of a node as a number or a string.
     if (Optional<long long> const number = integerOfText(*data.ifString())) {
         name.number = *number;

@@ -87,7 +87,7 @@ public:
 private:
     bool isNew(std::unordered_set<Id>& used, Id id, char const* what, std::string const& step) {
         if (id == 0) {
-            fault.message = "the identifier 0 stands for nothing; identifiers start at 1";
+            fault.message = "identifier 0 is reserved; identifiers start at 1";
         } else if (!used.insert(id).second) {
             fault.message =
                 "the " + std::string(what) + " identifier " + std::to_string(id) + " is used twice";

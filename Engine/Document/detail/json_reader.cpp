@@ -11,7 +11,7 @@ namespace tarn::engine::detail {
 namespace {
 
 constexpr std::string_view kSpace = " \t\r\n";
-constexpr char kWrongEscape[] = "U+001A stands before two hexadecimal digits";
+constexpr char kWrongEscape[] = "U+001A must be followed by two hexadecimal digits";
 
 void setPlace(std::string_view text, std::size_t offset, DocumentError& error) {
     std::string_view const before = text.substr(0, offset);
@@ -234,7 +234,7 @@ bool JsonReader::parse_error(std::size_t position, std::string const&,
         }
     } else {
         fault.message =
-            offset >= input.size() ? "the JSON ends too early" : "this is not valid JSON";
+            offset >= input.size() ? "the JSON is incomplete" : "this is not valid JSON";
     }
     setPlace(input, std::min(offset, input.size()), fault);
     return false;

@@ -177,7 +177,7 @@ char const* OwnReader::wantedFor(Key key) {
         case Key::Extra:
         case Key::ExtraType: break;
     }
-    return "a text";
+    return "a string";
 }
 
 bool OwnReader::refuseType(Unstructured const& found) {
@@ -220,7 +220,7 @@ bool OwnReader::onKey(std::string& key) {
         if ((known >> i & 1u) == 0 || kKeyNames[i] != key) continue;
         level.key = Key(i);
         if (has(level.key)) {
-            std::string problem = "the key \"" + key + "\" is there twice";
+            std::string problem = "the key \"" + key + "\" is repeated";
             if (level.place != Place::Document || key == "root") return refuse(std::move(problem));
             defer(std::move(problem));
         }
@@ -356,8 +356,8 @@ void OwnReader::setDocumentField(Scalar const& scalar) {
             isOfType = !scalar.isBoolean && isNumberOf(data, version);
             if (isOfType && version != kVersion) {
                 defer("version " + std::to_string(version) +
-                      " of the form; the only one that is "
-                      "known is " +
+                      " of the format is not supported; "
+                      "the latest is " +
                       std::to_string(kVersion));
             }
             break;
@@ -656,7 +656,7 @@ bool OwnReader::setValue(Optional<Value>& value, Pending const& pending, Type us
     }
     bool const isNullData = isNull && pending.isGiven && pending.type == Type::Unstructured;
     if (pending.isNullPayload || (isNull && !isNullData && pending.type)) {
-        return refuseAt(place() + "Type", "it does not go with the value");
+        return refuseAt(place() + "Type", "it does not match the value");
     }
     if (isNull && !isNullData) return true;
     ValueFault wrong;

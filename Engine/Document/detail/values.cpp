@@ -117,7 +117,7 @@ std::size_t pointsOf(PathInstruction instruction) {
 // ["lineTo", 1, 2]
 bool toUsualElement(Unstructured const& data, PathElement& element, ValueFault& fault) {
     if (data.empty()) {
-        fault.problem = "a path element begins with its name";
+        fault.problem = "a path element starts with its name";
         return false;
     }
     Unstructured const& name = *data.find(0);
@@ -252,7 +252,7 @@ bool toValue(Scalar const& content, Type type, Value& value, ValueFault& fault) 
         case Type::Model: return toResource(data, type, value, fault);
         case Type::Path: return toPath(data, value, fault);
         case Type::String:
-            if (!data.isString()) return isWrong(fault, "a text", data);
+            if (!data.isString()) return isWrong(fault, "a string", data);
             value = *data.ifString();
             return true;
         case Type::Boolean:

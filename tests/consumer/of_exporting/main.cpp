@@ -1,4 +1,4 @@
-// A program that uses a library that uses this one.
+// A program that links to a library that links to this one.
 
 #include <rings.h>
 

@@ -1,4 +1,4 @@
-"""What values convert to: the table that the C++ tests read too."""
+"""Conversions of values, by the table that the C++ tests use too."""
 
 import math
 import struct
@@ -8,7 +8,7 @@ import pytest
 
 import tarn_engine_base as tarn
 
-TABLE = Path(__file__).parents[2] / "tests" / "tables" / "readings.json"
+TABLE = Path(__file__).parents[2] / "tests" / "tables" / "conversions.json"
 
 
 def bits(number: float) -> bytes:
@@ -20,7 +20,7 @@ def rows() -> list[tarn.Port]:
 
 
 @pytest.mark.parametrize("row", rows(), ids=lambda row: row.name)
-def test_reads_as(row: tarn.Port) -> None:
+def test_converts_to(row: tarn.Port) -> None:
     value = row.default_value
     expected = row.attributes
     assert expected.keys()
@@ -30,13 +30,13 @@ def test_reads_as(row: tarn.Port) -> None:
         elif key == "number":
             assert bits(float(value)) == bits(expected[key])
             assert type(float(value)) is float
-        elif key == "truth":
+        elif key == "boolean":
             assert bool(value) is bool(expected[key])
         elif key == "identifier":
             assert value.id == expected[key]
         elif key in ("vec2", "vec3", "vec4"):
             assert [bits(n) for n in getattr(value, key)] == [bits(n) for n in expected[key]]
-        elif key == "text":
+        elif key == "to_string":
             assert str(value) == expected[key]
         else:
             assert key == "string"
@@ -47,7 +47,7 @@ def test_the_table_has_rows_of_every_type() -> None:
     assert {row.default_value.type for row in rows()} == set(tarn.Type)
 
 
-def test_a_nan_reads_as_one() -> None:
+def test_a_nan_converts_to_zero_and_true() -> None:
     value = tarn.Value(math.nan)
     assert math.isnan(float(value))
     assert int(value) == 0

@@ -17,7 +17,7 @@
 using namespace tarn::engine;
 using namespace tests;
 
-TEST(GraphText, OfPortsAndConnections) {
+TEST(GraphOutput, PrintsPortsAndConnections) {
     Port p = port(12, 34);
     p.typeInfo.type = Type::Vec2;
     p.defaultValue = FloatVec2{1, 2.5};
@@ -31,7 +31,7 @@ TEST(GraphText, OfPortsAndConnections) {
               "[connection:ff->10][:c tag: 22 typeInfo: [type: vec2] defaultValue: 1, 2.5]");
 }
 
-TEST(GraphText, OfPatches) {
+TEST(GraphOutput, PrintsPatches) {
     std::string const in = "[p11:11 tag: 0 typeInfo: [type: float] defaultValue: 0]";
     std::string const out = "[p12:12 tag: 0 typeInfo: [type: float] defaultValue: 0]";
     struct Row {
@@ -61,7 +61,7 @@ TEST(GraphText, OfPatches) {
     }
 }
 
-TEST(GraphText, FollowsTheStreamsFlagsAndItsNewline) {
+TEST(GraphOutput, FollowsStreamFlagsAndNewline) {
     Patch source = withPorts(patch(255), {port(16)}, {});
     source.builtin = 17;
     std::ostringstream stream;
@@ -71,14 +71,14 @@ TEST(GraphText, FollowsTheStreamsFlagsAndItsNewline) {
                             "float] defaultValue: 0]|");
 }
 
-TEST(GraphText, OfADocumentIsItsGoldenText) {
+TEST(GraphOutput, MatchesTheGoldenFile) {
     std::ifstream file(TARN_TESTS_GOLDEN_DIR "/document.txt", std::ios::binary);
     ASSERT_TRUE(file);
     std::string const golden((std::istreambuf_iterator<char>(file)), {});
     EXPECT_EQ(written(sampleDocument()), golden);
 }
 
-TEST(GraphText, FlushesEveryLine) {
+TEST(GraphOutput, FlushesEveryLine) {
     tests::FlushCounter buffer;
     std::ostream stream(&buffer);
     EXPECT_EQ(&(stream << sampleDocument()), &stream);

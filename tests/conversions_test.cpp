@@ -1,6 +1,6 @@
-// What values convert to, by tables/readings.json: a document whose input ports have the values as
-// defaults and what they read as in their attributes. The tests of other languages read the same
-// file.
+// Compares conversions with tables/conversions.json, a document: each input port has a value as its
+// default, and its attributes are the expected conversions. The tests of other languages use the
+// same file.
 
 #include <Engine/Base/base.h>
 #include <Engine/Document/document.h>
@@ -25,7 +25,8 @@ namespace {
 Patch const& table() {
     static Patch const root = [] {
         DocumentError error;
-        Optional<Patch> const read = loadDocument(TARN_TESTS_TABLES_DIR "/readings.json", &error);
+        Optional<Patch> const read =
+            loadDocument(TARN_TESTS_TABLES_DIR "/conversions.json", &error);
         EXPECT_TRUE(read) << error;
         return read ? *read : Patch();
     }();
@@ -43,27 +44,27 @@ void compareComponents(Vector const& v, Unstructured const& expected) {
     }
 }
 
-void compare(Value const& value, std::string const& reading, Unstructured const& expected) {
-    if (reading == "integer") {
+void compare(Value const& value, std::string const& target, Unstructured const& expected) {
+    if (target == "integer") {
         EXPECT_EQ(static_cast<long long>(value), expected.asInteger());
         EXPECT_EQ(static_cast<std::int64_t>(value), expected.asInteger());
-    } else if (reading == "number") {
+    } else if (target == "number") {
         EXPECT_EQ(tests::bits(double(value)), tests::bits(expected.asFloat()));
-    } else if (reading == "truth") {
+    } else if (target == "boolean") {
         EXPECT_EQ(bool(value), expected.asInteger() == 1);
-    } else if (reading == "identifier") {
+    } else if (target == "identifier") {
         EXPECT_EQ(static_cast<unsigned long long>(value), expected.asId());
         EXPECT_EQ(static_cast<std::uint64_t>(value), expected.asId());
-    } else if (reading == "vec2") {
+    } else if (target == "vec2") {
         compareComponents(FloatVec2(value), expected);
-    } else if (reading == "vec3") {
+    } else if (target == "vec3") {
         compareComponents(FloatVec3(value), expected);
-    } else if (reading == "vec4") {
+    } else if (target == "vec4") {
         compareComponents(FloatVec4(value), expected);
-    } else if (reading == "string") {
+    } else if (target == "string") {
         EXPECT_EQ(std::string(value), *expected.ifString());
     } else {
-        ASSERT_EQ(reading, "text");
+        ASSERT_EQ(target, "to_string");
         EXPECT_EQ(to_string(value), *expected.ifString());
         std::ostringstream stream;
         stream << "<";
@@ -75,27 +76,27 @@ void compare(Value const& value, std::string const& reading, Unstructured const&
 
 }  // namespace
 
-TEST(Readings, AreThoseOfTheTable) {
+TEST(Conversions, MatchTheTable) {
     std::size_t compared = 0;
     for (Port const& row : *table().inputs) {
         SCOPED_TRACE(row.name);
         EXPECT_EQ(row.defaultValue.type(), row.typeInfo.type);
-        for (auto const& [reading, expected] : row.attributes) {
-            compare(row.defaultValue, reading, expected);
+        for (auto const& [target, expected] : row.attributes) {
+            compare(row.defaultValue, target, expected);
             ++compared;
         }
     }
     EXPECT_EQ(compared, 434u);
 }
 
-TEST(Readings, HaveRowsOfEveryTypeAndReading) {
+TEST(Conversions, HaveRowsForEveryTypeAndTarget) {
     std::set<Type> types;
-    std::set<std::string> readings;
+    std::set<std::string> targets;
     for (Port const& row : *table().inputs) {
         types.insert(row.defaultValue.type());
-        for (auto const& [reading, expected] : row.attributes) readings.insert(reading);
+        for (auto const& [target, expected] : row.attributes) targets.insert(target);
     }
     EXPECT_EQ(types.size(), 14u);
-    EXPECT_EQ(readings, (std::set<std::string>{"identifier", "integer", "number", "string", "text",
-                                               "truth", "vec2", "vec3", "vec4"}));
+    EXPECT_EQ(targets, (std::set<std::string>{"identifier", "integer", "number", "string",
+                                              "to_string", "boolean", "vec2", "vec3", "vec4"}));
 }
