@@ -1,5 +1,5 @@
-// bench/bench.h: operations, done by us and by each of our peers, every one in a process of its
-// own.
+// bench/bench.h: the benchmarked operations, each with the library's implementation and those of
+// other libraries. Every implementation runs in its own process.
 //
 //     operation("copy numbers").ours(on(numbers<Value>, copy)).peer("std::any",
 //     twins).atMost(1.15);
@@ -18,14 +18,14 @@
 
 namespace bench {
 
-/// Runs what is measured as often as asked for, and gives a figure for each time: microseconds, or
-/// what the figure is in.
+/// Runs the measured code and returns a figure for each repetition: microseconds, or another unit
+/// that the figure has.
 using Implementation = std::function<std::vector<double>(int repetitions)>;
 
-/// Times `run`, which gives the seconds that one iteration took, with Google Benchmark.
+/// Times `run`, which returns the seconds of one iteration, with Google Benchmark.
 std::vector<double> timed(int repetitions, std::function<double()> const& run);
 
-/// The seconds that `work(input)` takes. It returns what it made, so that its destruction is not
+/// The seconds that `work(input)` takes. `work` returns its result, so that its destruction is not
 /// timed.
 template <class Work, class Input>
 double secondsOf(Work const& work, Input& input) {
@@ -36,7 +36,7 @@ double secondsOf(Work const& work, Input& input) {
     return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
 }
 
-/// `work` on one input, made before.
+/// `work` on one input, constructed before.
 template <class Make, class Work>
 Implementation on(Make make, Work work) {
     return [=](int repetitions) {
@@ -45,7 +45,7 @@ Implementation on(Make make, Work work) {
     };
 }
 
-/// `work` on an input of its own each time. Making that is not timed.
+/// `work` on a new input each time, whose construction is not timed.
 template <class Make, class Work>
 Implementation onEach(Make make, Work work) {
     return [=](int repetitions) {
@@ -62,15 +62,15 @@ Implementation doing(Work work) {
     return on([] { return 0; }, [work](int) { return work(); });
 }
 
-/// Something that is no time, such as a number of bytes.
-template <class Figure>
-Implementation figure(Figure figure) {
-    return [=](int) { return std::vector<double>{figure()}; };
+/// The number of bytes that `count()` returns.
+template <class Count>
+Implementation bytes(Count count) {
+    return [=](int) { return std::vector<double>{static_cast<double>(count())}; };
 }
 
 /// A row of the table.
 struct Operation {
-    /// Who does it, and how; ours is first.
+    /// The library's name and implementation; ours is first.
     struct Entry {
         std::string who;
         Implementation run;
@@ -78,35 +78,41 @@ struct Operation {
 
     Operation& ours(Implementation run) { return peer("ours", std::move(run)); }
     Operation& peer(std::string who, Implementation run);
-    /// Whom ours is compared with, where that is not the best peer.
+    /// The library to compare with, where it is not the fastest one.
     Operation& against(std::string peerName);
-    /// What ours may cost, as a multiple of the best peer or of the one that is named.
+    /// The target: ours may cost this multiple of the fastest or of the named library.
     Operation& atMost(double multiple, std::string peerName = "");
     /// One of the rows that `--quick` measures.
     Operation& quick();
+    /// The figures are numbers of bytes instead of microseconds.
+    Operation& inBytes();
 
     std::string name;
     std::vector<Entry> entries = {};
     double target = 0.0;
     std::string comparedWith = {};
     bool isQuick = false;
+    bool isInBytes = false;
 };
 
-/// The row of this name, which is made where there is none.
+/// Returns the row with this name; adds it if needed.
 Operation& operation(std::string const& name);
 
-/// Something that is checked before anything is measured: that peers and library agree.
+/// A check before anything is measured: that all libraries agree.
 void agreement(std::function<void()> check);
 
-/// Stops the program where peers and library do not agree on a result.
+/// Ends the program where the libraries' results differ.
 void agree(bool same, char const* what);
 
-/// The bytes of the heap that are in use.
+/// The bytes of the heap in use.
 double heapBytes();
+
+/// Like "100,000".
+std::string grouped(std::size_t number);
 
 // One for each subject.
 void values();
-void texts();
+void toString();
 void data();
 void paths();
 void easing();

@@ -1,5 +1,5 @@
-// bench/boost_json.h: Boost.JSON behind a wall. It comes from a later Boost than ours, and the two
-// must not meet in one translation unit or in one list of symbols.
+// bench/boost_json.h: an opaque wrapper around Boost.JSON. It comes from a later Boost than ours,
+// and the two must not meet in one translation unit or symbol table.
 
 #ifndef TARN_BENCH_BOOST_JSON_H
 #define TARN_BENCH_BOOST_JSON_H
@@ -12,9 +12,9 @@
 
 namespace bench {
 
-/// The documents of documents.h as Boost.JSON holds them.
+/// The documents of documents.h in Boost.JSON.
 struct TARN_BENCH_VISIBLE BoostJson {
-    /// A document, copied and compared by Boost.JSON, in the memory of one of its values.
+    /// A document, copied and compared by Boost.JSON; storage for one of its values.
     class TARN_BENCH_VISIBLE Node {
     public:
         struct Content;

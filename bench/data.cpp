@@ -55,15 +55,17 @@ void forDocument(std::string const& kind, std::string const& who, Make make) {
     using Node = typename Library::Node;
     using Pair = std::pair<Node, Node>;
     bench::operation("build " + kind).peer(who, bench::doing(make));
-    bench::operation("heap bytes of " + kind).peer(who, bench::figure([make] {
-                                                       double const before = bench::heapBytes();
-                                                       Node const node = make();
-                                                       return bench::heapBytes() - before;
-                                                   }));
+    bench::operation("heap memory of " + kind).inBytes().peer(who, bench::bytes([make] {
+                                                                  double const before =
+                                                                      bench::heapBytes();
+                                                                  Node const node = make();
+                                                                  return bench::heapBytes() -
+                                                                         before;
+                                                              }));
     bench::operation("copy " + kind).peer(who, bench::on(make, [](Node const& node) {
                                               return Node(node);
                                           }));
-    // Each copy gets the blocks that the one before has left.
+    // Each copy reuses the memory that the previous one freed.
     bench::operation("copy and destroy " + kind).peer(who, bench::on(make, [](Node const& node) {
                                                           Node copy = node;
                                                           benchmark::DoNotOptimize(copy);
@@ -95,7 +97,7 @@ double readObjects(typename Library::Node const& node) {
     return sum;
 }
 
-// RapidJSON's values need its allocator, so they have their own short form, for the record.
+// RapidJSON's values need an allocator, so they have their own short form, for reference only.
 void rapid() {
     using Document = rapidjson::Document;
     auto const make = [] {
@@ -145,9 +147,9 @@ void bench::data() {
     rapid();
     agreement([] {
         agree(readObjects<Ours>(objects<Ours>()) == readObjects<Nlohmann>(objects<Nlohmann>()),
-              "readings of documents");
+              "lookups in documents");
     });
-    operation("read objects, three levels down")
+    operation("look up in objects, three levels deep")
         .ours(on(objects<Ours>, readObjects<Ours>))
         .peer("nlohmann", on(objects<Nlohmann>, readObjects<Nlohmann>))
         .quick();
@@ -158,7 +160,7 @@ void bench::data() {
         operation("copy and destroy " + kind).atMost(flat ? 0.6 : 1.0, "nlohmann");
         operation("== of " + kind).atMost(1.15, "nlohmann");
         operation("destroy " + kind).atMost(1.0, "nlohmann");
-        operation("heap bytes of " + kind).atMost(1.05, "nlohmann");
+        operation("heap memory of " + kind).atMost(1.05, "nlohmann");
     }
     operation("copy and destroy a catalogue").quick();
     operation("copy and destroy objects").quick();

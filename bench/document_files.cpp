@@ -14,7 +14,7 @@ namespace {
 
 constexpr std::size_t kPatches = 100000;
 
-// One repetition for each process: what the first one leaves in the heap is no part of the next.
+// One repetition for each process: what it leaves in the heap must not affect the next.
 template <class Make, class Work>
 bench::Implementation once(Make make, Work work) {
     return [=](int) {

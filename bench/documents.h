@@ -1,4 +1,4 @@
-// bench/documents.h: the documents that JSON libraries are measured with, built leaves first.
+// bench/documents.h: the documents for benchmarks of JSON libraries, built leaves first.
 
 #ifndef TARN_BENCH_DOCUMENTS_H
 #define TARN_BENCH_DOCUMENTS_H
@@ -8,7 +8,7 @@
 
 namespace bench {
 
-/// What a document is built with, for a library whose maps and lists move into its nodes.
+/// The types to build a document with, for libraries whose maps and lists move into nodes.
 template <class NodeType, class MapType, class ListType>
 struct ByMove {
     using Node = NodeType;

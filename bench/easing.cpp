@@ -25,7 +25,7 @@ constexpr std::array<EF, 4> kPolynomials{EF::Linear, EF::QuadraticIn, EF::Quadra
                                          EF::QuadraticInOut};
 constexpr std::array<EF, 3> kCubics{EF::CubicIn, EF::CubicOut, EF::CubicInOut};
 
-// The formulas with the C library, in the caller's own code: as fast as they can be.
+// The formulas inlined into the caller's code: the fastest possible.
 inline double inlined(EF f, double a, double b, double t) {
     double const d = b - a;
     double const u = 2 * t;
@@ -60,7 +60,7 @@ inline double inlined(EF f, double a, double b, double t) {
 }
 
 inline FloatVec4 inlined(EF f, FloatVec4 a, FloatVec4 b, double t) {
-    // The factor once, from the curve from 0 to 1.
+    // Computes the factor once, from the curve from 0 to 1.
     double const x = inlined(f, 0.0, 1.0, t);
     return {a.x + x * (b.x - a.x), a.y + x * (b.y - a.y), a.z + x * (b.z - a.z),
             a.w + x * (b.w - a.w)};
@@ -86,7 +86,7 @@ bench::Implementation over(Curves const& curves, Ease ease) {
     });
 }
 
-// Many progress values along the curves, in one call for each of them or one by one.
+// Evaluates the curves at many points, in one call for each curve or point by point.
 template <class T, class Curves>
 void inOneCall(std::string const& name, Curves const& curves, T a, T b, double atMost) {
     auto const oneByOne = [&curves, a, b](std::vector<double> const& list) {

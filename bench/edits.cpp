@@ -20,8 +20,8 @@ constexpr std::size_t kPatches = 100000;
 constexpr std::size_t kMany = 1000000;
 constexpr std::size_t kGroup = 100;
 
-// The root with another default value of the input of the patch `id`, or of the next one where that
-// is a group.
+// The root with another default value of the input of the patch `id`, or of the next patch where
+// that is a group.
 Patch edited(PatchIndex const& index, unsigned long long id, double value) {
     PatchEdit edit(index);
     Port* const input = edit.inputPort(id * 2);
@@ -29,7 +29,7 @@ Patch edited(PatchIndex const& index, unsigned long long id, double value) {
     return edit.commit();
 }
 
-// A document, one that shares nothing with it, and one that differs by an edit deep inside.
+// A document, a copy that shares nothing, and one that differs by an edit deep inside.
 struct Document {
     Document(std::size_t patches, std::size_t groupSize)
         : place(patches / 2 + 7),
@@ -77,7 +77,7 @@ bench::Implementation onDocument(std::size_t patches, std::size_t groupSize, Wor
                      [work](std::unique_ptr<Document> const& document) { return work(*document); });
 }
 
-// Beside building the index, which is what an edit cost before.
+// Compared with building an index, which an edit cost before.
 template <class Work>
 void besideAnIndex(std::string const& name, std::size_t groupSize, double atMost, Work work) {
     bench::operation(name + ", 100,000 patches " +
@@ -87,7 +87,7 @@ void besideAnIndex(std::string const& name, std::size_t groupSize, double atMost
         .atMost(atMost);
 }
 
-// A document of ten times the size, beside ten times the work on the smaller one.
+// A document of ten times the size, compared with ten times the work on the smaller one.
 template <class Work>
 void ofMany(std::string const& name, Work work) {
     bench::operation(name + ", 1,000,000 patches in groups")
@@ -104,24 +104,28 @@ void ofMany(std::string const& name, Work work) {
 
 void memory() {
     for (std::size_t const patches : {kPatches, kMany}) {
-        bench::operation("bytes a patch, " + std::to_string(patches) + " patches with two ports")
-            .ours(bench::figure([patches] {
+        bench::operation("memory of a patch with two ports, " + bench::grouped(patches) +
+                         " patches")
+            .inBytes()
+            .ours(bench::bytes([patches] {
                 double const before = bench::heapBytes();
                 Patch const root = bench::documentOf(patches, kGroup);
                 return (bench::heapBytes() - before) / static_cast<double>(patches);
             }));
     }
-    bench::operation("bytes of an undo step, 100,000 patches in groups").ours(bench::figure([] {
-        PatchIndex index(bench::documentOf(kPatches, kGroup));
-        std::vector<Patch> history;
-        history.reserve(1001);
-        double const before = bench::heapBytes();
-        for (unsigned long long i = 0; i < 1000; ++i) {
-            history.push_back(index.root());
-            index.update(edited(index, i * 97 + 7, 0.5));
-        }
-        return (bench::heapBytes() - before) / 1000;
-    }));
+    bench::operation("memory of an undo step, 100,000 patches in groups")
+        .inBytes()
+        .ours(bench::bytes([] {
+            PatchIndex index(bench::documentOf(kPatches, kGroup));
+            std::vector<Patch> history;
+            history.reserve(1001);
+            double const before = bench::heapBytes();
+            for (unsigned long long i = 0; i < 1000; ++i) {
+                history.push_back(index.root());
+                index.update(edited(index, i * 97 + 7, 0.5));
+            }
+            return (bench::heapBytes() - before) / 1000;
+        }));
 }
 
 }  // namespace
@@ -129,16 +133,16 @@ void memory() {
 void bench::edits() {
     for (std::size_t const groupSize : {kGroup, kPatches}) {
         bool const isFlat = groupSize == kPatches;
-        besideAnIndex("an edit of a port", groupSize, isFlat ? 10.0 : 0.01, edit);
-        besideAnIndex("the update after it", groupSize, isFlat ? 0.1 : 0.02, update);
-        besideAnIndex("what it changed", groupSize, isFlat ? 10.0 : 0.01, changes);
+        besideAnIndex("edit a port", groupSize, isFlat ? 10.0 : 0.01, edit);
+        besideAnIndex("update the index after the edit", groupSize, isFlat ? 0.1 : 0.02, update);
+        besideAnIndex("patchChanges of the edit", groupSize, isFlat ? 10.0 : 0.01, changes);
     }
     ofMany("build an index", build);
     ofMany("== unshared", compare);
     ofMany("convert for evaluation", convert);
-    ofMany("debug text", text);
-    ofMany("an edit of a port", edit);
-    ofMany("the update after it", update);
-    ofMany("what it changed", changes);
+    ofMany("debug output", text);
+    ofMany("edit a port", edit);
+    ofMany("update the index after the edit", update);
+    ofMany("patchChanges of the edit", changes);
     memory();
 }

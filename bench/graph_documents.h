@@ -1,4 +1,4 @@
-// bench/graph_documents.h: the documents of patches that are measured.
+// bench/graph_documents.h: the graphs for benchmarks.
 
 #ifndef TARN_BENCH_GRAPH_DOCUMENTS_H
 #define TARN_BENCH_GRAPH_DOCUMENTS_H
@@ -12,8 +12,8 @@
 
 namespace bench {
 
-/// Patches with an input, an output and a position, each connected with the one before, in groups
-/// of so many. Identifiers are counted up from that of the root, 1.
+/// Patches with an input, an output and a position, each connected to the previous one, in groups
+/// of this size. Identifiers are consecutive; the root has 1.
 inline tarn::engine::Patch documentOf(std::size_t patches, std::size_t groupSize) {
     using namespace tarn::engine;
     Patch root;

@@ -26,7 +26,7 @@ Port port(unsigned long long id, unsigned long long tag) {
     return result;
 }
 
-// A tree in which every patch but the leaves has ten children, each with an input, an output and a
+// A tree in which every inner patch has ten children, each with an input, an output and a
 // connection to the next.
 Patch tree(std::size_t size, unsigned long long& next) {
     Patch patch;
@@ -57,7 +57,7 @@ Patch tree(std::size_t size) {
     return tree(size, next);
 }
 
-// The same data in flat arrays, as nobody shares or nests them.
+// The same data in flat arrays, without sharing or nesting.
 struct Flat {
     struct Item {
         unsigned long long id;
@@ -138,7 +138,7 @@ Flat flatOf(Patch const& root) {
     return flat;
 }
 
-// An index as one would write it, with the same answers.
+// A straightforward index with the same results.
 struct Maps {
     using Id = unsigned long long;
     std::unordered_map<Id, std::pair<Patch const*, Patch const*>> patches;
@@ -169,7 +169,7 @@ Maps mapsOf(Patch const& root) {
     return maps;
 }
 
-// A graph and the flat form of it are the inputs of what is measured.
+// The inputs of the measurements: a graph and its flat form.
 struct Inputs {
     explicit Inputs(std::size_t patches) : size(patches) {}
 
@@ -182,7 +182,7 @@ struct Inputs {
         return bench::on([size = size] { return flatOf(tree(size)); }, work);
     }
     bench::Operation& operation(std::string const& name) const {
-        return bench::operation(name + ", " + std::to_string(size) + " patches");
+        return bench::operation(name + ", " + bench::grouped(size) + " patches");
     }
 
     std::size_t size;
@@ -205,7 +205,7 @@ void wholeGraphs(Inputs const& in) {
     in.operation("convert for evaluation")
         .ours(in.graph([](Patch const& root) { return EvalPatch(root); }))
         .peer("flat arrays", in.flat([](Flat const& flat) { return flat; }));
-    in.operation("debug text")
+    in.operation("debug output")
         .ours(in.graph([](Patch const& root) {
             NullBuffer buffer;
             std::ostream stream(&buffer);
@@ -218,13 +218,14 @@ void wholeGraphs(Inputs const& in) {
             flatText(flat, stream);
             return stream.good();
         }));
-    in.operation("bytes")
-        .ours(bench::figure([size] {
+    in.operation("memory")
+        .inBytes()
+        .ours(bench::bytes([size] {
             double const before = bench::heapBytes();
             Patch const root = tree(size);
             return bench::heapBytes() - before;
         }))
-        .peer("flat arrays", bench::figure([size] {
+        .peer("flat arrays", bench::bytes([size] {
                   Patch const root = tree(size);
                   Flat const flat = flatOf(root);
                   double const before = bench::heapBytes();
@@ -233,9 +234,9 @@ void wholeGraphs(Inputs const& in) {
               }));
 }
 
-void walks(Inputs const& in) {
+void queries(Inputs const& in) {
     std::size_t const size = in.size;
-    in.operation("walk to the last patch")
+    in.operation("findPatchRecursive, last patch")
         .ours(in.graph([size](Patch const& root) { return findPatchRecursive(root, size); }))
         .peer("flat arrays", in.flat([size](Flat const& flat) {
             for (auto const& item : flat.patches) {
@@ -244,7 +245,7 @@ void walks(Inputs const& in) {
             return static_cast<Flat::Item const*>(nullptr);
         }));
     unsigned long long const port = (size - 1) * 2 + 1;
-    in.operation("outgoing connections of a deep port")
+    in.operation("findOutgoingConnectionsFromPort, deep port")
         .ours(in.graph(
             [port](Patch const& root) { return findOutgoingConnectionsFromPort(root, port); }))
         .peer("flat arrays", in.flat([port](Flat const& flat) {
@@ -260,7 +261,7 @@ void indexes(Inputs const& in) {
     std::size_t const size = in.size;
     std::string const maps = "std::unordered_map";
     auto const bytes = [size](auto build) {
-        return bench::figure([size, build] {
+        return bench::bytes([size, build] {
             Patch const root = tree(size);
             double const before = bench::heapBytes();
             auto const index = build(root);
@@ -269,8 +270,12 @@ void indexes(Inputs const& in) {
     };
     auto const build = [](Patch const& root) { return PatchIndex(root); };
     in.operation("build an index").ours(in.graph(build)).peer(maps, in.graph(mapsOf)).atMost(0.5);
-    in.operation("bytes of an index").ours(bytes(build)).peer(maps, bytes(mapsOf)).atMost(0.6);
-    // Identifiers all over the tree.
+    in.operation("memory of an index")
+        .inBytes()
+        .ours(bytes(build))
+        .peer(maps, bytes(mapsOf))
+        .atMost(0.6);
+    // Looks up identifiers spread over the tree.
     auto const lookups = [size](auto const& make, auto const& lookUp) {
         return bench::on(
             [size, make] {
@@ -311,16 +316,16 @@ void bench::graphs() {
     for (std::size_t const size : {1000u, 10000u, 100000u}) {
         Inputs const in(size);
         wholeGraphs(in);
-        walks(in);
+        queries(in);
         indexes(in);
     }
     Inputs const middle(10000);
     middle.operation("== unshared").quick();
     middle.operation("convert for evaluation").quick();
-    middle.operation("bytes").quick();
+    middle.operation("memory").quick();
     Inputs const large(100000);
-    large.operation("walk to the last patch").atMost(40.0).quick();
-    large.operation("outgoing connections of a deep port").quick();
+    large.operation("findPatchRecursive, last patch").atMost(40.0).quick();
+    large.operation("findOutgoingConnectionsFromPort, deep port").quick();
     large.operation("build an index").quick();
     large.operation("1,000 lookups of connections").quick();
 }

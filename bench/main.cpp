@@ -1,4 +1,4 @@
-// Measures the library beside what its users would otherwise pick, and prints one table.
+// Measures the library and its alternatives, and prints one table.
 //
 //     bench --quick --compare docs/benchmark_table.md
 
@@ -39,7 +39,7 @@ std::vector<std::function<void()>>& agreements() {
 
 void describeAll() {
     values();
-    texts();
+    toString();
     data();
     paths();
     easing();
@@ -48,7 +48,7 @@ void describeAll() {
     documentFiles();
 }
 
-// What a process of its own does: one implementation of one operation.
+// Runs one implementation of one operation, in a child process.
 int runOne(std::string const& name, std::string const& who, int repetitions) {
     for (Operation::Entry const& entry : operation(name).entries) {
         if (entry.who != who) continue;
@@ -58,10 +58,10 @@ int runOne(std::string const& name, std::string const& who, int repetitions) {
     return 1;
 }
 
-// All implementations of an operation, in another order in each round.
+// Measures all implementations of an operation, in another order in each round.
 Row measured(Operation const& operation, int rounds, int repetitions) {
     static std::mt19937 random(1);
-    Row row{operation.name, {}, operation.target, operation.comparedWith};
+    Row row{operation.name, {}, operation.target, operation.comparedWith, operation.isInBytes};
     for (Operation::Entry const& entry : operation.entries) row.results.push_back({entry.who, {}});
     std::vector<std::size_t> order(row.results.size());
     for (std::size_t i = 0; i < order.size(); ++i) order[i] = i;
@@ -83,9 +83,9 @@ void requireKnownPeers() {
     for (Operation const& operation : operations()) {
         bool isKnown = operation.comparedWith.empty();
         for (auto const& entry : operation.entries) isKnown |= entry.who == operation.comparedWith;
-        agree(isKnown, ("the peer to compare with: " + operation.name).c_str());
-        // A target of an operation that is not there makes an empty one.
-        agree(!operation.entries.empty(), ("what is done: " + operation.name).c_str());
+        agree(isKnown, ("unknown library to compare with: " + operation.name).c_str());
+        // Setting a target for a misspelt name would add an empty row.
+        agree(!operation.entries.empty(), ("no implementations: " + operation.name).c_str());
     }
 }
 
@@ -108,6 +108,11 @@ Operation& Operation::quick() {
     return *this;
 }
 
+Operation& Operation::inBytes() {
+    isInBytes = true;
+    return *this;
+}
+
 Operation& operation(std::string const& name) {
     auto const found = std::find_if(operations().begin(), operations().end(),
                                     [&](Operation const& o) { return o.name == name; });
@@ -118,8 +123,14 @@ void agreement(std::function<void()> check) { agreements().push_back(std::move(c
 
 void agree(bool same, char const* what) {
     if (same) return;
-    std::cerr << "no agreement: " << what << "\n";
+    std::cerr << "the results differ: " << what << "\n";
     std::exit(1);
+}
+
+std::string grouped(std::size_t number) {
+    std::string digits = std::to_string(number);
+    for (std::size_t i = digits.size(); i > 3; i -= 3) digits.insert(i - 3, ",");
+    return digits;
 }
 
 double heapBytes() {
@@ -138,20 +149,21 @@ struct Options {
     int rounds = 3;
 
     explicit Options(CLI::App& app) {
-        app.add_flag("--quick", quick, "Measure the rows that matter most, once, in two minutes");
-        app.add_option("--filter", filter, "Measure the operations whose names match this")
+        app.add_flag("--quick", quick, "Measure only the main operations, with one round");
+        app.add_option("--filter", filter, "Measure only the operations whose names match")
             ->type_name("REGEX");
         app.add_option("--compare", kept,
-                       "Name what got worse by more than a tenth since this table was kept; end "
-                       "with 1 where there is any")
+                       "List the operations whose ratio is worse by more than a tenth than in this "
+                       "table; exit with 1 where there are any")
             ->type_name("TABLE");
-        app.add_option("--rounds", rounds, "How often everyone is asked for three repetitions")
+        app.add_option("--rounds", rounds,
+                       "Processes per implementation, with three repetitions each")
             ->check(CLI::Range(1, 100))
             ->capture_default_str();
     }
 };
 
-// The C++ library counts references without atomics while a program has one thread.
+// libstdc++ counts references without atomics while a program has only one thread.
 class SecondThread {
 public:
     SecondThread() = default;
@@ -182,15 +194,15 @@ int measure(Options const& options) {
     std::cout << bench::tableOf(rows);
     if (options.kept.empty()) return 0;
     std::string const worse = bench::whatIsWorse(rows, options.kept);
-    std::cout << "\n" << (worse.empty() ? "Nothing is worse by more than a tenth.\n" : worse);
+    std::cout << "\n" << (worse.empty() ? "No operation is worse by more than a tenth.\n" : worse);
     return worse.empty() ? 0 : 1;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
-    // As in a process that has run for a while: memory that was given back is there, and the
-    // kernel has no part in what is measured.
+    // As in a process that has run for a while: freed memory stays with the process, and the kernel
+    // does not affect the measurement.
     mallopt(M_MMAP_THRESHOLD, 1 << 30);
     mallopt(M_TRIM_THRESHOLD, 1 << 30);
     SecondThread const second;
@@ -204,8 +216,8 @@ int main(int argc, char** argv) {
         return 0;
     }
 
-    CLI::App app("Measures the library beside its peers and prints a table. Every implementation "
-                 "of an operation is run in a process of its own.");
+    CLI::App app("Measures the library and its alternatives, and prints a table. Every "
+                 "implementation of an operation runs in its own process.");
     Options options(app);
     try {
         app.parse(argc, argv);

@@ -1,4 +1,4 @@
-// Compares the text of many numbers with what the C library's formatting gives, byte by byte.
+// Compares formatted numbers with the C library's formatting, byte by byte.
 //
 //     number_text [COUNT]        100,000,000 unless said otherwise
 
@@ -48,12 +48,12 @@ int main(int argc, char** argv) {
             case 3:
                 d = std::nextafter(static_cast<double>(word % 16000) / 8.0 - 1000.0, -1e9);
                 break;
-            // Hundredths and halves of them, as near as a double comes.
+            // Hundredths and half hundredths, as close as a double comes.
             case 4: d = static_cast<double>(word % 400000) / 200.0 - 1000.0; break;
             case 5:
                 d = std::ldexp(static_cast<double>(word >> 11), -static_cast<int>(word % 128));
                 break;
-            // Powers of ten, and where the text is cut.
+            // Powers of ten, and numbers that are cut.
             case 6:
                 d = std::pow(10.0, static_cast<double>(word % 309)) * (word % 2 == 0 ? 1 : -1);
                 break;

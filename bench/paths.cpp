@@ -38,7 +38,7 @@ struct CairoPath {
     std::vector<cairo_path_t*> kept;
 };
 
-// The same outline for cairo, which has no rounded rectangle of its own.
+// The same outline for cairo, which has no rounded rectangles.
 void roundRect(cairo_t* c, double x, double y, double w, double h, double r) {
     double const k = r * 0.552284749;
     cairo_move_to(c, x + r, y);
@@ -146,7 +146,7 @@ void shapes() {
 }
 
 void polylines() {
-    bench::operation("a polyline of 100,000")
+    bench::operation("build a polyline of 100,000")
         .ours(bench::doing(ourLines))
         .peer("QPainterPath", bench::doing(qtLines))
         .peer("cairo", bench::doing(cairoLines))

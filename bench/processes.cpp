@@ -16,7 +16,7 @@ std::string quoted(std::string const& text) {
     return result + "'";
 }
 
-// What one process collects from Google Benchmark: an adjusted time for each repetition.
+// Collects the results of Google Benchmark: an adjusted time for each repetition.
 class Collector : public benchmark::BenchmarkReporter {
 public:
     bool ReportContext(Context const&) override { return true; }

@@ -1,4 +1,4 @@
-// bench/processes.h: this program, run again for a part of its work.
+// bench/processes.h: runs this program again for a part of its work.
 
 #ifndef TARN_BENCH_PROCESSES_H
 #define TARN_BENCH_PROCESSES_H
@@ -8,8 +8,8 @@
 
 namespace bench {
 
-/// The numbers that this program prints, a line each, when it is run with these arguments. A
-/// process that fails ends this one too.
+/// Runs this program with these arguments and returns the numbers that it prints, one per line.
+/// Ends this process where the other fails.
 std::vector<double> figuresOfProcess(std::vector<std::string> const& arguments);
 
 }  // namespace bench

@@ -3,6 +3,7 @@
 #include "bench.h"
 
 #include <algorithm>
+#include <array>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
@@ -13,57 +14,74 @@ namespace bench {
 
 namespace {
 
-double median(std::vector<double> figures) {
-    std::sort(figures.begin(), figures.end());
-    return figures[figures.size() / 2];
+double minimum(Result const& result) {
+    return *std::min_element(result.figures.begin(), result.figures.end());
 }
 
-double minimum(std::vector<double> const& figures) {
-    return *std::min_element(figures.begin(), figures.end());
-}
-
-// Two or three digits, or all of those before the point.
-std::string shown(double figure) {
+// Two significant digits, or all digits before the point.
+std::string shortened(double figure) {
     char text[64];
-    char const* const format = figure >= 100.0  ? "%.0f"
-                               : figure >= 10.0 ? "%.1f"
-                               : figure >= 0.1  ? "%.2f"
-                                                : "%.2g";
-    std::snprintf(text, sizeof text, format, figure);
+    std::snprintf(text, sizeof text, figure < 9.95 ? "%.2g" : "%.0f", figure);
     return text;
 }
 
-// Of ours to the peer that counts; 0 where there is no peer. Of minima: the machine is slower at
-// some times than at others, and never faster than it can be.
+// Like "3.1 µs" or "120 kB".
+std::string withUnit(double figure, bool isInBytes) {
+    constexpr std::array<char const*, 4> kTimes{"ns", "µs", "ms", "s"};
+    constexpr std::array<char const*, 4> kSizes{"bytes", "kB", "MB", "GB"};
+    double scaled = isInBytes ? figure : 1000.0 * figure;
+    std::size_t unit = 0;
+    while (scaled >= 999.5 && unit + 1 < kTimes.size()) {
+        scaled /= 1000.0;
+        ++unit;
+    }
+    return shortened(scaled) + " " + (isInBytes ? kSizes : kTimes)[unit];
+}
+
+// Two decimals, fewer for large ratios and more for small ones.
+std::string ratioText(double ratio) {
+    char text[64];
+    std::snprintf(text, sizeof text,
+                  ratio >= 9.95  ? "%.0f"
+                  : ratio >= 0.1 ? "%.2f"
+                                 : "%.2g",
+                  ratio);
+    return text;
+}
+
+// The ratio of ours to the library to compare with; 0 where there is none. Uses minima, since noise
+// only ever slows a run down.
 double ratioOf(Row const& row) {
     double reference = 0.0;
     for (std::size_t i = 1; i < row.results.size(); ++i) {
-        Result const& peer = row.results[i];
-        if (!row.against.empty() && peer.who != row.against) continue;
-        double const figure = minimum(peer.figures);
+        Result const& other = row.results[i];
+        if (!row.against.empty() && other.who != row.against) continue;
+        double const figure = minimum(other);
         reference = reference == 0.0 ? figure : std::min(reference, figure);
     }
-    return reference == 0.0 ? 0.0 : minimum(row.results.front().figures) / reference;
+    return reference == 0.0 ? 0.0 : minimum(row.results.front()) / reference;
 }
 
 std::string lineOf(Row const& row) {
-    std::string peers;
+    std::string others;
     for (std::size_t i = 1; i < row.results.size(); ++i) {
-        Result const& peer = row.results[i];
-        peers += (peers.empty() ? "" : ", ") + peer.who + " " + shown(median(peer.figures));
+        Result const& other = row.results[i];
+        others += (others.empty() ? "" : ", ") + other.who + " " +
+                  withUnit(minimum(other), row.isInBytes);
     }
-    std::vector<double> const& ours = row.results.front().figures;
     double const ratio = ratioOf(row);
-    std::string line = "| " + row.name + " | " + shown(median(ours));
-    if (ours.size() > 1) line += " (" + shown(minimum(ours)) + ")";
-    line += " | " + peers + " | " + (ratio == 0.0 ? "" : shown(ratio));
+    std::string line =
+        "| " + row.name + " | " + withUnit(minimum(row.results.front()), row.isInBytes);
+    line += " | " + others + " | " + (ratio == 0.0 ? "" : ratioText(ratio));
     if (!row.against.empty()) line += " of " + row.against;
     line += " | ";
-    if (row.target != 0.0) line += shown(row.target) + (ratio <= row.target ? "" : " (missed)");
+    if (row.target != 0.0) {
+        line += ratioText(row.target) + (ratio <= row.target ? "" : " (exceeded)");
+    }
     return line + " |\n";
 }
 
-// The ratios of a table, by the names of the operations.
+// The ratios of a table by operation.
 std::map<std::string, double> ratiosIn(std::string const& file) {
     std::map<std::string, double> ratios;
     std::ifstream stream(file);
@@ -82,7 +100,8 @@ std::map<std::string, double> ratiosIn(std::string const& file) {
 }  // namespace
 
 std::string tableOf(std::vector<Row> const& rows) {
-    std::string text = "| operation | ours | peers | ratio | at most |\n|---|---|---|---|---|\n";
+    std::string text =
+        "| operation | this library | others | ratio | limit |\n|---|---|---|---|---|\n";
     for (Row const& row : rows) text += lineOf(row);
     return text;
 }
@@ -94,7 +113,7 @@ std::string whatIsWorse(std::vector<Row> const& rows, std::string const& kept) {
         auto const known = before.find(row.name);
         double const ratio = ratioOf(row);
         if (known == before.end() || ratio <= 1.1 * known->second) continue;
-        text += row.name + ": " + shown(ratio) + ", was " + shown(known->second) + "\n";
+        text += row.name + ": " + ratioText(ratio) + ", was " + ratioText(known->second) + "\n";
     }
     return text;
 }

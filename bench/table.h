@@ -1,4 +1,4 @@
-// bench/table.h: what was measured, as a table, and beside one that was kept.
+// bench/table.h: prints the results as a table, and compares it with a saved one.
 
 #ifndef TARN_BENCH_TABLE_H
 #define TARN_BENCH_TABLE_H
@@ -8,26 +8,27 @@
 
 namespace bench {
 
-/// What one implementation took, each time.
+/// The figures of one implementation.
 struct Result {
     std::string who;
     std::vector<double> figures;
 };
 
-/// The results of an operation, ours first, and what ours may be: that multiple of the peer named,
-/// or of the best one. 0 is no target.
+/// The results of an operation, ours first, and the target: at most that multiple of the named or
+/// the fastest library. 0 is no target.
 struct Row {
     std::string name;
     std::vector<Result> results;
     double target;
     std::string against;
+    bool isInBytes;
 };
 
-/// A Markdown table.
+/// Formats a Markdown table.
 std::string tableOf(std::vector<Row> const& rows);
 
-/// A line for each row whose ratio is larger by more than a tenth than in the table of the file
-/// `kept`. Stops the program where the file has no such table.
+/// One line for each row whose ratio is worse by more than a tenth than in the table of the file
+/// `kept`. Ends the program where the file has no such table.
 std::string whatIsWorse(std::vector<Row> const& rows, std::string const& kept);
 
 }  // namespace bench

@@ -21,7 +21,7 @@ namespace {
 constexpr std::size_t kCount = 10000;
 char const* const kText = "twenty-four bytes of it.";
 
-// The alternatives of a value, in the bare unions.
+// The alternatives of a value in plain variants.
 template <template <class...> class Variant>
 using Union = Variant<long long, double, FloatVec2, FloatVec3, FloatVec4,
                       std::shared_ptr<FloatMat4 const>, bool, Value::ImageID, Value::VideoID,
@@ -54,7 +54,7 @@ std::vector<T> numbers() {
     return loop;
 }
 
-// Half of them numbers, the rest integers, vectors, truth values, texts and paths.
+// Half of them numbers, the rest integers, vectors, booleans, strings and paths.
 template <class T>
 std::vector<T> mixedValues() {
     std::vector<T> loop;
@@ -91,7 +91,7 @@ std::vector<QVariant> mixedValues<QVariant>() {
     return loop;
 }
 
-// Room for many `T`, of which `made` are there.
+// Memory for many `T`, of which `made` are constructed.
 template <class T>
 struct Room {
     Room() : memory(static_cast<T*>(::operator new(kCount * sizeof(T)))) {}
@@ -157,7 +157,8 @@ int kindOf(Boost const& v) { return v.which(); }
 int kindOf(Std const& v) { return static_cast<int>(v.index()); }
 int kindOf(QVariant const& v) { return static_cast<int>(v.type()); }
 
-// The texts read as numbers cost the C library's parse for everyone: left out of the mixed ones.
+// Converting strings to numbers costs everyone the C library's parser, so the mixed values have no
+// strings.
 template <class T>
 std::vector<T> mixedWithoutTexts() {
     std::vector<T> loop = mixedValues<T>();
@@ -230,7 +231,7 @@ void equality(std::string const& who) {
     bench::operation("== of 10,000 mixed values, unshared").peer(who, bench::on(unshared, equal));
 }
 
-// The clamp as it would be written in place over a std::variant.
+// Clamping as written by hand for a std::variant.
 Std const& clamped(Std const& value, Std const* min, Std const* max) {
     auto const number = [](Std const& v) {
         double const* d = std::get_if<double>(&v);
@@ -351,7 +352,7 @@ void bench::values() {
     operation("== of 10,000 mixed values, shared").against("std::variant").quick();
     operation("== of 10,000 mixed values, unshared").against("std::variant").quick();
     operation("cast 10,000 to a float port with bounds").atMost(1.2).quick();
-    operation("cast 10,000 to a float port without").atMost(3.0);
+    operation("cast 10,000 to a float port without bounds").atMost(3.0);
     operation("cast 10,000 to another port").atMost(3.0);
     operation("indexLoopCasting of 30,000").atMost(1.5);
 }

@@ -17,7 +17,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// As an editor has them: a third of them above 1000, where the strings have one decimal.
+// As in an editor: a third of them above 1000, where numbers have one decimal.
 std::vector<double> numbers() {
     std::mt19937_64 random(14);
     std::uniform_real_distribution<double> small(-999.0, 999.0);
@@ -62,7 +62,7 @@ bench::Implementation all(Make make) {
 
 }  // namespace
 
-void bench::texts() {
+void bench::toString() {
     agreement([] {
         for (double const d : numbers()) {
             agree(to_string(Value(d)) == trimmed(withSnprintf(d)) &&
@@ -71,7 +71,7 @@ void bench::texts() {
                   "strings of numbers");
         }
     });
-    operation("strings of 10,000 numbers")
+    operation("to_string of 10,000 numbers")
         .ours(all([](double d) { return to_string(Value(d)); }))
         .peer("std::to_chars", all(withToChars))
         .peer("snprintf", all(withSnprintf))
