@@ -22,7 +22,7 @@ int main() {
         std::cout << "frame " << frame << ": x " << ease(EasingFunction::CubicInOut, left, right, t)
                   << ", color " << ease(EasingFunction::SinusoidalOut, red, blue, t) << ", dots";
         for (int dot = 0; dot < 3; ++dot) {
-            // `ease` goes on beyond its ends; who waits at them clamps the progress.
+            // `ease` continues beyond its ends; clamp the progress to stay there.
             double const own = std::clamp(t - dot * kDelay, 0.0, 1.0);
             std::cout << " " << ease(EasingFunction::QuadraticOut, left, right, own);
         }

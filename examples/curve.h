@@ -11,12 +11,12 @@
 #include <cmath>
 #include <utility>
 
-// Progress that is shown: from 0 to 1, and what the curve does a quarter before and after.
+// The range of progress that is shown: from 0 to 1, and a quarter before and after.
 constexpr double kCurveStart = -0.25;
 constexpr double kCurveEnd = 1.25;
 
-// Straight lines, `size` wide and high from progress 0 to 1 and upwards from the origin, with
-// coordinates in hundredths.
+// Line segments, `size` wide and high from progress 0 to 1, upwards from the origin, with
+// coordinates rounded to hundredths.
 inline tarn::engine::Path curve(tarn::engine::EasingFunction function, double size) {
     constexpr int kSteps = 90;
     auto const shown = [](double coordinate) { return std::round(coordinate * 100.0) / 100.0; };

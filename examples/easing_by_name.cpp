@@ -1,4 +1,4 @@
-// From the name that an editor shows to the curve, and what it gives half way.
+// Finds a curve by the name that an editor shows, and prints its midpoint.
 //
 //     easing_by_name "Cubic Out" Bounce
 

@@ -1,5 +1,5 @@
-// All easing curves on one sheet, as an SVG picture: the way from 0 to 1 in the inner square, and
-// what they do before and beyond it.
+// All easing curves in one SVG picture: progress 0 to 1 in the inner square, and the curve before
+// and after it.
 //
 //     easing_sheet > easing_sheet.svg
 
@@ -36,7 +36,7 @@ int main() {
     double const margin = -kCurveStart * kSize;
     double const side = (kCurveEnd - kCurveStart) * kSize;
     for (int i = 0; i < count; ++i) {
-        // Each cell is a picture of its own, which cuts off what leaves it.
+        // Each cell is a nested picture, which clips the curve.
         std::cout << "<svg x=\"" << i % kColumns * kCell + 10.0 << "\" y=\""
                   << i / kColumns * (kCell + 10.0) + 5.0 << "\" width=\"" << side << "\" height=\""
                   << side << "\" viewBox=\"" << -margin << " " << margin - side << " " << side

@@ -1,5 +1,5 @@
-// Any patch as a graph in the language of Graphviz: groups as clusters, ports as fields of their
-// patch.
+// Converts a patch to Graphviz's language: groups become clusters, ports become fields of record
+// nodes.
 //
 //     graph_to_dot | dot -Tsvg > graph.svg
 
@@ -14,7 +14,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// As a field of a record label. Graphviz knows entities, and gives some characters a meaning.
+// Escapes a field of a record label. Graphviz interprets entities and some characters.
 std::string label(std::string const& text) {
     std::string result;
     for (char const c : text) {
@@ -39,7 +39,7 @@ std::string fields(std::vector<Port> const& ports) {
     return text;
 }
 
-// Nodes are named by their place, "1/2/3": identifiers may repeat in a graph that nobody checked.
+// Names nodes by their position, "1/2/3", because identifiers in unchecked graphs may repeat.
 void writePatch(std::ostream& stream, Patch const& patch, std::string const& place) {
     bool const isGroup = !patch.children->empty();
     if (isGroup) stream << "subgraph \"cluster " << place << "\" {\n";
@@ -55,7 +55,7 @@ void writePatch(std::ostream& stream, Patch const& patch, std::string const& pla
     for (Connection const& c : *patch.connections) {
         auto const from = places.find(c.fromPatchId);
         auto const to = places.find(c.toPatchId);
-        if (from == places.end() || to == places.end()) continue;  // It leads nowhere.
+        if (from == places.end() || to == places.end()) continue;  // A dangling connection.
         stream << "\"" << from->second << "\":" << c.fromPortId << ":s -> \"" << to->second
                << "\":" << c.toPortId << ":n;\n";
     }

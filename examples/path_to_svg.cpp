@@ -1,4 +1,4 @@
-// A path as an SVG picture: its `d`, its points, and the handles from each point to its control
+// Draws a path as an SVG picture: its outline, its points, and lines from each point to its control
 // points.
 //
 //     path_to_svg > path.svg
@@ -11,8 +11,8 @@ using namespace tarn::engine;
 
 namespace {
 
-// A line from every point to the control points that belong to it, and the dots of both. For
-// elements with all of their points, as a builder makes them.
+// A line from every point to its control points, and dots for both. The elements must have all
+// their points, as a builder makes them.
 struct Handles {
     PathBuilder lines;
     std::vector<FloatVec2> points;
@@ -21,7 +21,7 @@ struct Handles {
 
 Handles handlesOf(Path const& path) {
     Handles handles;
-    FloatVec2 start{0.0, 0.0};  // Of the outline; in a picture, `close` goes back there.
+    FloatVec2 start{0.0, 0.0};  // The start of the outline; in SVG, `close` returns to it.
     FloatVec2 current = start;
     for (PathElement const& element : path.elements) {
         Points const& p = element.points;

@@ -1,4 +1,4 @@
-// Options from a JSON file, each with a default; what is of the wrong kind is reported.
+// Reads options from a JSON file, with defaults, and reports values of the wrong kind.
 //
 //     settings examples/settings.json
 

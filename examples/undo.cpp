@@ -9,14 +9,14 @@
 
 using namespace tarn::engine;
 
-// Every state is kept whole. States share all lists that no edit between them has touched.
+// Keeps every state. States share all lists that no edit between them has changed.
 class History {
 public:
     explicit History(Patch root) : index(root), states{std::move(root)} {}
 
     PatchEdit edit() const { return PatchEdit(index); }
     void commit(PatchEdit edit) {
-        states.resize(current + 1);  // What was undone cannot be redone after a new edit.
+        states.resize(current + 1);  // Undone edits cannot be redone after a new edit.
         states.push_back(edit.commit());
         goTo(current + 1, "edit");
     }

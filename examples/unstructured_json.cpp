@@ -1,4 +1,4 @@
-// JSON in, questions to it, JSON out.
+// Parses JSON, looks values up in it, and writes it.
 //
 //     unstructured_json
 
@@ -15,24 +15,25 @@ int main() {
     })"));
     std::cout << data.toText() << "\n";
 
-    // A bool is the integer 1 or 0: the library's data has none of its own.
+    // A boolean is the integer 1 or 0: the library's data has no booleans.
     std::cout << "public: " << data.boolAt({"public"}, false) << "\n";
 
-    // find, ifMap, ifArray and ifString point to the content; asMap and its siblings copy it.
+    // find, ifMap, ifArray and ifString return pointers to the content; asMap and similar functions
+    // copy it.
     if (Unstructured const* tags = data.find("tags")) {
         for (Unstructured const& tag : *tags->ifArray())
             std::cout << "tag " << *tag.ifString() << "\n";
     }
-    // What is missing or of another kind has a default, and says which of the two it is.
+    // Missing values and values of another kind have a default; `lookup` tells the two apart.
     Unstructured::Lookup lookup = {};
     std::cout << data.stringAt({"author"}, "nobody", &lookup) << ", "
               << (lookup == Unstructured::Lookup::WrongKind ? "not a string\n" : "\n");
 
-    // Vectors are read from members or elements by position.
+    // Vectors are read from members or elements.
     FloatVec2 const size = *data.find("size");
     std::cout << "size: " << size.x << " by " << size.y << "\n";
 
-    // Identifiers keep all of their 64 bits, and read as such alone.
+    // Identifiers keep all 64 bits, and only convert by asId.
     Unstructured const& id = *data.find("id");
     std::cout << "id: " << id.asId() << ", as an integer " << id.asInteger() << "\n";
 

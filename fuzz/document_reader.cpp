@@ -1,5 +1,5 @@
-// Any bytes are a document, or one line says why not; a document that is written is read back, and
-// what the example program shows is taken through everything that it does with one.
+// Reads any bytes as a document: the result is a document, which survives writing and reading back
+// and everything that the example program does, or an error of one line.
 
 #include "fuzz.h"
 

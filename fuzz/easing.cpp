@@ -1,5 +1,5 @@
-// Curves: finite, exact at their ends where the formulas are, and the same for scalars, vectors and
-// values.
+// Checks that curves are finite, exact at their ends where the formulas are, and equal for scalars,
+// vectors and values.
 
 #include "fuzz.h"
 

@@ -1,4 +1,4 @@
-// fuzz/fuzz.h: what the fuzz targets share: bytes as inputs, and a check that ends the program.
+// fuzz/fuzz.h: shared by the fuzz targets: typed inputs from bytes, and a check that aborts.
 
 #ifndef TARN_FUZZ_FUZZ_H
 #define TARN_FUZZ_FUZZ_H
@@ -15,19 +15,19 @@
 
 namespace fuzz {
 
-/// Ends the program where `holds` is false: that is what a fuzzer finds.
+/// Aborts where `holds` is false, which the fuzzer reports.
 inline void check(bool holds, char const* what) {
     if (holds) return;
     std::fprintf(stderr, "does not hold: %s\n", what);
     std::abort();
 }
 
-/// The same number to the last bit; any NaN is as good as another.
+/// Equal to the last bit; all NaNs count as equal.
 inline bool same(double a, double b) {
     return tests::bits(a) == tests::bits(b) || (std::isnan(a) && std::isnan(b));
 }
 
-/// The input, as numbers of any kind, small choices and texts. Beyond its end everything is zero.
+/// The input as numbers of any kind, small choices and strings. Past its end everything is zero.
 class Input {
 public:
     Input(std::uint8_t const* data, std::size_t size) : provider(data, size) {}

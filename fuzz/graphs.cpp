@@ -1,5 +1,5 @@
-// Random trees with identifiers that occur many times: walks beside a model and an index, edits,
-// updates and changes; text, equality and conversion.
+// Random trees with repeated identifiers: queries against a model and an index, edits, updates and
+// changes, output, equality and conversion.
 
 #include "fuzz.h"
 
@@ -110,7 +110,7 @@ void checkEvaluation(EvalPatchIndex const& index, unsigned long long id) {
           "a parent of the evaluation form");
 }
 
-// Whatever is asked of it, the document stays what it is.
+// No edit changes the original document.
 Patch edited(Input& input, PatchIndex const& index) {
     Patch const before = index.root();
     PatchEdit edit(index);
@@ -168,7 +168,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     EvalPatch const evaluated(root);
     check(samePatches(root, evaluated), "conversion");
     check(evaluated == EvalPatch(root), "equality of conversions");
-    // The text has all that random patches differ in, but for the patches of connections.
+    // The output shows everything that random patches differ in, except the patches of connections.
     if (root == other) check(text == textOf(other), "equality");
     check(root == Patch(root) && !(root != Patch(root)), "equality with a copy");
 

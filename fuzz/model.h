@@ -1,4 +1,4 @@
-// fuzz/model.h: what data and numbers are, written down a second time and as plainly as can be.
+// fuzz/model.h: a simple second implementation of data and numbers.
 
 #ifndef TARN_FUZZ_MODEL_H
 #define TARN_FUZZ_MODEL_H
@@ -15,7 +15,7 @@
 
 namespace fuzz {
 
-/// Towards zero, kept in range, 0 for a NaN.
+/// Truncates towards zero and clamps; 0 for a NaN.
 inline long long toInteger(double d) {
     if (!(d == d)) return 0;
     if (d >= 9223372036854775807.0) return INT64_MAX;
@@ -28,7 +28,7 @@ inline unsigned long long toId(double d) {
     return static_cast<unsigned long long>(d);
 }
 
-/// The text of a number, by the C library, `point` being the decimal point that is trimmed.
+/// Formats a number with the C library; `point` is the decimal point that is trimmed.
 inline std::string numberText(double d, char point) {
     char buffer[128];
     std::snprintf(buffer, sizeof buffer, std::fabs(d) >= 1000.0 ? "%.1f" : "%.2f", d);
@@ -40,7 +40,7 @@ inline std::string numberText(double d, char point) {
     return text == "-0" ? "0" : text;
 }
 
-/// The number that a text is: all of it, or whether there is any.
+/// The number that the whole string represents, else whether it is not empty.
 inline double textAsNumber(std::string const& text) {
     if (text.empty()) return 0.0;
     char* end = nullptr;
@@ -48,7 +48,7 @@ inline double textAsNumber(std::string const& text) {
     return static_cast<std::size_t>(end - text.c_str()) == text.size() ? number : 1.0;
 }
 
-/// Free-form data as a record with a field for everything.
+/// Unstructured data as a struct with a field for everything.
 struct Tree {
     enum Kind { Null, Map, Array, Float, Integer, Unsigned, String };
 
@@ -181,7 +181,7 @@ struct Tree {
     }
 };
 
-/// Whether data holds just what the model holds: floating-point numbers by their bits.
+/// Whether the data equals the model; doubles are compared by bits.
 inline bool holds(tarn::engine::Unstructured const& data, Tree const& tree) {
     if (static_cast<int>(data.type()) != static_cast<int>(tree.kind)) return false;
     switch (tree.kind) {

@@ -1,5 +1,5 @@
-// The text of any number, with any decimal points of the C and the C++ library, beside what the C
-// library formats.
+// Compares formatted numbers with the C library, for any decimal points of the C and the C++
+// library.
 
 #include "model.h"
 

@@ -1,5 +1,5 @@
-// Random calls of the builder beside a list of plain instructions: elements to the last bit, the
-// current point, equality, and outlines that are turned around the origin.
+// Compares random calls of the builder with a list of plain instructions: elements to the last bit,
+// the current point, equality, and outlines rotated about the origin.
 
 #include "fuzz.h"
 
@@ -103,7 +103,7 @@ struct Drawing {
                 draw(I::close, {});
                 break;
             }
-            case Operation::Append: {  // Everything so far, once more.
+            case Operation::Append: {  // Appends a copy of everything so far.
                 std::vector<Step> const again = steps;
                 steps.insert(steps.end(), again.begin(), again.end());
                 break;
@@ -168,7 +168,7 @@ bool hasNaN(Path const& path) {
 extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size) {
     Input input(data, size);
     PathBuilder builder;
-    PathBuilder turned;  // All but the rectangles, whose corners are not the same when turned.
+    PathBuilder turned;  // All but the rectangles, whose corners change when rotated.
     Drawing drawing;
     bool turns = true;
     for (int i = 0; i < 40 && !input.ended() && drawing.steps.size() < 10000; ++i) {
@@ -197,7 +197,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
         shorter.elements.pop_back();
         check(shorter != path && !(shorter == path), "inequality of lengths");
     }
-    // Rounding does not know signs: turned around the origin, all is what it was but for its sign.
+    // Rounding is symmetric: a rotation by half a turn only changes signs.
     for (std::size_t i = 0; turns && i < path.elements.size(); ++i) {
         auto const& here = path.elements[i].points;
         auto const& there = turned.elements[i].points;

@@ -1,4 +1,4 @@
-// Any text as a number: all of it, or its truth.
+// Converts any string to a number and to a boolean.
 
 #include "model.h"
 

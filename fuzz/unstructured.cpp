@@ -1,4 +1,5 @@
-// Random trees beside a plain model: build, copy, compare, read, filter, nest.
+// Compares random trees with a simple model: construction, copies, comparison, conversions,
+// filtering, nesting.
 
 #include "model.h"
 
@@ -40,7 +41,7 @@ void checkFilter(Unstructured const& data, Tree const& tree) {
     check(holds(Unstructured::removeEmptyValues(data.asMap()), kept), "removeEmptyValues");
 }
 
-// `levels` containers around the data.
+// Nests the data in `levels` containers.
 Unstructured nested(Unstructured data, std::size_t levels, bool arrays) {
     for (std::size_t i = 0; i < levels; ++i) {
         if (arrays) {
@@ -90,7 +91,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     check(holds(copy, a), "assignment");
     Unstructured moved = std::move(copy);
     check(copy.type() == Unstructured::Type::Null && holds(moved, a), "move");
-    // A part of a tree takes the place of the whole.
+    // Assigns a part of a tree to the whole.
     if (auto const* array = first.ifArray(); array != nullptr && !array->empty()) {
         first = array->back();
         check(holds(first, a.elements.back()), "assignment from within");

@@ -1,5 +1,5 @@
-// Random values beside a plain model: made, read as everything, compared, written, made into every
-// other type, carried over to data and back.
+// Compares random values with a simple model: construction, conversions, comparison, output, and
+// conversion to unstructured data and back.
 
 #include "model.h"
 
@@ -22,7 +22,7 @@ struct Model {
     long long integer = 0;
     bool truth = false;
     unsigned long long id = 0;
-    std::array<double, 4> components{};  // A number's is the first.
+    std::array<double, 4> components{};  // A number uses the first one.
     std::array<double, 16> matrix{};
     std::string text;
     std::vector<PathElement> elements;
@@ -331,7 +331,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     for (std::size_t i = 0; i < values.size(); ++i) {
         checkReadings(values[i], models[i]);
         for (std::size_t j = 0; j < values.size(); ++j) {
-            // A payload that is shared equals itself, whatever is in it.
+            // A shared payload equals itself, whatever it contains.
             bool const shared = values[i].ifUnstructured() != nullptr &&
                                 values[i].ifUnstructured() == values[j].ifUnstructured();
             bool const equal = shared || models[i].equals(models[j]);

@@ -23,7 +23,7 @@ Document requireUsable(Optional<Patch> root, DocumentInfo info, DocumentError co
 
 }  // namespace
 
-// Without recursion: how deep the graph is, is what is asked here.
+// Not recursive, since the depth is what this determines.
 std::string whatIsNotShown(Patch const& root) {
     std::vector<std::pair<Patch const*, std::size_t>> pending{{&root, 1}};
     while (!pending.empty()) {

@@ -1,4 +1,4 @@
-// A document as this program goes through it: the graph and what the library says of its file.
+// A document as this program uses it: the graph, and the information about its file.
 //
 //     Document document = openDocument("examples/documents/animation.json");
 //     Patch const* patch = findPatchRecursive(document.root, 7);
@@ -15,7 +15,7 @@
 
 using Json = nlohmann::json;
 
-// Input that cannot be used. `what()` is one line: the place in the file, and what is wrong there.
+// Invalid input. `what()` is one line: the place in the file and the problem.
 struct InputError : std::runtime_error {
     using std::runtime_error::runtime_error;
 };
@@ -25,19 +25,18 @@ struct Document {
     tarn::engine::DocumentInfo info;
 };
 
-// What of the graph the library carries and this program does not show: more than a thousand
-// levels, over which it recurses, or ports without a type. Empty where there is nothing of that
-// kind.
+// What this program does not support: more than a thousand levels, since it is recursive, or ports
+// with an undefined type. Empty where the graph has neither.
 std::string whatIsNotShown(tarn::engine::Patch const& root);
 
-// Throws an InputError for what cannot be used, or is not shown.
+// Throws an InputError for invalid or unsupported documents.
 Document openDocument(std::string const& fileName);
 Document parseDocument(std::string const& text);
 
-// In one line. Bytes that are no UTF-8 become U+FFFD.
+// Formats in one line. Invalid UTF-8 becomes U+FFFD.
 std::string jsonText(Json const& json);
 
-// The text with what a terminal would act on, line ends included, written as escapes.
+// Escapes control characters, including line ends.
 std::string printable(std::string const& text);
 
 #endif

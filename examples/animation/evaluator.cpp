@@ -10,7 +10,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// A group's ports have bounds, as every port has.
+// The ports of a group have bounds too.
 Loop castAll(Loop const& values, TypeInfo const& typeInfo) {
     Loop result;
     result.reserve(values.size());
@@ -27,9 +27,9 @@ Evaluator::Evaluator(Document const& evaluatedDocument)
 
 void Evaluator::evaluate(long long frame) { run(*top, frame); }
 
-// The lists of the evaluation form never change their lengths here: pointers into them last.
+// The lists of the evaluation form never change their size here: pointers into them stay valid.
 std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch& evaluated) {
-    // The first connection to a port and the first port of an identifier count, as in the queries.
+    // Of repeated identifiers the first counts, as in the queries.
     std::unordered_map<unsigned long long, unsigned long long> incoming;
     for (Connection const& c : *patch.connections) incoming.emplace(c.toPortId, c.fromPortId);
     std::unordered_map<unsigned long long, EvalPort const*> outputs;
@@ -48,7 +48,7 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
         Patch const& child = patch.children->at(i);
         EvalPatch& evaluatedChild = evaluated.children->at(i);
         Step step{&evaluatedChild, {}, nullptr};
-        // A patch of unknown kind hands its inputs' defaults on: nothing takes their place.
+        // A patch of unknown kind passes its inputs' defaults on unchanged.
         for (Port const& input : *child.inputs) {
             if (child.builtin == kUnknownKind) break;
             step.sources.push_back(sourceOf(input));
@@ -59,8 +59,8 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
     return level;
 }
 
-// The positions of the children, sources first; those in a circle last, as they stand. Connections
-// whose ends are no children do not count.
+// The positions of the children in topological order; those in a cycle come last, in their own
+// order. Connections whose ends are not children are ignored.
 std::vector<std::size_t> Evaluator::order(Patch const& patch) {
     std::vector<Patch> const& children = *patch.children;
     std::unordered_map<unsigned long long, std::size_t> positions;
@@ -155,7 +155,7 @@ void Evaluator::compute(EvalPatch& patch, long long frame) const {
     };
     for (std::size_t index = 0; index < iterations; ++index) {
         for (std::size_t i = 0; i < inputs.size(); ++i) {
-            // Cast to the port's bounds first, then read as the port's type.
+            // Clamps to the port's bounds, then converts to the port's type.
             TypeInfo const& typeInfo = inputs[i].typeInfo;
             values[i] = indexLoopCasting(inputs[i].values, typeInfo, index).asType(typeInfo.type);
         }

@@ -1,4 +1,4 @@
-// A small evaluator: what the library leaves to its callers, in its simplest form.
+// A minimal evaluator: the part that the library leaves to its users.
 //
 //     Evaluator evaluator(document);
 //     evaluator.evaluate(12);
@@ -15,23 +15,21 @@
 #include <memory>
 #include <vector>
 
-// Evaluates all patches of a document, frame by frame. Within each group the patches are put in an
-// order in which every one comes after those that it takes values from; where connections run in
-// a circle, one of them hands on the value of the frame before.
+// Evaluates all patches of a document, frame by frame. Within each group, patches are evaluated in
+// topological order; in a cycle, one connection carries the value of the previous frame.
 class Evaluator {
 public:
-    // `document` is used as long as the evaluator lives.
+    // `document` must outlive the evaluator.
     explicit Evaluator(Document const& document);
 
     void evaluate(long long frame);
 
-    // The graph with the values of the frame that was evaluated last.
+    // The graph with the values of the latest frame.
     tarn::engine::EvalPatch const& root() const { return evaluatedRoot; }
 
 private:
     struct Level;
-    // One child of a group, with the output port that each of its inputs takes values from, or
-    // null.
+    // One child of a group with the output port that is connected to each of its inputs, or null.
     struct Step {
         tarn::engine::EvalPatch* patch;
         std::vector<tarn::engine::EvalPort const*> sources;

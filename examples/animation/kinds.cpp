@@ -24,7 +24,7 @@ void constant(Call const& call) {
     for (std::size_t i = 0; i < call.inputs.size(); ++i) call.out(i + 1, call.inputs[i]);
 }
 
-// The curve is given by its name or its number; any other is linear.
+// The curve by its name or its number; linear for anything else.
 EasingFunction easingFunction(Value const& curve) {
     std::vector<std::string> const names = easingFunctionNames();
     auto const named = std::find(names.begin(), names.end(), std::string(curve));
@@ -46,7 +46,7 @@ void oscillator(Call const& call) {
     call.out(1, amplitude * std::sin(kTwoPi * (hertz * seconds + turns)));
 }
 
-// Component by component; a number counts as a vector of itself.
+// Component by component; a number fills every component.
 void combine(Call const& call, FloatVec4 result, double (*operation)(double, double)) {
     for (Value const& input : call.inputs) {
         FloatVec4 const v = input;
@@ -143,7 +143,7 @@ void text(Call const& call) {
     call.out(1, joined);
 }
 
-// At the number's position.
+// Indexed by the number of the kind.
 Kind const kKinds[] = {
     {kUnknownKind, nullptr, "hands its inputs' defaults on, position by position"},
     {kGroupKind, nullptr, "any ports; its children compute"},

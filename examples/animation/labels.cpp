@@ -13,10 +13,10 @@ using namespace tarn::engine;
 
 namespace {
 
-// Wider lists of columns are no help to a reader.
+// More columns do not fit on a screen.
 constexpr std::size_t kMostColumns = 12;
 
-// Of the bytes of a character in UTF-8, one behind the first.
+// Whether this is a continuation byte of UTF-8.
 bool isContinuation(char byte) { return (static_cast<unsigned char>(byte) & 0xc0) == 0x80; }
 
 }  // namespace
@@ -34,7 +34,7 @@ std::size_t columnsOf(std::string const& text) {
         if (isContinuation(c)) continue;
         columns += static_cast<unsigned char>(c) < 0xe0
                        ? 1
-                       : 2;  // East Asian letters, of three bytes and more, are wide.
+                       : 2;  // East Asian characters, of three or more bytes, are two columns wide.
     }
     return columns;
 }

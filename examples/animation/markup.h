@@ -1,4 +1,4 @@
-// SVG and HTML: elements, and numbers, paths and characters as they take them.
+// Generates SVG and HTML: elements, numbers, paths and escaped strings.
 //
 //     Path const circle = PathBuilder().circle({0, 0}, 5.0).build();
 //     std::cout << Element("path").set("d", pathData(circle)).markup();
@@ -11,20 +11,20 @@
 #include <string>
 #include <type_traits>
 
-// Six digits, which is what viewers calculate with. SVG has no NaN and no infinity: what is not a
-// number is 0, and what is too large is cut.
+// Six digits, which is what viewers compute with. SVG has no NaN and no infinity: a NaN is 0, and
+// large numbers are clamped.
 std::string number(double value);
 
 std::string point(tarn::engine::FloatVec2 p);
 
-// The text of a `d` attribute, "M 5 0 C 5 2.76 ...", with such numbers.
+// The value of a `d` attribute, "M 5 0 C 5 2.76 ...", with such numbers.
 std::string pathData(tarn::engine::Path path);
 
-// The text as content or as an attribute in quotes of either kind, of SVG or HTML. What may not
-// stand in XML is left out: control characters, and the two last of the first plane.
+// Escapes a string for content and for quoted attributes of SVG or HTML. Characters that XML does
+// not allow are removed: control characters, U+FFFE and U+FFFF.
 std::string escaped(std::string const& text);
 
-// An element with its attributes and its content, in the order in which they are given.
+// An element with its attributes and content, in the order in which they are added.
 //
 //     Element("a").set("href", "#b").text("A & B").markup();  // <a href="#b">A &amp; B</a>
 class Element {
@@ -32,7 +32,7 @@ public:
     explicit Element(std::string const& elementName)
         : name(elementName), start("<" + elementName) {}
 
-    // Values are escaped. Numbers have six digits, integers all of theirs.
+    // Values are escaped. Numbers have six digits, integers all of them.
     Element& set(std::string const& attribute, std::string const& value);
     Element& set(std::string const& attribute, char const* value);
     Element& set(std::string const& attribute, double value);
@@ -40,17 +40,17 @@ public:
     Element& set(std::string const& attribute, Integer value) {
         return set(attribute, std::to_string(value));
     }
-    // The four numbers of a `viewBox`.
+    // Sets `viewBox`.
     Element& setView(double left, double top, double width, double height);
-    // Attributes that are markup already.
+    // Attributes that are already markup.
     Element& setMarkup(std::string const& attributes);
 
-    // Content: a text, which is escaped, and what is markup already.
+    // Content: a string, which is escaped, or markup.
     Element& text(std::string const& content);
     Element& add(std::string const& markup);
     Element& add(Element const& element) { return add(element.markup()); }
 
-    // With an end tag if there is content, be it empty.
+    // Has an end tag if there is content, even empty content.
     std::string markup() const;
 
 private:
@@ -60,7 +60,7 @@ private:
     bool hasContent = false;
 };
 
-// A paragraph on a line of its own.
+// A paragraph and a line end.
 std::string paragraph(std::string const& text);
 
 #endif

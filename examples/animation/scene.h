@@ -1,5 +1,4 @@
-// What a document draws in the frame that was evaluated last: its outputs that are paths, and its
-// layers.
+// The drawing of the latest frame: the outputs that are paths, and the layers.
 //
 //     Scene scene(document, evaluator.root());
 //     for (Drawn const& drawn : scene.now()) std::cout << drawn.name << " " << drawn.data << "\n";
@@ -15,13 +14,13 @@
 #include <string>
 #include <vector>
 
-// One outline.
+// One path.
 struct Drawn {
     std::string name;
     tarn::engine::Path path;
-    // The text of an SVG path's `d`.
+    // The value of an SVG path's `d`.
     std::string data;
-    // A layer is stroked; an output that is a path is filled, and has no stroke.
+    // A layer is stroked; an output that is a path is filled, without a stroke.
     bool isLayer = false;
     // Red, green, blue and opacity.
     tarn::engine::FloatVec4 color;
@@ -30,7 +29,7 @@ struct Drawn {
 
 class Scene {
 public:
-    // Both are used as long as the scene lives.
+    // Both must outlive the scene.
     Scene(Document const& document, tarn::engine::EvalPatch const& root);
 
     // In drawing order, one for each element of a loop.

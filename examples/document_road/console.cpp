@@ -27,7 +27,7 @@ std::string portTitle(Port const& port) {
     return text.str();
 }
 
-// A set of connections has no order: sorted, it is printed alike every time.
+// Sorts a set of connections, so that the output is always the same.
 template <class Connections>
 void writeSorted(std::ostream& stream, Connections const& connections) {
     std::vector<Connection> sorted(connections.begin(), connections.end());

@@ -1,4 +1,4 @@
-// What the program prints, as strings.
+// The program's output as strings.
 //
 //     std::cout << countsText(document) << framesText(document, 3, 1, [](long long) {});
 
@@ -10,18 +10,18 @@
 #include <functional>
 #include <string>
 
-// What a patch (a port) is, where it belongs, and what it is connected to. Empty where no patch
-// (port) has the identifier.
+// Describes a patch (a port), its parent and its connections. Empty where no patch (port) has the
+// identifier.
 std::string patchText(Document const& document, unsigned long long id);
 std::string portText(Document const& document, unsigned long long id);
 
 // One row for each `every`-th of the frames 0 to `frames` - 1, one column for each of the root's
-// outputs, or for each output without a connection where the root has none. `progress` is called
-// before each frame.
+// outputs; where the root has none, for each unconnected output. `progress` is called before each
+// frame.
 std::string framesText(Document const& document, long long frames, long long every,
                        std::function<void(long long frame)> const& progress);
 
-// "frame 0, ring: M 5 0 ...", a line for each outline of each `every`-th frame.
+// "frame 0, ring: M 5 0 ...": one line for each path in each `every`-th frame.
 std::string pathsText(Document const& document, long long frames, long long every);
 
 #endif

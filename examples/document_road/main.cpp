@@ -1,4 +1,4 @@
-// document_road: takes a document through the library: read, printed, asked, animated.
+// document_road: reads a document, prints it, answers questions about it and animates it.
 //
 //     document_road examples/documents/small.json --frames 3
 
@@ -29,7 +29,7 @@ namespace {
 constexpr int kBadInput = 2;
 constexpr int kDiffers = 1;
 
-// A line on standard error that is written over, and only where people watch and wait.
+// A progress line on standard error, which is only shown on a terminal.
 class Progress {
 public:
     explicit Progress(long long frameCount) : frames(frameCount) {}
@@ -54,7 +54,7 @@ private:
     std::chrono::steady_clock::time_point last = std::chrono::steady_clock::now();
 };
 
-// A file whole or not at all; anything else, such as a pipe, is written to as it is.
+// Writes a file completely or not at all; other targets, such as a pipe, are written directly.
 void writeFile(std::string const& name, std::string const& contents) {
     std::error_code error;
     DocumentError problem;
@@ -77,7 +77,7 @@ void refuseToReplace(std::string const& document, std::string const& written) {
     }
 }
 
-// As a word of a shell.
+// Quotes a word for a shell.
 std::string quoted(std::string const& text) {
     std::string result = "'";
     for (char const c : text) result += c == '\'' ? std::string("'\\''") : std::string(1, c);
@@ -148,7 +148,7 @@ private:
     }
 };
 
-// As `diff` ends: 0 for the same, 1 for changes, 2 for trouble.
+// Exit status as of `diff`: 0 for equal documents, 1 for changes, 2 for errors.
 int compare(Options const& options) {
     std::string const& file = options.file;
     std::string const& other = *options.other;
@@ -178,7 +178,7 @@ int compare(Options const& options) {
     return kBadInput;
 }
 
-// What was asked for, whose files are written on the way.
+// Computes the output, and writes the files that were asked for.
 std::string answer(Document const& document, Options const& options) {
     std::ostringstream output;
     output << countsText(document);
@@ -238,7 +238,7 @@ int main(int argc, char** argv) {
         std::string const changes = document.info.summary();
         if (!changes.empty())
             std::cerr << "document_road: " << shownName << ": " << changes << "\n";
-        // All of the output is made before any of it is written.
+        // Computes all of the output before any of it is written.
         std::cout << answer(document, options) << std::flush;
         if (!std::cout) {
             std::cerr << "document_road: the output cannot be written\n";

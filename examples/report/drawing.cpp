@@ -17,7 +17,7 @@ namespace {
 constexpr double kTextIndent = 14.0;
 constexpr std::size_t kLongestAttribute = 200;
 
-// Where the port at this row of a box is; outputs come first.
+// The position of the port in this row of a box; outputs come first.
 double rowMiddle(std::size_t row) {
     return kHeadingHeight + (static_cast<double>(row) + 0.5) * kRowHeight + 2.0;
 }
@@ -51,7 +51,7 @@ void addAttributes(std::vector<std::string>& parts,
     }
 }
 
-// For the page's program.
+// A JSON array for the page's script.
 std::string partsText(std::vector<std::string> const& parts) { return jsonText(Json(parts)); }
 
 }  // namespace

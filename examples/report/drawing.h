@@ -1,4 +1,4 @@
-// Graphs and scenes as SVG.
+// Draws graphs and scenes as SVG.
 //
 //     Drawing drawing(document.root);
 //     std::string const svg = drawing.graph(layOut(document.root).front());
@@ -16,7 +16,7 @@
 #include <string>
 #include <vector>
 
-// A part of the plane, y downwards.
+// A rectangle; y points down.
 struct Bounds {
     double left = 0.0;
     double top = 0.0;
@@ -27,7 +27,7 @@ struct Bounds {
     void add(tarn::engine::Path const& path);
     // The larger of width and height.
     double size() const;
-    // With a margin of `margin` on each side.
+    // Extended by `margin` on each side.
     Bounds widened(double margin) const;
 };
 
@@ -36,15 +36,15 @@ std::string colorText(tarn::engine::FloatVec4 color);
 
 class Drawing {
 public:
-    // Marks the changes, where there are any; they have to outlive the drawing.
+    // Marks the changes, if given; they must outlive the drawing.
     explicit Drawing(tarn::engine::Patch const& root, Marks const* changes = nullptr)
         : index(root), marks(changes) {}
 
-    // One level: boxes with their ports, and the connections between them. `label` names it for
-    // screen readers, where the page has the keys that it can be used with.
+    // Draws one level: boxes with ports, and connections. `label` is the name for screen readers,
+    // where the page supports the keyboard.
     std::string graph(Level const& level, std::string const& label = "") const;
 
-    // What there is to say of a patch or port, in parts: the first is its name.
+    // The description of a patch or port in parts, beginning with its name.
     std::vector<std::string> describe(tarn::engine::Patch const& patch) const;
     std::vector<std::string> describe(tarn::engine::Port const& port, bool isInput) const;
 
@@ -59,10 +59,10 @@ private:
     Marks const* marks;
 };
 
-// The outlines as `path` elements.
+// The drawn paths as `path` elements.
 std::string scenePaths(std::vector<Drawn> const& scene);
 
-// The root's graph and what the document draws in that frame, as a picture that stands by itself.
+// The root's graph and the drawing of that frame as a stand-alone picture.
 std::string pictureText(Document const& document, long long frame);
 
 #endif

@@ -13,7 +13,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// The frames of a page take about so many bytes at most.
+// The approximate limit of all frames of a page, in bytes.
 constexpr std::size_t kMostBytes = 32u << 20;
 constexpr std::size_t kBytesOfAPlace = 16;
 
@@ -22,7 +22,7 @@ struct Component {
     double value;
 };
 
-// What there is to plot of a value; nothing where it has no numbers.
+// The numbers to plot for a value; empty where it has none.
 std::vector<Component> components(Value const& value) {
     switch (value.type()) {
         case Type::Float:
@@ -69,7 +69,7 @@ void addFrame(Plot& plot, Loop const& values, long long frame) {
             hasNumbers = true;
             if (line == plot.lines.size()) {
                 plot.lines.push_back({component.name, color, {}});
-                // It was not there before.
+                // It did not exist in earlier frames.
                 plot.lines.back().values.assign(static_cast<std::size_t>(frame), NAN);
             }
             plot.lines[line++].values.push_back(component.value);

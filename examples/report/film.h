@@ -1,4 +1,4 @@
-// What a page plays of a document: its frames, and the values of its outputs over time.
+// The animation of a page: all frames, and the values of the outputs over time.
 //
 //     Film const film = filmOf(document, 120);
 
@@ -15,7 +15,7 @@
 #include <unordered_map>
 #include <vector>
 
-// Texts that repeat from frame to frame are kept once.
+// Stores each distinct string once.
 class Texts {
 public:
     std::size_t add(std::string const& text) {
@@ -27,7 +27,7 @@ public:
         return place->second;
     }
     std::string const& at(std::size_t place) const { return list[place]; }
-    // Of all of them.
+    // The total size of the strings.
     std::size_t bytes() const { return total; }
     Json json() const { return list; }
 
@@ -48,14 +48,14 @@ struct Plot {
     std::string name;
     tarn::engine::TypeInfo typeInfo;
     std::vector<Line> lines;
-    // Where the output has no numbers: the frames at which it changes.
+    // For outputs without numbers: the frames in which the value changes.
     std::vector<long long> changes;
     tarn::engine::Loop last;
     std::vector<std::size_t> texts;
     std::size_t longestLoop = 1;
 };
 
-// All that is played.
+// The complete animation.
 struct Film {
     Texts texts;
     std::vector<Plot> plots;
@@ -64,12 +64,12 @@ struct Film {
     std::vector<Drawn> first;
 };
 
-// Ends before `frames` where the page would become too large or so much time has passed, but not
-// before the first.
+// Stops before `frames` where the page would become too large or the time is up, but not before the
+// first.
 Film filmOf(Document const& document, long long frames,
             double seconds = std::numeric_limits<double>::infinity());
 
-// The plot of an output that stays as it is shows nothing.
+// Whether the output never changes, so that a plot would show nothing.
 bool isConstant(Plot const& plot);
 
 #endif

@@ -26,8 +26,8 @@ File temporaryFile() {
     return file;
 }
 
-// Waits until the process has ended; one that takes too long is ended. Whether it succeeded, or
-// nothing where it was ended.
+// Waits for the process and kills it after a time limit. Whether it succeeded, or nothing where it
+// was killed.
 std::optional<bool> outcomeInTime(pid_t child) {
     auto const start = std::chrono::steady_clock::now();
     int status = 0;

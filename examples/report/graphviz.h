@@ -1,4 +1,4 @@
-// Graphviz, which finds places for the boxes of a graph.
+// Runs Graphviz, which places the boxes of a graph.
 //
 //     std::optional<std::string> const places = answerOfDot("digraph { 0 [width=1, height=1]; }");
 
@@ -8,8 +8,8 @@
 #include <optional>
 #include <string>
 
-// What `dot -Tplain` answers to the graphs in the text, or nothing where it takes too long. Throws
-// a std::runtime_error where Graphviz is not there or fails.
+// The output of `dot -Tplain` for the graphs in the string, or nothing where it takes too long.
+// Throws a std::runtime_error where Graphviz is missing or fails.
 std::optional<std::string> answerOfDot(std::string const& text);
 
 #endif

@@ -17,7 +17,7 @@ constexpr double kPixelsPerInch = 72.0;
 constexpr double kPadding = 14.0;
 constexpr double kMargin = 12.0;
 constexpr std::size_t kNarrowest = 12;
-// From so many boxes on, a level is placed by a process of its own.
+// With this many boxes, a level gets its own process.
 constexpr std::size_t kMany = 200;
 
 Box sizedBox(Patch const& patch) {
@@ -48,7 +48,7 @@ void addLevels(Patch const& patch, std::vector<Level>& levels) {
     }
 }
 
-// Boxes are named by their position. Lines are not asked for: they are drawn from port to port.
+// Boxes are named by their index. Edges are not requested: they are drawn from port to port.
 void writeDot(std::ostream& stream, Level const& level) {
     stream << "digraph {\n  graph [rankdir=LR, splines=false, nodesep=0.28, ranksep=0.7, "
               "nslimit=2, nslimit1=2, mclimit=0.5, maxiter=100];\n"
@@ -69,7 +69,7 @@ void writeDot(std::ostream& stream, Level const& level) {
     stream << "}\n";
 }
 
-// Reads "graph scale width height", "node name x y ..." from the middle and upwards, up to "stop".
+// Parses "graph scale width height", "node name x y ..." with centres and y upwards, up to "stop".
 void place(Level& level, std::istream& answer) {
     double height = 0.0;
     for (std::string line; std::getline(answer, line) && line != "stop";) {
@@ -94,7 +94,7 @@ void place(Level& level, std::istream& answer) {
     }
 }
 
-// About as wide as high.
+// Places the boxes in rows, about as wide as high.
 void placeInRows(Level& level) {
     level.isInRows = true;
     auto const inRow =

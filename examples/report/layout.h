@@ -1,4 +1,4 @@
-// Where the patches of a graph are drawn: Graphviz places them, level by level.
+// The layout of a graph: Graphviz places the patches, level by level.
 //
 //     std::vector<Level> const levels = layOut(document.root);
 //     Box const& box = levels.front().boxes.front();
@@ -12,7 +12,7 @@
 #include <string>
 #include <vector>
 
-// All lengths are in pixels, downwards.
+// All lengths are in pixels; y points down.
 struct Box {
     tarn::engine::Patch const* patch;
     double x = 0.0;
@@ -28,28 +28,29 @@ struct Level {
     double height = 0.0;
     // The children in order, up to `kMostBoxes`.
     std::vector<Box> boxes;
-    // Graphviz did not come to an end in time: the boxes are in rows, in the order of the document.
+    // Graphviz took too long: the boxes are in rows, in the order of the document.
     bool isInRows = false;
 };
 
-// More take too long to place, and nobody finds anything among them.
+// More would take too long and could not be read.
 constexpr std::size_t kMostBoxes = 2500;
 
-// A patch is drawn as a heading, a row for each output, and a row for each input.
+// A patch is drawn with a heading, a row for each output, and a row for each input.
 constexpr double kHeadingHeight = 26.0;
 constexpr double kRowHeight = 18.0;
-constexpr double kCharacterWidth = 6.65;  // Of the fixed-width face at 11 pixels.
+constexpr double kCharacterWidth = 6.65;  // Of the fixed-width font at 11 pixels.
 constexpr std::size_t kLongestLabel = 32;
 
-// What a patch is called where it is drawn: its name, cut to `kLongestLabel`.
+// The heading of a patch: its name, cut to `kLongestLabel`.
 std::string headingOf(tarn::engine::Patch const& patch);
 // "radius Number".
 std::string labelOf(tarn::engine::Port const& port);
 
-// A level for each patch with children, the root's first, in the order of the document; one, empty,
-// for a root without children. Throws a std::runtime_error where Graphviz is not there or fails.
+// A level for each patch with children, the root's first, in the order of the document; one empty
+// level for a root without children. Throws a std::runtime_error where Graphviz is missing or
+// fails.
 std::vector<Level> layOut(tarn::engine::Patch const& root);
-// The root's level alone.
+// Only the root's level.
 Level layOutOne(tarn::engine::Patch const& root);
 
 #endif

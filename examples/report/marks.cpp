@@ -26,7 +26,7 @@ namespace {
 
 using Removed = std::unordered_map<Patch const*, std::vector<Patch>>;
 
-// The patch with what was removed from it and from those inside it.
+// The patch including what was removed from it and from the patches inside it.
 Patch withRemoved(Patch const& patch, Removed const& removed) {
     Patch result = patch;
     std::vector<Patch> children;
@@ -39,7 +39,7 @@ Patch withRemoved(Patch const& patch, Removed const& removed) {
     return result;
 }
 
-// A removed patch, with those inside it that were removed too.
+// A removed patch with the removed patches inside it.
 Patch removedAlone(Patch const& patch, std::unordered_set<Patch const*> const& removed) {
     Patch result = patch;
     std::vector<Patch> children;
@@ -71,15 +71,15 @@ Marks marksOf(Document const& documentBefore, Document const& documentAfter) {
     Removed removed;
     for (PatchChange const& change : marks.changes) {
         Patch const& patch = change.after != nullptr ? *change.after : *change.before;
-        // The root has no box; and a moved patch may be changed too.
+        // The root has no box. A moved patch may also be changed.
         if (&patch != &after) marks.kinds.emplace(patch.id, kindOfChange(change.kind));
         marks.words[patch.id].push_back(to_string(change));
         marks.added.insert(change.connectionsAdded.begin(), change.connectionsAdded.end());
         if (!change.connectionsRemoved.empty()) marks.removed[patch.id] = change.connectionsRemoved;
-        // Inside of another that was removed it is shown there.
+        // Inside another removed patch it is shown there.
         if (change.after != nullptr || gone.count(change.parentBefore) != 0) continue;
         Patch const* const parent = index.findPatch(change.parentBefore->id);
-        // The index has a root of its own.
+        // The index has its own copy of the root.
         bool const isInRoot = change.parentBefore == &before || parent == &index.root();
         removed[isInRoot ? &after : parent].push_back(removedAlone(*change.before, gone));
     }

@@ -71,7 +71,7 @@ std::string outputsText(Film const& film) {
          {"CONSTANT", constant == 0 ? "" : paragraph("Not shown: " + leftOut + ".")}});
 }
 
-// Nothing in it may look like the end of the element that it stands in.
+// Escapes everything that could end the script element.
 std::string inScript(std::string const& json) {
     std::string text;
     for (char const c : json) text += c == '<' ? std::string("\\u003c") : std::string(1, c);

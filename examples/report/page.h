@@ -12,18 +12,18 @@
 #include <limits>
 #include <string>
 
-// What follows from frames. The sections are HTML, and empty where nothing is drawn or changes over
-// time; `data` is what they play, as JSON.
+// The parts that depend on frames. The sections are HTML, and empty where nothing is drawn or
+// changes; `data` is the animation as JSON.
 struct FilmSections {
     std::string animation;
     std::string outputs;
     std::string data;
 };
-// Ends with the frames that were computed after so many seconds, one at least.
+// Stops computing after this many seconds, but not before the first frame.
 FilmSections filmSections(Document const& document, long long frames,
                           double seconds = std::numeric_limits<double>::infinity());
 
-// What follows from the graph alone, as HTML. `changes` is empty without marks, and `attributes`
+// The parts that depend on the graph only, as HTML. `changes` is empty without marks, `attributes`
 // where there are none.
 struct GraphSections {
     std::string changes;
@@ -32,8 +32,8 @@ struct GraphSections {
 };
 GraphSections graphSections(tarn::engine::Patch const& root, Marks const* marks = nullptr);
 
-// `fileName` is shown as the heading; `frames` are evaluated and played. Where there are `marks`,
-// the changes are listed and marked in the graph.
+// `fileName` is the heading; `frames` is the number of frames to compute. With `marks`, the changes
+// are listed and marked in the graph.
 std::string pageText(Document const& document, std::string const& fileName, long long frames,
                      Marks const* marks = nullptr);
 

@@ -11,7 +11,7 @@ using namespace tarn::engine;
 
 namespace {
 
-// The line through all values, 0 being the top and 100 the bottom; or the steps between them.
+// A line through all values, 0 at the top and 100 at the bottom; or steps between them.
 std::string lineData(std::vector<double> const& values, double least, double most, bool isStepped) {
     std::string data;
     bool isDrawing = false;
@@ -20,7 +20,7 @@ std::string lineData(std::vector<double> const& values, double least, double mos
             isDrawing = false;
             continue;
         }
-        // Halves, since the whole may be more than there is.
+        // Halves, because the range itself may overflow.
         double const range = most / 2 - least / 2;
         double const y = range > 0.0 ? 100.0 - (values[i] / 2 - least / 2) / range * 100.0 : 50.0;
         std::string const frame = std::to_string(i);
@@ -43,7 +43,7 @@ Element headingOf(Plot const& plot) {
     return Element("h3").text(plot.name + " ").add(type);
 }
 
-// The names of the first lines, in their colours.
+// The legend: the names of the first lines in their colours.
 Element keysOf(Plot const& plot) {
     Element keys("p");
     keys.set("class", "keys").text("");

@@ -1,4 +1,4 @@
-// The plots of a page: an output's values over time.
+// Draws the values of an output over time.
 //
 //     std::string const section = plotText(film.plots[0], 0, 120, "0.5");
 
@@ -10,7 +10,7 @@
 #include <cstddef>
 #include <string>
 
-// `position` is the plot's among those of the film; `firstText` is the value in frame 0.
+// `position` is the index of the plot in the film; `firstText` is the value in frame 0.
 std::string plotText(Plot const& plot, std::size_t position, long long frames,
                      std::string const& firstText);
 

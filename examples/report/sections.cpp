@@ -17,11 +17,11 @@ using namespace tarn::engine;
 
 namespace {
 
-// Browsers nest elements no deeper than some hundred levels.
+// Browsers limit nested elements to some hundred levels.
 constexpr int kDeepestTree = 64;
 constexpr int kDeepestLevel = 256;
 
-// The root is in no level: its ports are listed.
+// The root is in no level, so its ports are listed here.
 std::string rootPortsText(Drawing const& drawing, Patch const& root) {
     Element list("ul");
     list.set("class", "ports").add("\n");
@@ -42,7 +42,7 @@ std::string rootPortsText(Drawing const& drawing, Patch const& root) {
     return details.markup() + "\n";
 }
 
-// A list that can be unfolded.
+// A collapsible list.
 std::string foldedList(Element const& summary, std::string const& items) {
     Element const details = Element("details").add(summary).add(Element("ul").add("\n" + items));
     return Element("li").add(details).markup() + "\n";
@@ -80,7 +80,7 @@ std::string attributesOf(std::string const& owner,
         Element("summary").text(owner + " {" + std::to_string(attributes.size()) + "}"), items);
 }
 
-// The values of the attributes `id` that begin with `prefix`.
+// The values of all `id` attributes that begin with `prefix`.
 std::unordered_set<std::string> idsIn(std::string const& markup, std::string const& prefix) {
     std::unordered_set<std::string> ids;
     std::string const start = " id=\"" + prefix;
@@ -130,7 +130,7 @@ std::string levelsText(Patch const& root, Marks const* marks) {
     std::unordered_map<Patch const*, Level const*> levelOf;
     for (Level const& level : levels) levelOf.emplace(level.group, &level);
     Drawing const drawing(root, marks);
-    // A level's figure holds those of the groups in it: closing it closes them.
+    // The figure of a level contains those of its groups: closing it closes them.
     std::function<std::string(Level const&, int)> const figureOf = [&](Level const& level,
                                                                        int depth) {
         Patch const& group = *level.group;

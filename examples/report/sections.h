@@ -11,22 +11,21 @@
 
 #include <string>
 
-// A figure for each level of the graph, each in that of the level around it; with what is marked,
-// where there are `marks`.
+// A figure for each level of the graph, nested like the levels; marked where `marks` are given.
 std::string levelsText(tarn::engine::Patch const& root, Marks const* marks);
 
-// The types of all ports, as the items of a list.
+// The types of all ports as list items.
 std::string legendText(tarn::engine::Patch const& root);
 
-// All easing functions, and a shape of each kind with its elements.
+// All easing functions, and an example of each shape with its elements.
 std::string curvesText();
 std::string shapesText();
 
-// The attributes of all patches and ports, as trees; empty where there are none.
+// The attributes of all patches and ports as trees; empty where there are none.
 std::string attributesText(tarn::engine::Patch const& root);
 
-// The changes, each leading to its patch in `levels` or, where that is not drawn, to the level
-// that it is in. Empty without `marks`.
+// The changes, each with a link to its patch in `levels` or, where that is not drawn, to its level.
+// Empty without `marks`.
 std::string changesText(Marks const* marks, std::string const& levels);
 
 #endif

@@ -1,4 +1,4 @@
-// A page with holes, and what goes into them.
+// Fills in page templates.
 //
 //     fillTemplate("<h1>{{NAME}}</h1>", {{"NAME", "badge"}});  // "<h1>badge</h1>"
 
@@ -8,8 +8,8 @@
 #include <map>
 #include <string>
 
-// The template with its {{NAMES}} filled in; what is from {{#NAME}} to {{/NAME}} stays where that
-// part is not empty.
+// Replaces each {{NAME}}. The part from {{#NAME}} to {{/NAME}} is removed where that value is
+// empty.
 std::string fillTemplate(std::string const& page, std::map<std::string, std::string> const& parts);
 
 #endif
