@@ -1,5 +1,5 @@
-# tarn_make_decimal_comma(FOLDER): a locale with a decimal comma, of this project's own, since a small system has none.
-# Programs find it where LOCPATH names the folder. Nothing happens where there is no localedef.
+# tarn_make_decimal_comma(FOLDER): generates a locale with a decimal comma, because minimal systems have none.
+# Programs find it with LOCPATH=FOLDER. Does nothing without localedef.
 function(tarn_make_decimal_comma folder)
     find_program(TARN_ENGINE_BASE_localedef localedef)
     if(NOT TARN_ENGINE_BASE_localedef OR EXISTS "${folder}/de_DE.UTF-8")

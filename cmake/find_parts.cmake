@@ -1,7 +1,7 @@
-# Finds what the tests, the examples and the Python module need. A part that is asked for (ON) fails without it; a part that
-# is AUTO is then left out, with a line that says for want of what.
+# Finds the dependencies of tests, examples and the Python module. A part that is ON fails without them; a part that
+# is AUTO is left out, with a message that names what is missing.
 
-# tarn_find_part(PART PACKAGES ... PROGRAMS ...): afterwards TARN_ENGINE_BASE_BUILD_<PART> is true or OFF.
+# tarn_find_part(PART PACKAGES ... PROGRAMS ...): sets TARN_ENGINE_BASE_BUILD_<PART> to true or OFF.
 function(tarn_find_part part)
     cmake_parse_arguments(PARSE_ARGV 1 needed "" "" "PACKAGES;PROGRAMS")
     set(option TARN_ENGINE_BASE_BUILD_${part})
@@ -33,9 +33,9 @@ function(tarn_find_part part)
     string(TOLOWER "${part}" name)
     string(REPLACE ";" " " missing "${missing}")
     if(how STREQUAL "REQUIRED")
-        message(FATAL_ERROR "Missing for the part ${name}: ${missing}")
+        message(FATAL_ERROR "${name}: missing ${missing}")
     endif()
-    message(STATUS "Left out for want of ${missing}: ${name}")
+    message(STATUS "${name} left out, missing: ${missing}")
     set(${option} OFF PARENT_SCOPE)
 endfunction()
 
@@ -48,7 +48,7 @@ if(TARN_ENGINE_BASE_BUILD_PYTHON)
     find_package(pybind11 2.10 REQUIRED)
 endif()
 
-# Debian's GoogleTest is compiled for this machine and g++'s library; for others it has the sources.
+# Debian's GoogleTest library is built for this machine with libstdc++; for other targets its sources are compiled.
 set(TARN_TESTS_GTEST_SOURCE "" CACHE PATH "The sources of GoogleTest, or nothing for the installed one")
 set(packages Threads)
 if(NOT TARN_TESTS_GTEST_SOURCE)

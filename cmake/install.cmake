@@ -1,5 +1,4 @@
-# What `cmake --install` puts where. The library and its development files are two components, and two
-# Debian packages.
+# Installation rules. The library and its development files are two components, and two Debian packages.
 
 include(CMakePackageConfigHelpers)
 include(GNUInstallDirs)
@@ -7,7 +6,7 @@ include(GNUInstallDirs)
 set(cmake_dir "${CMAKE_INSTALL_LIBDIR}/cmake/${PROJECT_NAME}")
 set(pkgconfig_dir "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
 
-# The library, its headers and its pkg-config file. Headers beneath detail/ are its own.
+# The library, its headers and its pkg-config file. Headers in detail/ are private.
 function(tarn_install_library library folder component)
     install(TARGETS ${library}
         EXPORT TarnEngineBaseTargets
@@ -25,7 +24,7 @@ function(tarn_install_library library folder component)
         DESTINATION "${pkgconfig_dir}" COMPONENT development)
 endfunction()
 
-# Relative to its own place, so that a tree that was moved still works.
+# Relative to its own location, so that the installed tree can be moved.
 file(RELATIVE_PATH TARN_ENGINE_BASE_PREFIX_FROM_PC "/${pkgconfig_dir}" "/")
 string(REGEX REPLACE "/$" "" TARN_ENGINE_BASE_PREFIX_FROM_PC "${TARN_ENGINE_BASE_PREFIX_FROM_PC}")
 set(TARN_ENGINE_BASE_PC_DEFINITIONS "")
@@ -40,7 +39,7 @@ if(TARN_ENGINE_BASE_BUILD_DOCUMENT)
 endif()
 install(EXPORT TarnEngineBaseTargets
     NAMESPACE tarn:: DESTINATION "${cmake_dir}" COMPONENT development)
-# For projects that export their own build tree, with the library in it.
+# For projects that export their build tree, with the library in it.
 export(EXPORT TarnEngineBaseTargets
     NAMESPACE tarn:: FILE "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseTargets.cmake")
 
@@ -58,7 +57,7 @@ install(FILES
     "${CMAKE_CURRENT_BINARY_DIR}/TarnEngineBaseConfigVersion.cmake"
     DESTINATION "${cmake_dir}" COMPONENT development)
 
-# gdb loads a script by the full name of the library, beneath its auto-load folder.
+# gdb loads a script by the full name of the library, from its auto-load folder.
 if(UNIX AND library_type STREQUAL SHARED)
     install(FILES tools/gdb/tarn_engine_base.py
         DESTINATION "${CMAKE_INSTALL_DATADIR}/gdb/auto-load${CMAKE_INSTALL_FULL_LIBDIR}"

@@ -1,7 +1,7 @@
-# tarn_add_library(NAME EXPORTS): what the project's libraries have in common. Their sources come afterwards.
-# NAME is "engine_base" for libtarn_engine_base, EXPORTS the linker's list of what it shows.
+# tarn_add_library(NAME EXPORTS): declares a library; its sources are added afterwards. NAME is "engine_base" for
+# libtarn_engine_base, EXPORTS is the linker's version script.
 
-# Shared unless BUILD_SHARED_LIBS says otherwise.
+# Shared unless BUILD_SHARED_LIBS is OFF.
 set(library_type SHARED)
 if(DEFINED BUILD_SHARED_LIBS AND NOT BUILD_SHARED_LIBS)
     set(library_type STATIC)
@@ -17,10 +17,10 @@ function(tarn_add_library name exports)
         SOVERSION ${PROJECT_VERSION_MAJOR}
         EXPORT_NAME ${name}
         CXX_VISIBILITY_PRESET hidden)
-    if(NOT EMSCRIPTEN)  # A static library may become a part of somebody's shared one.
+    if(NOT EMSCRIPTEN)  # A static library may be linked into a shared one.
         set_target_properties(${library} PROPERTIES POSITION_INDEPENDENT_CODE ON)
     endif()
-    if(NOT WIN32)  # There it would take inline functions out of the DLL.
+    if(NOT WIN32)  # There it would remove inline functions from the DLL.
         set_target_properties(${library} PROPERTIES VISIBILITY_INLINES_HIDDEN ON)
     endif()
     target_compile_features(${library} PUBLIC cxx_std_17)
@@ -30,23 +30,23 @@ function(tarn_add_library name exports)
     endif()
     target_include_directories(${library} PUBLIC "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}>")
     if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
-        # A fused multiplication rounds once where the formulas round twice.
+        # A fused multiply-add rounds once, the formulas twice.
         target_compile_options(${library} PRIVATE -ffp-contract=off)
         if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(i.86|x86_64|AMD64)$" AND CMAKE_SIZEOF_VOID_P EQUAL 4)
-            # The older unit computes with more bits than a double has.
+            # The x87 FPU computes with more bits than a double has.
             target_compile_options(${library} PRIVATE -msse2 -mfpmath=sse)
         endif()
     endif()
     if(UNIX AND NOT APPLE AND NOT EMSCRIPTEN)
-        # Calls inside the library and to the C library go where they go, without a detour.
+        # Calls are direct, without the procedure linkage table.
         target_compile_options(${library} PRIVATE -fno-semantic-interposition -fno-plt)
-        # What the standard library's templates leave behind is visible unless the linker is told.
+        # Instantiated templates of the standard library are visible unless the linker hides them.
         target_link_options(${library} PRIVATE "LINKER:--version-script=${exports}"
             LINKER:-Bsymbolic-functions LINKER:-z,now)
         set_property(TARGET ${library} APPEND PROPERTY LINK_DEPENDS "${exports}")
     endif()
     if(TARN_ENGINE_BASE_TOP)
-        # Taken over and not linked: what a static library links is exported with it.
+        # Compiled in, not linked: a static library's dependencies would be exported with it.
         target_compile_options(${library} PRIVATE
             $<TARGET_PROPERTY:tarn_warnings,INTERFACE_COMPILE_OPTIONS>)
     endif()

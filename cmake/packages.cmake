@@ -1,5 +1,5 @@
-# Debian packages, by `cpack -G DEB`: the libraries, what is needed to build with them, their debug symbols, and the
-# Python module.
+# Debian packages, by `cpack -G DEB`: the libraries, their development files, their debug symbols, and the Python
+# module.
 
 set(CPACK_PACKAGE_NAME tarn-engine-base)
 set(CPACK_PACKAGE_VENDOR "Tarn")
@@ -50,7 +50,7 @@ set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
 set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION
     "${about}\nThis package has the headers, CMake and pkg-config files, and debuggers' views.")
 
-# For the one version of Python that the module is compiled for.
+# For the Python version that the module is compiled for.
 if(TARN_ENGINE_BASE_BUILD_PYTHON)
     math(EXPR next_minor "${Python_VERSION_MINOR} + 1")
     set(python_version "${Python_VERSION_MAJOR}.${Python_VERSION_MINOR}")
@@ -63,14 +63,14 @@ python3 (<< ${Python_VERSION_MAJOR}.${next_minor}), python3-numpy")
     set(CPACK_COMPONENT_PYTHON_DESCRIPTION "${about}\nThis package has the Python module tarn_engine_base.")
 endif()
 
-# Which package a program needs that was linked with the library, and that its cache has to know it.
+# The dependency of programs that link with the library, and the trigger for ldconfig.
 set(control "${CMAKE_CURRENT_BINARY_DIR}/debian-control")
 file(WRITE "${control}/base/shlibs"
     "libtarn_engine_base ${PROJECT_VERSION_MAJOR} ${runtime_package} (>= ${PROJECT_VERSION})\n")
 file(WRITE "${control}/document/shlibs"
     "libtarn_engine_document ${PROJECT_VERSION_MAJOR} ${document_package} (>= ${PROJECT_VERSION})\n")
 file(WRITE "${control}/triggers" "activate-noawait ldconfig\n")
-# The files that Python writes beside a package are made when it is installed, and go with it.
+# Python's byte code is compiled when the package is installed, and removed with it.
 foreach(script postinst:py3compile prerm:py3clean)
     string(REPLACE ":" ";" script "${script}")
     list(GET script 0 name)
@@ -87,7 +87,7 @@ set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 set(CPACK_DEBIAN_DOCUMENT_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 set(CPACK_DEBIAN_PYTHON_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 
-# Each package has its licence and its changelog, as Debian wants them.
+# Each package contains its licence and changelog, as Debian requires.
 string(TIMESTAMP date "%a, %d %b %Y %H:%M:%S +0000" UTC)
 string(TIMESTAMP year "%Y" UTC)
 find_program(GZIP gzip)

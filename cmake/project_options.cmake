@@ -1,10 +1,10 @@
-# What holds when this project is built for itself: never for those who use it as a dependency.
+# Options for building this project itself: never used when it is a dependency.
 
 if(NOT CMAKE_BUILD_TYPE AND NOT CMAKE_CONFIGURATION_TYPES)
     set(CMAKE_BUILD_TYPE Release CACHE STRING "Debug, Release, RelWithDebInfo or MinSizeRel" FORCE)
 endif()
 set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
-# Indices and the like are checked in debug builds.
+# Debug builds check indices in containers.
 add_compile_definitions($<$<CONFIG:Debug>:_GLIBCXX_ASSERTIONS>)
 if(NOT DEFINED CMAKE_CXX_STANDARD)
     set(CMAKE_CXX_STANDARD 17)
@@ -19,7 +19,7 @@ if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
         target_compile_options(tarn_warnings INTERFACE -Werror)
     endif()
     if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
-        # From C++20 on, g++ 12 sees an overlap in "text" + std::string that is not there.
+        # From C++20 on, g++ 12 wrongly warns of an overlap in "text" + std::string.
         target_compile_options(tarn_warnings INTERFACE -Wno-restrict)
     endif()
 endif()

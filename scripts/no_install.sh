@@ -1,5 +1,5 @@
-# Sourced by the scripts that install packages: takes --no-install out of their arguments. Then what is missing is named, and the
-# script ends.
+# Sourced by scripts that install packages: removes --no-install from their arguments. With that option, missing
+# packages are printed and the script fails.
 for argument in "$@"; do
     shift
     if [ "$argument" = --no-install ]; then

@@ -1,6 +1,6 @@
-"""Shows the values, data, graphs and paths of Tarn Engine Base in gdb.
+"""Pretty-prints the values, unstructured data, graphs and paths of Tarn Engine Base in gdb.
 
-gdb loads this file by itself beside an installed library. By hand:
+gdb loads this file automatically for an installed library. Manually:
 
     (gdb) source tarn_engine_base.py
 """
@@ -10,14 +10,14 @@ import gdb.printing
 
 TYPES = ["float", "vec2", "vec3", "vec4", "mat4", "boolean", "int", "image", "video", "sound", "path",
          "string", "model", "unstructured"]
-# The alternatives of a value, in the order in which its union has them.
+# The alternatives of a value, in the order of its variant.
 VALUE_KINDS = ["int", "float", "vec2", "vec3", "vec4", "mat4", "boolean", "image", "video", "sound", "model",
                "path", "unstructured", "string"]
 INSTRUCTIONS = ["moveTo", "lineTo", "curveTo", "quadCurveTo", "close"]
 DATA_KINDS = ["null", "map", "array", "float", "integer", "unsigned", "string"]
 
 
-# Containers of libstdc++, read without its own printers, which may not be there.
+# Containers of libstdc++, read without its printers, which may be missing.
 
 def text_of(string):
     data = string["_M_dataplus"]["_M_p"]
@@ -59,14 +59,14 @@ def entries_of(tree):
 
 
 def pointee(shared):
-    """What a shared pointer points to, or None."""
+    """The object that a shared pointer points to, or None."""
     pointer = shared["_M_ptr"]
     return pointer.dereference() if pointer else None
 
 
 STRING = "std::__cxx11::basic_string<char, std::char_traits<char>, std::allocator<char> >"
-# gdb does not know the arguments of a union with any number of them: what each alternative is. Payloads
-# begin with the pointer to what they share, and nodes with their content.
+# gdb does not know the arguments of variadic variants, so the alternatives are listed here. Payloads begin with the
+# shared pointer, nodes with their content.
 VALUE_CONTENT = {
     "int": "long long", "float": "double", "boolean": "bool", "vec2": "tarn::engine::FloatVec2",
     "vec3": "tarn::engine::FloatVec3", "vec4": "tarn::engine::FloatVec4",
@@ -80,7 +80,7 @@ BY_POINTER = ("mat4", "path", "unstructured", "string", "map", "array")
 
 
 def held(union, kinds, types):
-    """The kind of a Boost.Variant's alternative, and its content, None for null."""
+    """The index of a Boost.Variant's alternative and its content, None for null."""
     which = int(union["which_"])
     kind = kinds[which if which >= 0 else ~which]
     if kind not in types:
@@ -288,7 +288,7 @@ class PatchPrinter(Printer):
 
 class IndexPrinter(Printer):
     def root(self):
-        """None for one that was moved from, or where the library has no symbols."""
+        """The root, or None for a moved-from index or a library without debug symbols."""
         if has_field(self.value, "shared"):
             return pointee(self.value["shared"])
         tables = pointee(self.value["tables"])

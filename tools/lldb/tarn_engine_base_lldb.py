@@ -1,4 +1,4 @@
-"""Shows the values, data, graphs and paths of Tarn Engine Base in lldb:
+"""Pretty-prints the values, unstructured data, graphs and paths of Tarn Engine Base in lldb:
 
     (lldb) command script import tarn_engine_base_lldb.py
 """
@@ -7,7 +7,7 @@ import lldb
 
 TYPES = ["float", "vec2", "vec3", "vec4", "mat4", "boolean", "int", "image", "video", "sound", "path",
          "string", "model", "unstructured"]
-# The alternatives of a value, in the order in which its union has them.
+# The alternatives of a value, in the order of its variant.
 VALUE_KINDS = ["int", "float", "vec2", "vec3", "vec4", "mat4", "boolean", "image", "video", "sound", "model",
                "path", "unstructured", "string"]
 INSTRUCTIONS = ["moveTo", "lineTo", "curveTo", "quadCurveTo", "close"]
@@ -21,7 +21,7 @@ BASIC = {"int": lldb.eBasicTypeLongLong, "integer": lldb.eBasicTypeLongLong, "fl
 BY_POINTER = ("mat4", "path", "unstructured", "string", "map", "array")
 
 
-# Containers of libstdc++, read without lldb's own views of them.
+# Containers of libstdc++, read without lldb's formatters.
 
 def member(value, *names):
     value = value.GetNonSyntheticValue()
@@ -65,7 +65,7 @@ def entries_of(tree):
     kind = record(tree, "Unstructured")
     key = string_type(tree)
 
-    def link(node, i):  # Behind the colour: parent, left, right.
+    def link(node, i):  # After the colour: parent, left, right.
         return tree.GetProcess().ReadPointerFromMemory(node + (1 + i) * pointer, lldb.SBError())
 
     found = []
@@ -104,8 +104,8 @@ def pointee(value, shared):
 
 
 def held(value, kinds):
-    """The kind of a Boost.Variant's alternative, and its content, None for null. Payloads begin with
-    the pointer to what they share, and nodes with their content."""
+    """The index of a Boost.Variant's alternative and its content, None for null. Payloads begin with
+    the shared pointer, nodes with their content."""
     union = member(value, "storage")
     which = member(union, "which_").GetValueAsSigned()
     kind = kinds[which if which >= 0 else ~which]
@@ -207,7 +207,7 @@ def type_info_text(value):
 def points_text(value):
     kind = record(value, "FloatVec2")
     held = member(value, "held")
-    # Some versions take the array of those in place for one of no elements.
+    # Some versions show an array of inline elements as empty.
     in_place = held.GetByteSize() // kind.GetByteSize()
     is_many = member(value, "room").GetValueAsUnsigned() > in_place
     start = member(held, "many").GetValueAsUnsigned() if is_many else held.GetLoadAddress()
@@ -250,11 +250,11 @@ def patch_text(value):
 
 
 def index_root(value):
-    """The root of an index, None for one that was moved from or whose library has no symbols."""
+    """The root of an index, None for a moved-from index or a library without debug symbols."""
     shared = member(value, "shared")
     if shared.IsValid():
         return pointee(value, shared)
-    tables = record(value, "detail::PatchTables")  # The library's own, and in its symbols alone.
+    tables = record(value, "detail::PatchTables")  # Private to the library, so only in its symbols.
     address = member(value, "tables", "_M_ptr").GetValueAsUnsigned()
     return member(at(value, "tables", address, tables), "root") if address and tables.IsValid() else None
 
