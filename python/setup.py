@@ -1,4 +1,4 @@
-"""Makes a wheel: CMake compiles the module, with both libraries inside it.
+"""Builds a wheel: CMake compiles the module together with both libraries.
 
     python3 -m build --wheel python
 

@@ -1,16 +1,16 @@
-/** Identifiers and other integers of 64 bits; numbers where they are whole and exact. */
+/** 64-bit integers, such as identifiers: a bigint, or a number that is integral and exact. */
 export type Integer = bigint | number;
-/** Some numbers. */
+/** A list of numbers. */
 export type Numbers =
   | readonly number[] | Float64Array | Float32Array | Int8Array | Int16Array | Int32Array | Uint8Array | Uint8ClampedArray
   | Uint16Array | Uint32Array;
 /** [x, y] or {x, y}. */
 export type Point = Numbers | { readonly x: number; readonly y: number };
-/** What data is made from: also typed arrays, plain objects and Maps of such. */
+/** Types that convert to `Unstructured`, also typed arrays, plain objects and Maps of such. */
 export type Data = undefined | null | number | bigint | boolean | string | readonly Data[] | object;
-/** What a value is made from: of an array 2, 3, 4 or 16 numbers, of other plain objects data. */
+/** Types that convert to `Value`: arrays of 2, 3, 4 or 16 numbers; other plain objects become unstructured data. */
 export type ValueLike = number | bigint | boolean | string | Numbers | object;
-/** What curves ease; both ends are of one type. */
+/** Types that can be eased; both ends have the same type. */
 export type Eased = number | bigint | Numbers | Value;
 
 export declare const Type: {
@@ -30,7 +30,7 @@ export declare const UnstructuredType: {
 };
 export type UnstructuredType = (typeof UnstructuredType)[keyof typeof UnstructuredType];
 
-/** JSON-like data. Never changes. */
+/** JSON-like data. Immutable. */
 export declare class Unstructured {
   constructor(data?: Data);
   static identifier(id: Integer): Unstructured;
@@ -59,7 +59,7 @@ export declare class Unstructured {
   equals(other: Unstructured): boolean;
 }
 
-/** One value of one of the fourteen types. Never changes. */
+/** A value of one of the fourteen types. Immutable. */
 export declare class Value {
   constructor(content?: ValueLike);
   static Image(id: Integer): Value;
@@ -105,7 +105,7 @@ export interface PathElement {
   readonly instruction: PathInstruction;
   readonly points: readonly (readonly [number, number])[];
 }
-/** A vector path. Never changes. */
+/** A vector path. Immutable. */
 export declare class Path {
   constructor(elements?: Iterable<{ readonly instruction: PathInstruction; readonly points?: readonly Point[] }>);
   readonly length: number;
@@ -114,14 +114,14 @@ export declare class Path {
   toString(): string;
 }
 export declare function svgPathData(path: Path): string;
-/** Throws a SyntaxError that says from which byte on the text is none. */
+/** Throws a SyntaxError with the position of the first invalid byte. */
 export declare function pathFromSvgPathData(data: string): Path;
 export declare function bounds(path: Path): { min: [number, number]; max: [number, number] } | null;
 export declare function translated(path: Path, offset: Point): Path;
 export declare function scaled(path: Path, factors: Point): Path;
 export declare function interpolate(a: Path, b: Path, t: number): Path | null;
 export declare class PathBuilder {
-  /** Linear in what was drawn since it was last asked for. */
+  /** Linear in what was drawn since the last call. */
   readonly currentPoint: readonly [number, number];
   moveTo(p: Point): this;
   lineTo(p: Point): this;
@@ -151,7 +151,7 @@ export declare function ease(easingFunction: EasingFunction, start: bigint, end:
 export declare function ease(easingFunction: EasingFunction, start: Numbers, end: Numbers, t: number): Float64Array;
 export declare function ease(easingFunction: EasingFunction, start: Value, end: Eased, t: number): Value;
 export declare function ease(easingFunction: EasingFunction, start: Eased, end: Value, t: number): Value;
-/** For every progress; of vectors the components, one point after another. */
+/** One result per progress; vectors as their components, point after point. */
 export declare function ease(
   easingFunction: EasingFunction, start: number | Numbers, end: number | Numbers, t: Numbers): Float64Array;
 export declare function ease(
@@ -182,7 +182,7 @@ export interface NewPort {
   readonly tag?: Integer;
   readonly name?: string;
   readonly typeInfo?: TypeInfo;
-  /** That of the type unless it is given. */
+  /** By default that of the type. */
   readonly defaultValue?: ValueLike;
   readonly attributes?: object;
 }
@@ -205,7 +205,7 @@ export interface NewPatch {
   readonly children?: readonly (NewPatch | Patch)[];
 }
 
-/** A graph, or a patch of one. Never changes. `free` lets go of the whole graph at once, ahead of the garbage collector. */
+/** A graph, or a patch of one. Immutable. `free` releases the whole graph at once instead of by garbage collection. */
 export declare class Patch {
   constructor(fields?: NewPatch);
   readonly id: bigint;
@@ -241,7 +241,7 @@ export declare class PatchIndex {
   free(): void;
 }
 
-/** A patch as it will be: what is assigned changes the edit. */
+/** A patch in an edit: assigning to its properties changes the edit. */
 export interface PatchInEdit {
   readonly id: bigint;
   get builtin(): bigint;
@@ -312,7 +312,7 @@ export interface DocumentInfo {
   readonly notes: readonly string[];
   readonly summary: string;
 }
-/** Throw a DocumentError for what is no document. */
+/** Throws a DocumentError for an invalid document. */
 export declare function readDocument(text: string | Uint8Array): Patch;
 export declare function readDocumentWithInfo(text: string | Uint8Array): { root: Patch; info: DocumentInfo };
 export declare function writeDocument(root: Patch, framesPerSecond?: number): string;
@@ -323,12 +323,12 @@ export interface Drawn {
   readonly name: string;
   readonly path: Path;
   readonly svgPathData: string;
-  /** A layer is stroked, with the colour and the width; an output that is a path is filled. */
+  /** A layer is stroked with the colour and the width; an output that is a path is filled. */
   readonly isLayer: boolean;
   readonly color: Float64Array;
   readonly width: number;
 }
-/** What a document computes and draws, frame by frame. */
+/** Evaluates a document and its drawing, frame by frame. */
 export declare class Evaluator {
   constructor(root: Patch, framesPerSecond?: number);
   evaluate(frame: number): this;

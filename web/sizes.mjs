@@ -1,5 +1,5 @@
-// How large the module in a folder is, as it is and compressed as servers do. Ends with 1 where it is larger than what is
-// promised.
+// Prints the size of the module in a folder, uncompressed and compressed as web servers do. Exits
+// with 1 where it exceeds the limit.
 //
 //     node web/sizes.mjs build/web
 

@@ -1,4 +1,4 @@
-"""Measures the module beside the C++ library, beside the curve as a NumPy formula, and beside Python itself.
+"""Compares the module's speed with the C++ library, with NumPy formulas, and with plain Python.
 
     scripts/python --bench
 
@@ -27,7 +27,7 @@ def seconds(work: Callable[[], object]) -> float:
 
 
 def graph() -> tarn.Patch:
-    """Patches in groups of a hundred, each connected to the one before."""
+    """Patches in groups of a hundred, each connected to the previous one."""
     groups = []
     for group in range(PATCHES // 100):
         children: list[tarn.Patch] = []
@@ -43,7 +43,7 @@ def graph() -> tarn.Patch:
 
 
 def read_and_find(file: Path) -> int:
-    """How many inputs a connection leads to."""
+    """The number of connected inputs."""
     index = tarn.PatchIndex(tarn.load_document(file))
     found = 0
     pending = [index.root]
@@ -60,7 +60,7 @@ def cubic_in_out(t: np.ndarray) -> np.ndarray:
 
 
 class Cpp:
-    """The program that does the same in C++."""
+    """The C++ program for the same operations."""
 
     def __init__(self, program: str) -> None:
         self.process = subprocess.Popen([program], stdin=subprocess.PIPE, stdout=subprocess.PIPE, text=True)

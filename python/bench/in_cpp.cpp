@@ -1,5 +1,5 @@
-// The C++ side of bench.py: does what a line of the input asks for once, and prints the seconds
-// that it took.
+// The C++ side of bench.py: runs the operation in each line of the input once, and prints its
+// seconds.
 //
 //     ease CURVE VALUES        read FILE
 
@@ -27,7 +27,7 @@ double ease(EasingFunction function, std::size_t count) {
         progress[i] = static_cast<double>(i) / static_cast<double>(count - 1);
     }
     auto const start = std::chrono::steady_clock::now();
-    // New memory, as an array of results is.
+    // Uninitialised memory, like a new array of results.
     std::unique_ptr<double[]> const results(new double[count]);
     easeEach(function, 10.0, 20.0, progress.data(), count, results.get());
     auto const end = std::chrono::steady_clock::now();
@@ -56,7 +56,7 @@ double read(std::string const& file) {
 }  // namespace
 
 int main() {
-    // With one thread alone, shared pointers would be counted without atomic operations.
+    // With a single thread, shared pointers would be counted without atomic operations.
     std::thread other([] {
         for (;;) std::this_thread::sleep_for(std::chrono::hours(1));
     });

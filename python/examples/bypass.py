@@ -1,4 +1,4 @@
-"""Takes every patch of a kind out of a document: what led to one of its inputs leads on to where its output led.
+"""Removes every patch of a kind from a document and connects the sources of its inputs to the targets of its output.
 
     python3 bypass.py DOCUMENT KIND TAG [RESULT]
     python3 bypass.py examples/documents/animation.json choose 3

@@ -11,7 +11,7 @@ import tarn_engine_base as tarn
 
 
 def patches(root: tarn.Patch) -> Iterator[tarn.Patch]:
-    """The patch and all that are inside it. A list instead of calls: documents may be deep."""
+    """The patch and all patches inside it. Not recursive: documents may be deep."""
     pending = [root]
     while pending:
         patch = pending.pop()

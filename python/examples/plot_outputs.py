@@ -1,4 +1,4 @@
-"""Plots the numbers that an animation gives over time, into a picture.
+"""Plots the outputs of an animation over time, as a picture.
 
     python3 plot_outputs.py DOCUMENT PICTURE [FRAMES]
 
@@ -24,7 +24,7 @@ Frames = npt.NDArray[np.floating[Any]]
 
 
 class Animation:
-    """Computes each output once, when it is asked for."""
+    """Computes each output once, on demand."""
 
     def __init__(self, root: tarn.Patch, seconds: Frames, frames: Frames) -> None:
         self.index = tarn.PatchIndex(root)
@@ -41,7 +41,7 @@ class Animation:
         return self.known[port.id]
 
     def input(self, patch: tarn.Patch | None, tag: int) -> Frames | None:
-        """What arrives at an input port: what an output sends there, or its default value."""
+        """The value of an input port: that of the connected output, or its default value."""
         port = tarn.in_port_for_tag(patch, tag) if patch is not None else None
         if port is None:
             return None

@@ -1,4 +1,4 @@
-// python/src/casters.h: the enumerations that functions of the module take and give.
+// python/src/casters.h: casters for the enumerations in function signatures.
 
 #ifndef TARN_PYTHON_CASTERS_H
 #define TARN_PYTHON_CASTERS_H

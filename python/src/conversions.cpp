@@ -58,7 +58,7 @@ bool isNumber(py::handle object) {
     if (PyFloat_Check(object.ptr()) || PyLong_Check(object.ptr())) return true;
     if (isArray(object)) return false;
     if (isInteger(object)) return true;
-    // What NumPy has for a single real number.
+    // NumPy's scalar types of real numbers.
     return py::hasattr(object, "dtype") && !py::hasattr(object, "__len__") &&
            toString(py::str(object.attr("dtype").attr("kind"))) == "f";
 }
@@ -98,7 +98,7 @@ Optional<std::vector<double>> ifVector(py::handle object) {
     py::ssize_t const size = PySequence_Size(object.ptr());
     if (size < 0) throw py::error_already_set();
     if (size < 2 || size > 4) return {};
-    // A copy: what converts an element may change the list.
+    // A copy: converting an element may change the list.
     py::tuple const elements = copiedTuple(object);
     if (elements.size() < 2 || elements.size() > 4) return {};
     std::vector<double> numbers;
@@ -202,7 +202,7 @@ Value toValue(py::handle object) {
         return isInteger(object) ? Value(toInteger(object)) : Value(toDouble(object));
     if (py::isinstance<py::str>(object)) return Value(toString(object));
     if (py::isinstance<Path>(object)) {
-        object.cast<Path const&>();  // Throws for a path that was never initialised.
+        object.cast<Path const&>();  // Throws for a path whose `__init__` was not called.
         return Value(std::shared_ptr<Path const>(object.cast<std::shared_ptr<Path>>()));
     }
     if (py::isinstance<Unstructured>(object)) return Value(object.cast<Unstructured const&>());

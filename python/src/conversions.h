@@ -1,4 +1,4 @@
-// python/src/conversions.h: what Python's objects become here, and the other way round.
+// python/src/conversions.h: converts between Python objects and the library's types.
 //
 //     Value value = toValue(object);
 //     py::object data = fromData(value.asUnstructured());
@@ -29,42 +29,42 @@ namespace py = pybind11;
 /// The name of the object's type, for messages.
 std::string nameOfType(py::handle object);
 
-/// Strings are UTF-8. Bytes that are none are lone surrogates in Python, as in the names of files.
-/// Throws TypeError for what is neither a str nor bytes.
+/// Strings are UTF-8. Invalid bytes are lone surrogates in Python, as in file names. Throws
+/// TypeError for objects that are neither str nor bytes.
 std::string toString(py::handle object);
 py::str fromString(std::string const& text);
 
-/// What an object is. Strings are no sequences here; arrays are.
+/// The kind of an object. Strings do not count as sequences; arrays do.
 bool isArray(py::handle object);
 bool isMapping(py::handle object);
 bool isSequence(py::handle object);
 bool isInteger(py::handle object);
-/// A real number, Python's or NumPy's.
+/// A real number, of Python or NumPy.
 bool isNumber(py::handle object);
 tarn::engine::Optional<bool> ifBool(py::handle object);
 
-/// Copies, which stay as they are while the elements are converted: that may run any program.
+/// Copies, since converting the elements may run any code.
 py::tuple copiedTuple(py::handle sequence);
 py::dict copiedDict(py::handle mapping);
 
-/// As `int`, exactly; as an identifier; as `float`. Throw TypeError for what is no integer, no
-/// number, and OverflowError for what is no identifier.
+/// Converts to an exact integer, an identifier or a float. Throws TypeError for other types, and
+/// OverflowError for integers out of range.
 py::object toIndex(py::handle object);
 unsigned long long toUnsigned(py::handle object);
 double toDouble(py::handle object);
 
-/// The class `Unsigned`: an `int` that stands for the unsigned integers of data.
+/// The class `Unsigned`: an `int` that represents the unsigned integers of unstructured data.
 void defineUnsigned(py::module_& module);
 
-/// Data from `None`, numbers, strings, sequences and mappings, of any depth. Throws a Python
-/// exception for integers beyond 64 bits, for data that contains itself, and for anything else.
+/// Converts `None`, numbers, strings, sequences and mappings of any depth. Throws a Python
+/// exception for integers beyond 64 bits, for data that contains itself, and for other types.
 tarn::engine::Unstructured toData(py::handle object);
 py::object fromData(tarn::engine::Unstructured const& data);
 
-/// What `eval` reads back: there is no literal for floats that are not finite.
+/// An expression for `eval`: non-finite floats have no literal.
 std::string reprOf(py::handle object);
 
-/// Two, three or four numbers in a sequence; else nothing.
+/// Two, three or four numbers in a sequence; otherwise empty.
 tarn::engine::Optional<std::vector<double>> ifVector(py::handle object);
 /// Throws TypeError for anything but two numbers.
 tarn::engine::FloatVec2 toVec2(py::handle object);
@@ -74,14 +74,14 @@ py::tuple fromVector(tarn::engine::FloatVec4 const& v);
 /// An array of four rows.
 py::array_t<double> fromMatrix(tarn::engine::FloatMat4 const& matrix);
 
-/// What `Value(object)` makes in Python: a value of the object's own type.
+/// What `Value(object)` makes in Python: a value of the corresponding type.
 tarn::engine::Value toValue(py::handle object);
-/// The object that `toValue` makes an equal value of; none for a resource.
+/// The object that `toValue` converts to an equal value; none for a resource.
 py::object payloadOf(tarn::engine::Value const& value);
 
-/// An object that was made without `__init__` raises TypeError where it is used: pybind11 would
-/// have it stand for memory that nobody has written to. And an `__init__` that is called by what it
-/// converts raises TypeError: pybind11 would make the object twice.
+/// Objects made without `__init__` raise TypeError when used: pybind11 would use uninitialised
+/// memory. An `__init__` that calls itself while converting its argument raises TypeError too:
+/// pybind11 would construct the object twice.
 void guardInit(py::handle type);
 template <class T>
 void requireInit() {
@@ -93,8 +93,8 @@ void requireInit() {
 
 }  // namespace tarn_python
 
-/// For the arguments of functions: pybind11's own would cut identifiers to integers, and hide what
-/// a conversion raises.
+/// For function arguments: pybind11's casters would truncate identifiers and hide exceptions of
+/// conversions.
 template <>
 struct pybind11::detail::type_caster<double> {
     PYBIND11_TYPE_CASTER(double, const_name("float"));

@@ -1,4 +1,4 @@
-// Data: Python's own objects to and from `Unstructured`.
+// Unstructured data: converts Python objects to and from `Unstructured`.
 
 #include "conversions.h"
 
@@ -34,7 +34,7 @@ Unstructured integerData(py::handle object) {
     return identifier;
 }
 
-// A map or an array that is being filled: no call of its own for a level, however deep they are.
+// A map or an array that is being filled. An explicit stack: data may be of any depth.
 struct Open {
     py::object source;
     std::vector<std::pair<std::string, py::object>> members;
@@ -75,7 +75,7 @@ Open opened(py::handle object) {
     return open;
 }
 
-// Data without parts.
+// Data other than maps and arrays.
 bool scalarData(py::handle object, Unstructured& data) {
     if (object.is_none()) {
         data = Unstructured();
@@ -106,7 +106,7 @@ void defineUnsigned(py::module_& module) {
         "An unsigned integer of data, such as an identifier: 0 to 2**64 - 1. An `int` in every "
         "other respect; data tells the two apart.";
     members["__slots__"] = py::tuple();
-    // What it is for people and in texts: only `repr` tells it from another integer.
+    // Prints like an integer; only `repr` differs.
     members["__str__"] = py::handle(reinterpret_cast<PyObject*>(&PyLong_Type)).attr("__repr__");
     members["__repr__"] = py::cpp_function(
         [](py::int_ const& self) {

@@ -66,7 +66,7 @@ Document fromText(py::object const& text) {
     return read(toString(text), "");
 }
 
-// By Python, which raises what its programs expect where a file is missing or may not be read.
+// Reads the file with Python, which raises its usual exceptions.
 Document fromFile(py::object const& file) {
     std::string const name = fileName(file);
     py::object const opened = py::module_::import("io").attr("open")(file, "rb");
@@ -98,16 +98,18 @@ void defineInfo(py::module_& module) {
     defineEnumeration<DocumentInfo::Form>(
         module, "DocumentForm", "The forms that are read.",
         {{"OWN", DocumentInfo::Form::Own}, {"NODE_GRAPH", DocumentInfo::Form::NodeGraph}});
-    py::class_<DocumentInfo>(module, "DocumentInfo",
-                             "What a document has beside its graph, and what reading it changed.")
+    py::class_<DocumentInfo>(
+        module, "DocumentInfo",
+        "What a document has in addition to its graph, and what reading it changed.")
         .def_readonly("form", &DocumentInfo::form, "A DocumentForm.")
         .def_readonly("frames_per_second", &DocumentInfo::framesPerSecond, "Above 0.")
         .def_readonly("renumbered_nodes", &DocumentInfo::renumberedNodes,
-                      "How many nodes of a node graph got another identifier than theirs.")
-        .def_readonly("omitted_links", &DocumentInfo::omittedLinks,
-                      "How many links of a node graph lead to or from nothing and were left out.")
+                      "The number of nodes of a node graph that got another identifier.")
+        .def_readonly(
+            "omitted_links", &DocumentInfo::omittedLinks,
+            "The number of links of a node graph that were left out because an end does not exist.")
         .def_readonly("unused_definitions", &DocumentInfo::unusedDefinitions,
-                      "How many shared definitions of a node graph no node uses.")
+                      "The number of shared definitions of a node graph that no node uses.")
         .def_readonly("notes", &DocumentInfo::notes,
                       "The first hundred of those links, a line each.")
         .def("summary", &DocumentInfo::summary, "The counts in one line; empty where all are 0.");
@@ -122,7 +124,8 @@ void defineDocuments(py::module_& module) {
     module.def(
         "read_document", [](py::object const& text) { return fromText(text).root; },
         py::arg("text"),
-        "The graph of a document of our own form, or of a browser-based node editor's export, in a "
+        "The graph of a document in our own format, or of a browser-based node editor's export, in "
+        "a "
         "str or bytes. Raises DocumentError.");
     module.def(
         "read_document_with_info", [](py::object const& text) { return pairOf(fromText(text)); },
@@ -140,7 +143,7 @@ void defineDocuments(py::module_& module) {
             return fromString(writeDocument(root, framesPerSecond));
         },
         py::arg("root"), py::arg("frames_per_second") = 60.0,
-        "The document of our own form; equal graphs give equal strings.");
+        "The document in our own format; equal graphs give equal strings.");
     module.def(
         "save_document",
         [](py::object const& file, Patch root, double framesPerSecond) {
@@ -155,8 +158,8 @@ void defineDocuments(py::module_& module) {
             raise(PyExc_OSError, name + ": " + error.message);
         },
         py::arg("file"), py::arg("root"), py::arg("frames_per_second") = 60.0,
-        "Replaces the file in one step: whoever reads it finds the old content or the new one. "
-        "Raises OSError where that fails, and leaves the file as it was.");
+        "Replaces the file atomically: readers see the old or the new content. "
+        "Raises OSError on failure and leaves the file unchanged.");
     module.def("kind_to_string", &kindToString, py::arg("builtin"),
                "The name of a built-in kind, or an empty string.");
     module.def(

@@ -1,4 +1,4 @@
-// Curves, over numbers, vectors, values and whole arrays of progress.
+// Easing of numbers, vectors, values and arrays of progress.
 
 #include "casters.h"
 #include "conversions.h"
@@ -17,7 +17,7 @@ namespace {
 
 using Progress = py::array_t<double, py::array::c_style | py::array::forcecast>;
 
-// Results have the shape of the progress, and one more axis for the components of a vector.
+// Results have the shape of the progress, plus an axis for the components of a vector.
 template <class T>
 py::array_t<double> easeArray(EasingFunction function, T from, T to, Progress const& progress) {
     constexpr std::size_t kComponents = sizeof(T) / sizeof(double);
@@ -34,7 +34,7 @@ py::array_t<double> easeArray(EasingFunction function, T from, T to, Progress co
     return results;
 }
 
-// Nothing if it is a single number.
+// Empty for a single number.
 Optional<Progress> toProgress(py::object const& t) {
     if (isNumber(t) || isValue(t)) return {};
     py::object const asArray = py::module_::import("numpy").attr("asarray");
@@ -101,7 +101,7 @@ void defineEasing(py::module_& module) {
                            {"SINUSOIDAL_OUT", EF::SinusoidalOut},
                            {"SINUSOIDAL_IN_OUT", EF::SinusoidalInOut}});
     module.def("easing_function_names", &easingFunctionNames,
-               "The names that an editor shows, at their enumerator's position.");
+               "The names that an editor shows, indexed by enumerator.");
     module.def(
         "string_to_easing_function",
         [](std::string const& name) -> py::object {

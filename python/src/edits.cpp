@@ -1,4 +1,4 @@
-// Edits of a graph, and what differs between two graphs.
+// Edits of a graph, and differences between two graphs.
 
 #include "conversions.h"
 #include "module.h"
@@ -26,14 +26,14 @@ namespace {
 using Id = unsigned long long;
 using Position = std::optional<std::size_t>;
 
-// An edit that knows how deep the graph will be: only so many levels are ever made.
+// An edit that tracks the depth of the graph, which is limited.
 struct Edit {
     PatchEdit edit;
-    // Empty once the edit is committed: an index that shares its tables is slow to follow an edit.
+    // Empty after the commit: while an edit shares an index's tables, updating that is slow.
     Optional<PatchIndex> before;
-    // Of patches that the edit added or moved.
+    // For patches that the edit added or moved.
     std::unordered_map<Id, Id> parents = {};
-    // Of everything that was added or moved, together.
+    // For all added or moved patches together.
     std::size_t levels = 0;
 
     explicit Edit(PatchIndex const& index) : edit(index), before(index) {}
@@ -41,7 +41,7 @@ struct Edit {
     std::size_t levelOf(Id id) const {
         if (!before) return 1;
         std::size_t level = 1;
-        // Where identifiers repeat, the walk may go in a circle: `commit` looks at what was made.
+        // With repeated identifiers the search may run in a cycle: `commit` checks the result.
         while (level < kMostLevels) {
             auto const found = parents.find(id);
             Patch const* const parent = found == parents.end() ? before->parentOf(id) : nullptr;
@@ -103,7 +103,7 @@ struct Edit {
 
 using SharedEdit = std::shared_ptr<Edit>;
 
-// Looked up at each use: nothing refers into an edit that is done.
+// Looked up at each use, so that nothing dangles after the commit.
 struct PatchInEdit {
     SharedEdit edit;
     Id id;
@@ -141,7 +141,7 @@ py::object portIn(SharedEdit const& edit, Id id) {
 
 void defineParts(py::module_& module) {
     py::class_<PatchInEdit> patch(module, "PatchInEdit",
-                                  "A patch as it will be after an edit. Raises ValueError once the "
+                                  "A patch in an edit. Raises ValueError once the "
                                   "patch is removed or the edit committed.");
     patch.def_property_readonly(
         "id", [](PatchInEdit const& p) { return p.get().id; }, "The identifier, which stays.");
@@ -152,7 +152,7 @@ void defineParts(py::module_& module) {
             p.edit->assignChildren(p.id, std::move(children));
         });
     py::class_<PortInEdit> port(module, "PortInEdit",
-                                "A port as it will be after an edit. Raises ValueError once the "
+                                "A port in an edit. Raises ValueError once the "
                                 "port is removed or the edit committed.");
     port.def_property_readonly(
         "id", [](PortInEdit const& p) { return p.get().id; }, "The identifier, which stays.");
@@ -163,7 +163,7 @@ void defineParts(py::module_& module) {
 
 void defineEdit(py::module_& module) {
     py::class_<Edit, SharedEdit>(module, "PatchEdit",
-                                 "Changes to a graph, made at once by `commit`. Functions that "
+                                 "Collects changes to a graph; `commit` makes them. Functions that "
                                  "cannot do what is asked for give False or None and change "
                                  "nothing. Afterwards the edit is done: it gives None and False.")
         .def(py::init<PatchIndex const&>(), py::arg("index"))
@@ -175,16 +175,16 @@ void defineEdit(py::module_& module) {
             },
             py::arg("id"), "The patch as it will be, to be changed in place, or None.")
         .def("input_port", &portIn<true>, py::arg("port_id"),
-             "The input as it will be, to be changed in place, or None.")
+             "The input in the edit, which can be changed in place, or None.")
         .def("output_port", &portIn<false>, py::arg("port_id"),
-             "The output as it will be, to be changed in place, or None.")
+             "The output in the edit, which can be changed in place, or None.")
         .def(
             "add_input_port",
             [](Edit& e, Id id, Port const& port, Position position) {
                 return e.edit.addInputPort(id, port, position.value_or(PatchEdit::kEnd));
             },
             py::arg("patch_id"), py::arg("port"), py::arg("position") = Position(),
-            "Adds an input to the patch, ahead of the one at `position`, or at the end. False "
+            "Adds an input to the patch, before the one at `position`, or at the end. False "
             "where its identifier is 0 or taken.")
         .def(
             "add_output_port",
@@ -201,12 +201,13 @@ void defineEdit(py::module_& module) {
             py::arg("port_id"), "Removes the output and the connections that start at it.")
         .def("add_patch", &Edit::addPatch, py::arg("parent_id"), py::arg("patch"),
              py::arg("position") = Position(),
-             "Adds a patch with all that is inside, ahead of the child at `position`, or at the "
+             "Adds a patch with everything in it, before the child at `position`, or at the "
              "end. False where an identifier in it is 0, repeated or taken; ValueError beyond "
              "10,000 levels.")
         .def(
             "remove_patch", [](Edit& e, Id id) { return e.edit.removePatch(id); }, py::arg("id"),
-            "Removes the patch with all that is inside, and its connections. The root stays.")
+            "Removes the patch with everything in it, and its connections. The root cannot be "
+            "removed.")
         .def("move_patch", &Edit::movePatch, py::arg("id"), py::arg("parent_id"),
              py::arg("position") = Position(),
              "Moves the patch to the children of another. Connections of a parent that it leaves "
@@ -222,17 +223,17 @@ void defineEdit(py::module_& module) {
             py::arg("connection"), "False where there is no such connection.")
         .def(
             "fresh_patch_id", [](Edit& e) { return e.edit.freshPatchId(); },
-            "An identifier that no patch has or had; each call gives another.")
+            "An identifier that no patch has or had; each call returns another one.")
         .def(
             "fresh_port_id", [](Edit& e) { return e.edit.freshPortId(); },
-            "An identifier that no port has or had; each call gives another.")
+            "An identifier that no port has or had; each call returns another one.")
         .def("commit", &Edit::commit,
-             "The new root; it shares all lists that nothing changed. Raises ValueError where "
+             "The new root; it shares all unchanged lists. Raises ValueError where "
              "identifiers repeat and patches would nest deeper than 10,000 levels.");
     requireInit<Edit>();
 }
 
-// A change with the patches themselves instead of pointers into two documents.
+// A change that owns its patches instead of pointing into two documents.
 struct Change {
     PatchChange::Kind kind;
     Id id;
@@ -253,7 +254,7 @@ void defineChanges(py::module_& module) {
                              {"MOVED", Kind::Moved},
                              {"CHANGED", Kind::Changed}});
     py::class_<Change>(module, "PatchChange",
-                       "One change of one patch; `str` says it in a line, with names and values.")
+                       "One change of one patch; `str` describes it in one line.")
         .def_readonly("kind", &Change::kind, "A PatchChangeKind.")
         .def_readonly("id", &Change::id, "The patch.")
         .def_readonly("before", &Change::before, "The patch, or None for one that was added.")

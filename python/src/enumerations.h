@@ -1,4 +1,4 @@
-// python/src/enumerations.h: the enumerations, as classes of Python's own kind.
+// python/src/enumerations.h: defines the enumerations as Python's own enum classes.
 //
 //     defineEnumeration<Type>(module, "Type", {{"FLOAT", Type::Float}});
 
@@ -14,7 +14,7 @@
 
 namespace tarn_python {
 
-/// The enumerators in Python, by their numbers. Live as long as the process.
+/// The enumerators in Python by number. They live as long as the process.
 template <class Enumeration>
 std::vector<pybind11::handle>& enumeratorsOf() {
     static std::vector<pybind11::handle> found;
@@ -38,7 +38,7 @@ void defineEnumeration(pybind11::module_& module, char const* name, char const* 
     }
 }
 
-/// Converts to and from that class. Enumerators out of range do not exist in Python.
+/// Converts to and from that class. Undefined enumerators do not exist in Python.
 template <class Enumeration>
 struct EnumerationCaster {
     static constexpr auto name = pybind11::detail::const_name("enum.IntEnum");

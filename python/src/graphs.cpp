@@ -1,4 +1,4 @@
-// The records of a graph, its queries and its index.
+// Graphs: records, queries and indexes.
 
 #include "conversions.h"
 #include "module.h"
@@ -53,7 +53,7 @@ std::size_t levelsOf(Patch const& patch) {
     };
     std::unordered_map<std::vector<Patch> const*, std::size_t> known;
     std::vector<Open> open;
-    std::size_t done = 0;  // Of the list that was looked at last.
+    std::size_t done = 0;  // For the list that was compared last.
     auto const enter = [&](Array<Patch> const& list) {
         done = 0;
         if (list->empty()) return false;
@@ -121,7 +121,7 @@ std::string textOf(T const& object) {
     return text.str();
 }
 
-// As documents: to the last bit, at any depth.
+// Pickled as documents: exact, at any depth.
 Patch readBack(py::bytes const& document) {
     Optional<Patch> patch = readDocument(static_cast<std::string>(document));
     if (!patch) throw py::value_error("this is no pickled patch");
@@ -141,10 +141,10 @@ void defineModelLayer(py::module_& module) {
         .def_readonly("id", &ModelLayer::id, "The number of the layer.")
         .def_property_readonly(
             "children", [](ModelLayer const& l) { return fromList(l.children); },
-            "The layers beneath it, as a tuple.")
+            "The layers below it, as a tuple.")
         .def_property_readonly(
             "additional_layers", [](ModelLayer const& l) { return fromList(l.additionalLayers); },
-            "Compared and copied, but not shown by `str`, as a tuple.")
+            "A tuple; compared and copied, but not printed by `str`.")
         .def(
             "__eq__", [](ModelLayer const& a, ModelLayer const& b) { return a == b; },
             py::is_operator())
@@ -272,7 +272,7 @@ void definePatch(py::module_& module) {
              })
         .def(py::pickle([](Patch const& p) { return py::bytes(writeDocument(p)); }, &readBack))
         .def("__reduce_ex__", [](py::object const& self, py::object const&) {
-            // As the newer protocols do it, for all of them.
+            // All protocols pickle like the newer ones.
             return py::make_tuple(py::module_::import("copyreg").attr("__newobj__"),
                                   py::make_tuple(py::type::of<Patch>()),
                                   self.attr("__getstate__")());
@@ -295,7 +295,7 @@ void defineQueries(py::module_& module) {
             return copyOrNone(findPatchRecursive(root, id));
         },
         py::arg("root"), py::arg("id"),
-        "The patch of this identifier in the whole graph, or None.");
+        "The patch with this identifier in the whole graph, or None.");
     module.def(
         "in_port_for_tag",
         [](Patch const& patch, unsigned long long tag) {
@@ -313,7 +313,7 @@ void defineQueries(py::module_& module) {
 void defineIndex(py::module_& module) {
     using Id = unsigned long long;
     py::class_<PatchIndex>(module, "PatchIndex",
-                           "Answers about a graph in constant time. It keeps the graph; what it "
+                           "Queries a graph in constant time. It keeps the graph; what it "
                            "gives are records of their own.")
         .def(py::init([](Patch root) {
                  py::gil_scoped_release const released;
@@ -322,7 +322,7 @@ void defineIndex(py::module_& module) {
              py::arg("root"))
         .def_property_readonly(
             "root", [](PatchIndex const& i) { return i.root(); },
-            "The patch that the index was made of.")
+            "The patch that the index was made from.")
         .def(
             "find_patch", [](PatchIndex const& i, Id id) { return copyOrNone(i.findPatch(id)); },
             py::arg("id"), "The patch anywhere in the graph, or None.")
@@ -358,7 +358,7 @@ void defineIndex(py::module_& module) {
             [](PatchIndex const& i, Id id) { return fromView(i.outgoingConnectionsFromPatch(id)); },
             py::arg("id"), "The connections of its parent that start at the patch.")
         .def("update", &PatchIndex::update, py::arg("root"),
-             "Makes this the index of another root, at the cost of what differs.");
+             "Makes this the index of another root; the cost depends on the differences.");
     requireInit<PatchIndex>();
 }
 

@@ -9,8 +9,7 @@ namespace {
 
 newfunc makeInstance = nullptr;
 
-// Of the class that pybind11 derives all others from, there are no objects of its own: where one is
-// asked for, pybind11 throws through the interpreter.
+// pybind11's base class cannot be instantiated: pybind11 would throw through the interpreter.
 PyObject* makeDerived(PyTypeObject* type, PyObject* arguments, PyObject* named) {
     if (!pybind11::detail::all_type_info(type).empty()) {
         return makeInstance(type, arguments, named);

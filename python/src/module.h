@@ -1,4 +1,4 @@
-// python/src/module.h: the parts of the module, each defined in a file of its own.
+// python/src/module.h: the parts of the module, each in its own source file.
 
 #ifndef TARN_PYTHON_MODULE_H
 #define TARN_PYTHON_MODULE_H

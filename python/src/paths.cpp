@@ -19,7 +19,7 @@ namespace tarn_python {
 
 namespace {
 
-// An element of a path that it keeps alive.
+// An element of a path, which it keeps alive.
 struct Element {
     std::shared_ptr<Path const> path;
     std::size_t position;
@@ -33,7 +33,7 @@ PathElement elementFrom(PathInstruction instruction, py::object const& points) {
     return element;
 }
 
-// The points where they are, of shape (n, 2), not to be written to.
+// A read-only view of the points with shape (n, 2).
 py::array pointsOf(Element const& element) {
     Points const& points = (*element).points;
     py::capsule const owner(new std::shared_ptr<Path const>(element.path), [](void* path) {
@@ -178,7 +178,7 @@ void definePath(py::module_& module) {
         "interpolate",
         [](Path const& a, Path const& b, double t) { return optionalPath(interpolate(a, b, t)); },
         py::arg("a"), py::arg("b"), py::arg("t"),
-        "The path on the way from `a` (t is 0) to `b` (t is 1), or None where the two have other "
+        "Interpolates from `a` (t is 0) to `b` (t is 1); None where the two have other "
         "elements.");
     module.def("svg_path_data", &svgPathData, py::arg("path"), "The `d` of an SVG path element.");
     module.def(
@@ -196,7 +196,7 @@ void defineBuilder(py::module_& module) {
     auto const self = py::return_value_policy::reference_internal;
     auto const point = [](py::object const& p) { return toVec2(p); };
     py::class_<PathBuilder>(module, "PathBuilder",
-                            "Makes a path, one instruction after another. Every call but `build` "
+                            "Builds a path instruction by instruction. Every call but `build` "
                             "gives the builder, so that calls chain. Points are pairs of numbers.")
         .def(py::init<>())
         .def_property_readonly(
@@ -223,7 +223,7 @@ void defineBuilder(py::module_& module) {
             py::arg("c"), py::arg("p"), self, "A quadratic curve with a control point.")
         .def(
             "close", [](Self b) -> Self { return b.close(); }, self,
-            "A line back to the start of the outline. The current point stays where it was.")
+            "A line back to the start of the outline. The current point does not change.")
         .def(
             "append", [](Self b, Path const& path) -> Self { return b.append(path); },
             py::arg("path"), self, "Every element of a path. The current point stays.")
@@ -261,7 +261,7 @@ void defineBuilder(py::module_& module) {
                 return b.hexaRect(point(origin), point(size), cut);
             },
             py::arg("origin"), py::arg("size"), py::arg("cut"), self,
-            "A rectangle with each corner cut off, `cut` along either edge.")
+            "A rectangle whose corners are cut off, `cut` along either edge.")
         .def(
             "build", [](PathBuilder const& b) { return std::make_shared<Path>(b.build()); },
             "A path of all elements so far. The builder can go on.");

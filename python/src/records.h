@@ -1,5 +1,5 @@
-// python/src/records.h: the fields of ports and patches, whether they are records of their own or
-// those of an edit.
+// python/src/records.h: defines the fields of ports and patches, both for records and for those
+// inside an edit.
 //
 //     definePortFields(portClass, [](Port& port) -> Port& { return port; });
 
@@ -19,21 +19,19 @@
 
 namespace tarn_python {
 
-/// How deep patches nest, the outermost one counted. Takes each list once, however often it is
-/// shared, and no stack.
+/// The depth of a patch, counting itself. Visits shared lists once, and is not recursive.
 std::size_t levelsOf(tarn::engine::Patch const& patch);
-/// The stack of a thread is enough for so many levels of comparing, copying and writing: ValueError
-/// beyond them.
+/// Raises ValueError beyond the depth that a thread's stack can compare, copy and write.
 constexpr std::size_t kMostLevels = 10000;
 void requireLevels(std::size_t levels);
 
 using Attributes = std::map<std::string, tarn::engine::Unstructured>;
 
-/// A mapping that cannot be written to: assigning to it would be lost.
+/// A read-only mapping: assignments to it would be lost.
 py::object fromAttributes(Attributes const& attributes);
 Attributes toAttributes(py::handle object);
 
-/// The elements as a tuple; and a list of what an iterable gives.
+/// Converts a list to a tuple, and an iterable to a list.
 template <class T>
 py::tuple fromList(std::vector<T> const& list) {
     py::tuple elements(list.size());
@@ -60,11 +58,11 @@ void definePortFields(Class& cls, Get get) {
     cls.def_property(
            "tag", [get](Self& s) { return get(s).tag; },
            [get](Self& s, unsigned long long tag) { get(s).tag = tag; },
-           "Finds the port among those of its own patch.")
+           "Identifies the port among those of its patch.")
         .def_property(
             "name", [get](Self& s) { return fromString(get(s).name); },
             [get](Self& s, py::str const& name) { get(s).name = toString(name); },
-            "What people see.")
+            "The displayed name.")
         .def_property(
             "type_info", [get](Self& s) { return get(s).typeInfo; },
             [get](Self& s, tarn::engine::TypeInfo const& i) { get(s).typeInfo = i; },
@@ -72,14 +70,14 @@ void definePortFields(Class& cls, Get get) {
         .def_property(
             "default_value", [get](Self& s) { return get(s).defaultValue; },
             [get](Self& s, py::object const& v) { get(s).defaultValue = toValue(v); },
-            "A Value; what is assigned may be anything that one is made of.")
+            "A Value; anything that converts to one can be assigned.")
         .def_property(
             "attributes", [get](Self& s) { return fromAttributes(get(s).attributes); },
             [get](Self& s, py::object const& d) { get(s).attributes = toAttributes(d); },
-            "A mapping of strings to data that is only read: assign a changed dict.");
+            "A read-only mapping of strings to data: assign a changed dict.");
 }
 
-/// `assignChildren(self, list)` is how another list of children takes the place of the former one.
+/// `assignChildren(self, list)` replaces the list of children.
 template <class Class, class Get, class Assign>
 void definePatchFields(Class& cls, Get get, Assign assignChildren) {
     using namespace tarn::engine;
@@ -91,11 +89,11 @@ void definePatchFields(Class& cls, Get get, Assign assignChildren) {
         .def_property(
             "descriptor", [get](Self& s) { return fromString(get(s).descriptor); },
             [get](Self& s, py::str const& d) { get(s).descriptor = toString(d); },
-            "A second string: compared, but neither shown nor evaluated.")
+            "A second name: compared, but neither printed nor evaluated.")
         .def_property(
             "name", [get](Self& s) { return fromString(get(s).name); },
             [get](Self& s, py::str const& name) { get(s).name = toString(name); },
-            "What people see.")
+            "The displayed name.")
         .def_property(
             "model_layer", [get](Self& s) { return get(s).modelLayer; },
             [get](Self& s, ModelLayer const& layer) { get(s).modelLayer = layer; },
@@ -121,12 +119,12 @@ void definePatchFields(Class& cls, Get get, Assign assignChildren) {
             [assignChildren](Self& s, py::object const& list) {
                 assignChildren(s, toList<Patch>(list));
             },
-            "A tuple of the patches inside: assign another list. Raises ValueError where "
+            "A tuple of the child patches: assign another list. Raises ValueError where "
             "patches would nest deeper than 10,000 levels.")
         .def_property(
             "attributes", [get](Self& s) { return fromAttributes(get(s).attributes); },
             [get](Self& s, py::object const& d) { get(s).attributes = toAttributes(d); },
-            "A mapping of strings to data that is only read: assign a changed dict.");
+            "A read-only mapping of strings to data: assign a changed dict.");
 }
 
 }  // namespace tarn_python

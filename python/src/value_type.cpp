@@ -12,7 +12,7 @@ namespace tarn_python {
 
 namespace {
 
-// What C++ throws becomes what Python raises.
+// Translates C++ exceptions to Python exceptions.
 template <class Function>
 PyObject* raising(Function function) {
     try {
@@ -38,9 +38,9 @@ PyObject* allocate(PyTypeObject* type, Value value) {
 PyObject* make(PyTypeObject* type, PyObject* const* arguments, Py_ssize_t count,
                PyObject* keyword) {
     return raising([&]() -> PyObject* {
-        if (count > 1) throw py::type_error("a Value is made of one object");
+        if (count > 1) throw py::type_error("Value takes at most one argument");
         if (keyword != nullptr && PyUnicode_CompareWithASCIIString(keyword, "value") != 0) {
-            throw py::type_error("the object that a Value is made of has the name \"value\"");
+            throw py::type_error("the only keyword argument of Value is \"value\"");
         }
         return allocate(type, count == 0 ? Value() : toValue(*arguments));
     });
@@ -53,7 +53,7 @@ PyObject* callVector(PyObject* type, PyObject* const* arguments, std::size_t fla
                 named != 0 ? PyTuple_GET_ITEM(names, 0) : nullptr);
 }
 
-// For classes that are derived in Python.
+// For subclasses in Python.
 PyObject* callTuple(PyTypeObject* type, PyObject* arguments, PyObject* named) {
     PyObject* const* const items = PySequence_Fast_ITEMS(arguments);
     Py_ssize_t const count = PyTuple_GET_SIZE(arguments);
@@ -74,7 +74,7 @@ void destroy(PyObject* object) {
 
 Py_hash_t hash(PyObject* object) {
     auto const bits = static_cast<Py_hash_t>(std::hash<Value>()(valueOf(object)));
-    return bits == -1 ? -2 : bits;  // -1 says that there was an error.
+    return bits == -1 ? -2 : bits;  // -1 signals an error.
 }
 
 PyObject* compare(PyObject* a, PyObject* b, int operation) {
@@ -97,7 +97,7 @@ void* slot(Function* function) {
 
 PyTypeObject* makeType() {
     static char const* const documentation =
-        "One value of one of the fourteen types. Never changes; every value converts to every type "
+        "A value of one of the fourteen types. Immutable; every value converts to every type "
         "without an error.\n\n"
         "Value(value=0.0) is the value of a float, an int, a bool, a str, 2, 3 or 4 numbers (a "
         "vector), 4 rows of 4 numbers (a matrix), a Path, an Unstructured or a dict. Raises "

@@ -1,5 +1,5 @@
-// python/src/value_type.h: the Python type of values. pybind11's own objects take five times as
-// long to make, and programs make a value for every number.
+// python/src/value_type.h: the Python type of values. It is not a pybind11 class: those take five
+// times as long to construct, and programs construct a value for every number.
 //
 //     if (isValue(object)) return valueOf(object);
 //     py::object made = py::cast(Value(2.5));
@@ -19,23 +19,22 @@ struct ValueObject {
     PyObject_HEAD tarn::engine::Value value;
 };
 
-/// The type, without the methods that are written in C++ through pybind11. Lives as long as the
-/// process.
+/// The type without the methods that are defined with pybind11. Lives as long as the process.
 PyTypeObject* valueType();
 
 inline bool isValue(pybind11::handle object) {
     return PyObject_TypeCheck(object.ptr(), valueType());
 }
-/// Of an object that is one.
+/// The value of such an object.
 inline tarn::engine::Value const& valueOf(pybind11::handle object) {
     return reinterpret_cast<ValueObject*>(object.ptr())->value;
 }
-/// A new object.
+/// Makes a new object.
 PyObject* newValue(tarn::engine::Value value);
 
 }  // namespace tarn_python
 
-/// So that functions of the module take and give values.
+/// Lets functions of the module take and return values.
 template <>
 struct pybind11::detail::type_caster<tarn::engine::Value> {
     static constexpr auto name = const_name("tarn_engine_base.Value");

@@ -1,4 +1,4 @@
-// Types, values, what ports carry, and data.
+// Types, values, types of ports, and unstructured data.
 
 #include "casters.h"
 #include "conversions.h"
@@ -46,7 +46,7 @@ Optional<Value> toOptional(py::handle object) {
 
 void defineTypes(py::module_& module) {
     defineEnumeration<Type>(module, "Type",
-                            "The types of values, with the numbers that documents rely on.",
+                            "The types of values, with the numbers that documents store.",
                             {{"FLOAT", Type::Float},
                              {"VEC2", Type::Vec2},
                              {"VEC3", Type::Vec3},
@@ -88,7 +88,7 @@ void defineData(py::module_& module) {
     py::class_<Unstructured, std::shared_ptr<Unstructured>>(
         module, "Unstructured",
         "JSON-like data: None, numbers, strings, lists and dicts with string keys, of any depth. "
-        "Never changes. True and False become 1 and 0, and an `Unsigned` an unsigned integer.")
+        "Immutable. True and False become 1 and 0, and an `Unsigned` an unsigned integer.")
         .def(py::init([](py::object const& data) { return toData(data); }),
              py::arg("data") = py::none(),
              "Copies the data. Raises TypeError for other objects, OverflowError for integers "
@@ -102,7 +102,7 @@ void defineData(py::module_& module) {
                 return fromString(data.toText(maxBytes, maxDepth));
             },
             py::arg("max_bytes") = 4096, py::arg("max_depth") = 16,
-            "On one line, for people, cut to so many bytes and levels.")
+            "One line for people, limited to this many bytes and levels.")
         .def(
             "__eq__", [](Unstructured const& a, Unstructured const& b) { return a == b; },
             py::is_operator())
@@ -151,7 +151,7 @@ void defineMakers(py::handle type) {
     type.attr("default") = py::staticmethod(py::cpp_function(
         [](Type of, unsigned char qualifier) { return Value::defaultValue(of, qualifier); },
         py::name("default"), py::scope(type), py::arg("type"), py::arg("qualifier") = 0,
-        "What a port of that type starts with. The qualifier 4 makes a colour opaque."));
+        "The value of a new port of that type. The qualifier 4 makes a colour opaque."));
 }
 
 void defineValue(py::module_& module) {
@@ -169,12 +169,12 @@ void defineValue(py::module_& module) {
                    [](Value const& v) { return fromMatrix(FloatMat4(v)); });
     defineProperty(type, "id", "The number of a resource, or the identifier of data; else 0.",
                    [](Value const& v) { return static_cast<unsigned long long>(v); });
-    defineProperty(type, "path", "The path, shared with the value; else the empty one.",
-                   [](Value const& v) {
-                       std::shared_ptr<Path const> path = v.sharedPath();
-                       if (path == nullptr) path = Path::EmptyPath();
-                       return std::const_pointer_cast<Path>(path);  // Python changes no path.
-                   });
+    defineProperty(
+        type, "path", "The path, shared with the value; else the empty one.", [](Value const& v) {
+            std::shared_ptr<Path const> path = v.sharedPath();
+            if (path == nullptr) path = Path::EmptyPath();
+            return std::const_pointer_cast<Path>(path);  // Paths are immutable in Python.
+        });
     defineProperty(type, "data",
                    "Numbers, strings and data as Python's own objects, a vector as a dict of "
                    "\"X\", \"Y\", \"Z\", \"W\"; else None.",
@@ -189,7 +189,7 @@ void defineValue(py::module_& module) {
     defineMethod(type, "__reduce__", [type](Value const& v) {
         std::string const maker = makerOf(v.type());
         if (maker.empty()) return py::make_tuple(type, py::make_tuple(payloadOf(v)));
-        // What is written in C++ cannot be pickled itself: a call of it by its name can.
+        // Functions in C++ cannot be pickled, but a call of one by name can.
         py::object const call = py::module_::import("operator").attr("methodcaller");
         return py::make_tuple(call(maker, static_cast<unsigned long long>(v)),
                               py::make_tuple(type));
@@ -197,8 +197,7 @@ void defineValue(py::module_& module) {
 }
 
 void defineTypeInfo(py::module_& module) {
-    py::class_<TypeInfo>(module, "TypeInfo",
-                         "What a port carries, and the bounds of what it takes.")
+    py::class_<TypeInfo>(module, "TypeInfo", "The type of a port and the bounds of its values.")
         .def(
             py::init([](Type type, unsigned char subtype, py::object const& min,
                         py::object const& max, py::object const& extra) {
@@ -220,7 +219,7 @@ void defineTypeInfo(py::module_& module) {
         .def_property(
             "extra", [](TypeInfo const& i) { return optionalValue(i.extra); },
             [](TypeInfo& i, py::object const& v) { i.extra = toOptional(v); },
-            "Kept and compared; nothing here looks at it. A Value or None.")
+            "Stored and compared, but not interpreted. A Value or None.")
         .def(
             "__eq__", [](TypeInfo const& a, TypeInfo const& b) { return a == b; },
             py::is_operator())
@@ -248,7 +247,7 @@ void defineTypeInfo(py::module_& module) {
             return castValueToType(toValue(value), info);
         },
         py::arg("value"), py::arg("type_info"),
-        "The value, or the bound of a float port that it lies beyond.");
+        "The value, clamped to the bounds of a float port.");
     module.def(
         "index_loop_casting",
         [](std::vector<Value> const& loop, TypeInfo const& info, unsigned long long index) {

@@ -1,4 +1,4 @@
-"""What type checkers have to accept. Checked by mypy, and run as a test."""
+"""Code that type checkers must accept. Checked by mypy, and run as a test."""
 
 import numpy as np
 import tarn_engine_base as tarn

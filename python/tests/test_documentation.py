@@ -1,4 +1,4 @@
-"""Everything that the package offers is documented, and the type stubs name it."""
+"""All public names of the package are documented and in the type stubs."""
 
 import enum
 import re

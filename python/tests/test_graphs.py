@@ -1,4 +1,4 @@
-"""Patches, their index, their edits, their changes and their documents."""
+"""Patches, indexes, edits, changes and documents."""
 
 import copy
 import gc

@@ -1,4 +1,4 @@
-"""Objects that misbehave: arguments that run programs while they are converted, and what was never meant to be an argument.
+"""Attacks on the module: arguments that run code while they are converted, and invalid arguments.
 
 Each program runs in an interpreter of its own and has to end by itself; what it prints is compared.
 """

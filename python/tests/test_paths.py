@@ -1,4 +1,4 @@
-"""Paths: built, taken apart as arrays, measured and written as SVG."""
+"""Paths: builder, arrays, geometry and SVG path data."""
 
 import gc
 import pickle

@@ -1,4 +1,4 @@
-"""Values: made from Python's objects, compared, copied, shown and pickled."""
+"""Values: conversion from Python objects, comparison, copies, output and pickling."""
 
 import copy
 import gc
@@ -75,7 +75,7 @@ def test_is_made_shown_and_copied(what: str, value: Value, type_: Type, text: st
 
 def test_is_made_by_name_and_by_derived_classes() -> None:
     class Derived(Value):
-        """Has what its own class adds."""
+        """A subclass with its own attribute."""
 
         def doubled(self) -> float:
             return 2 * float(self)

@@ -38,8 +38,8 @@ async function show(page, subject) {
 
 const text = (page, id) => page.locator(`#${id}`).textContent();
 
-async function readings(page) {
-    return page.$$eval("#value-readings tr", (rows) => Object.fromEntries(rows.map((row) => [...row.children].map((c) => c.textContent))));
+async function conversions(page) {
+    return page.$$eval("#value-conversions tr", (rows) => Object.fromEntries(rows.map((row) => [...row.children].map((c) => c.textContent))));
 }
 
 async function checkTabs(page) {
@@ -59,7 +59,7 @@ const oneAsNumber = {
 
 async function checkValues(page) {
     await show(page, "values");
-    const read = await readings(page);
+    const read = await conversions(page);
     checkEqual(Object.keys(read).length, 14, "a row for each type");
     for (const [type, wanted] of Object.entries(oneAsNumber)) checkEqual(read[type], wanted, `2.5 as ${type}`);
 
@@ -71,7 +71,7 @@ async function checkValues(page) {
     for (const kind of kinds) {
         checkEqual(await page.inputValue("#value-type"), kind);
         checkEqual(await text(page, "value-error"), "", `what a ${kind} begins with`);
-        seen.add(JSON.stringify(await readings(page)));
+        seen.add(JSON.stringify(await conversions(page)));
         await page.keyboard.press("ArrowDown");
     }
     checkEqual(seen.size, kinds.length, "each kind reads otherwise");
@@ -86,17 +86,17 @@ async function checkValues(page) {
         await page.selectOption("#value-type", kind);
         await page.fill("#value-content", content);
         checkEqual(await text(page, "value-error"), "", `${kind} ${content}`);
-        checkEqual((await readings(page))[type], wanted, `${kind} ${content} as ${type}`);
+        checkEqual((await conversions(page))[type], wanted, `${kind} ${content} as ${type}`);
     }
-    // What cannot be read gives one line, and the readings stay.
+    // What cannot be read gives one line, and the conversions stay unchanged.
     await page.selectOption("#value-type", "number");
     await page.fill("#value-content", "17");
-    const before = await readings(page);
+    const before = await conversions(page);
     for (const [kind, content] of [["number", "1,5"], ["number", ""], ["number", "0x"]]) {
         await page.fill("#value-content", content);
         const line = await text(page, "value-error");
         check(line !== "" && !line.includes("\n"), `${kind} ${content} is refused`);
-        checkEqual(await readings(page), before, `${kind} ${content} changes nothing`);
+        checkEqual(await conversions(page), before, `${kind} ${content} changes nothing`);
     }
     for (const [kind, content] of [["integer", "1.5"], ["integer", "9223372036854775808000"], ["boolean", "yes"], ["vec2", "1"], ["colour", "red"], ["data", "{"], ["image", "-1"]]) {
         await page.selectOption("#value-type", kind);

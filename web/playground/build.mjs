@@ -9,6 +9,6 @@ const [, , script, page] = argv;
 const near = (name) => readFileSync(new URL(name, import.meta.url), "utf8");
 const report = "../../examples/report/page/";
 const css = [`${report}graph.css`, `${report}page.css`, "playground.css"].map(near).join("\n");
-// Nothing in the script may look like the end of the element that it stands in.
+// Escapes everything that could end the script element.
 const parts = { CSS: css, SCRIPT: readFileSync(script, "utf8").replaceAll("</script", "<\\/script").replaceAll("<!--", "<\\!--") };
 writeFileSync(page, near("index.html").replace(/\{\{([A-Z]+)\}\}/g, (_, name) => parts[name]));

@@ -1,4 +1,4 @@
-// Values as people type them.
+// Parses values as users type them.
 
 import { pathFromSvgPathData, svgPathData, Type, Unstructured, Value } from "../src/library.js";
 
@@ -29,7 +29,7 @@ function colourOf(text) {
   return found.slice(1).map((part) => (part === undefined ? 1 : parseInt(part, 16) / 255));
 }
 
-/** The kinds that can be typed: what each is called, what it begins with, and how a value is made of a text. */
+/** The kinds that can be typed: name, initial text, and parser. */
 export const kinds = {
   number: { name: "Number", begin: "2.5", read: (text) => new Value(numberOf(text)) },
   integer: { name: "Integer", begin: "42", read: (text) => new Value(integerOf(text)) },
@@ -83,7 +83,7 @@ const vector = (count, name) => ({
 const colourOrNumbers = (text, count) => (count === 4 ? colourOf(text) : numbersOf(text, count));
 const resource = (name) => ({ show: (value) => String(value.id), read: (text) => Value[name](integerOf(text)) });
 
-/** How the value of an input is shown in a field, and read from it, by its type. */
+/** Formats the value of an input for a field, and parses it, by type. */
 export const fields = {
   [Type.Float]: { show: (value) => String(value.number), read: kinds.number.read },
   [Type.Int]: { show: (value) => String(value.integer), read: kinds.integer.read },

@@ -1,4 +1,4 @@
-// The subject of curves: one curve, and what it makes of two ends.
+// The Curves tab: a curve and the values that it gives.
 
 import { ease, EasingFunction, easingFunctionNames, Value } from "../src/library.js";
 import { cppOf, endOf, isColour } from "./contents.js";

@@ -1,4 +1,4 @@
-// The subject of documents: one that is read, edited and played, and what it is compared with.
+// The Documents tab: reads, edits and plays a document, and compares it with another one.
 
 import animation from "../../examples/documents/animation.json";
 import nodeGraph from "../../examples/documents/node_graph.json";
@@ -18,14 +18,16 @@ import { keep, keepField, longest, stateOf } from "./state.js";
 
 const samples = { animation, small, node_graph: nodeGraph };
 const frames = 120;
-// A page that does not answer for longer seems to have ended.
+// The time after which a page seems to have stopped responding.
 const longestSeconds = 2;
 
-// What can be undone: each document that was opened, and each edit of it. `root` and `info` are those of the document, `sample` is
-// its name where it is one of ours as it came, `edited` the input that was set, and `open` that one as long as it is being set.
+// The undo history: each document that was opened, and each edit. `root` and `info` belong to the
+// document; `sample` is its name if it is an unchanged bundled one; `edited` is the input that was
+// set, and `open` is that input while it is being set.
 let versions = [];
 let at = 0;
-// In the place of an input: what was edited before the document came here. No input has this identifier.
+// Stands for edits that were made before the document was opened here. No input has this
+// identifier.
 const several = 0n;
 let index;
 // The other file, {root, info, name, sample}, or null.
@@ -41,7 +43,7 @@ function opened() {
   return versions[first];
 }
 
-// What it is compared with, or null.
+// The document to compare with, or null.
 function other() {
   const chosen = byId("compare").value;
   return chosen === "opened" ? opened() : chosen === "file" ? otherFile : null;
@@ -51,7 +53,7 @@ function other() {
 
 const shown = new Map();
 
-// Whether the section was another one before.
+// Returns whether the section changed.
 function setSection(name, bytes) {
   const text = textOf(bytes);
   if (shown.get(name) === text) return false;
@@ -89,7 +91,8 @@ function showGraph() {
 
 const patchSelect = () => byId("input-patch");
 const nameOf = (patch) => patch.name || "unnamed";
-// The patches that have inputs, by what they are called in the list of choices, and the identifiers that several inputs have.
+// The patches that have inputs, by their label in the list, and the identifiers that several inputs
+// have.
 let patches = new Map();
 let repeated = new Set();
 
@@ -101,7 +104,7 @@ function collectPatches(patch) {
   for (const child of patch.children) collectPatches(child);
 }
 
-// A note beside the field says why it cannot be set, where it cannot.
+// A note next to the field says why it cannot be set.
 function fieldOf(port) {
   const { show, read } = fields[port.typeInfo.type];
   const name = port.name || "unnamed";
@@ -137,7 +140,8 @@ function fieldOf(port) {
       byId("input-error").textContent = `${name}: ${messageOf(error)}`;
     }
   };
-  // Each stay in a field is one step to be undone, and what could not be read does not outlast it.
+  // All changes while a field has the focus are one undo step; invalid content is discarded
+  // afterwards.
   const leave = () => {
     current().open = null;
     if (!field.hasAttribute("aria-invalid")) return;
@@ -165,7 +169,7 @@ function fieldOf(port) {
 
 function showInputs() {
   const chosen = patches.get(patchSelect().value);
-  // As it is after the last edit, where it can be told from others.
+  // The input after the last edit, if it can be identified.
   const patch = chosen === undefined || patchSelect().value.includes("/") ? chosen : index.findPatch(chosen.id);
   byId("inputs").replaceChildren(...(patch?.inputs ?? []).map(fieldOf));
   byId("input-error").textContent = "";
@@ -199,7 +203,8 @@ function showPatches() {
 let keeping = 0;
 let comparing = 0;
 
-// What follows from the current version; the graph shows what inputs are, but for the one that was set it is as it was.
+// Updates everything for the current version. The graph shows the inputs: all but the one that was
+// set are unchanged.
 function showVersion(edited) {
   const { root, sample } = current();
   index.update(root);
@@ -210,7 +215,7 @@ function showVersion(edited) {
   byId("sample").value = sample ?? "";
   showParts(edited, JSON.parse(textOf(native.reportInput(addressOf(root), ...halves(edited)))));
   clearTimeout(comparing);
-  // To draw large graphs takes longer than from one key to the next.
+  // Drawing a large graph takes longer than the time between two keys.
   if (other() !== null) comparing = setTimeout(showGraph, 400);
   clearTimeout(keeping);
   keeping = setTimeout(keepDocuments, 300);
@@ -252,7 +257,7 @@ function step(by) {
 
 let keepings = 0;
 
-// A document as the address has it: by its name where it is one of ours, else itself.
+// A document in the address: the name of a bundled one, otherwise its content.
 async function addressText({ root, info, sample }) {
   return sample ?? `~${await packed(writeDocument(root, info.framesPerSecond))}`;
 }
@@ -261,14 +266,14 @@ async function keepDocuments() {
   const turn = ++keepings;
   const isCompared = byId("compare").value === "opened" && current().edited !== null;
   const texts = await Promise.all([current(), otherFile, isCompared ? opened() : null].map((document) => document && addressText(document)));
-  // Another document came meanwhile.
+  // Another document was opened meanwhile.
   if (turn !== keepings) return;
   const [documentName, otherName] = [current(), otherFile].map((document) => (document?.sample === null ? document.name : null));
   for (const [i, key] of ["document", "other", "opened"].entries()) keep(key, texts[i]);
   keep("document-name", documentName);
   keep("other-name", otherName);
   const isKept = texts.every((text) => text === null || text.length <= longest);
-  byId("document-kept").textContent = isKept ? "" : "This is too large for the address: a link would not show it.";
+  byId("document-kept").textContent = isKept ? "" : "This is too large for the address: a link would not include it.";
 }
 
 // Opening
@@ -293,7 +298,7 @@ function sayError(name, error) {
   byId("document-error").textContent = line.length > longestError ? `${line.slice(0, half)} … ${line.slice(-half)}` : line;
 }
 
-// The document in the bytes, or null; what cannot be read gives one line.
+// Parses the document, or returns null and shows a one-line error.
 function read(bytes, name, sample = null) {
   try {
     return { ...readDocumentWithInfo(bytes), name, sample };
@@ -335,7 +340,8 @@ function compareWithFile(document) {
 
 let reading = 0;
 
-// Calls `use` with each of the files, one after the other, up to one that cannot be read; with none where others were chosen since.
+// Calls `use` with each file in order, up to the first that cannot be read; with none where other
+// files were chosen meanwhile.
 async function readFiles(files, uses) {
   const turn = ++reading;
   byId("document-error").textContent = "";
@@ -346,7 +352,7 @@ async function readFiles(files, uses) {
       if (turn !== reading) return;
       document = read(bytes, file.name);
     } catch (error) {
-      // A folder, or a file that is gone by now.
+      // A folder, or a file that no longer exists.
       sayError(file.name, error);
     }
     if (document === null) return;
@@ -354,7 +360,7 @@ async function readFiles(files, uses) {
   }
 }
 
-// What the address has under the key, or null.
+// The address's value for the key, or null.
 async function kept(key, otherwise) {
   const text = stateOf(key, otherwise);
   if (text === "") return null;
@@ -376,7 +382,7 @@ function listen() {
   for (const [id, use] of [["document-file", open], ["compare-file", compareWithFile]]) {
     byId(id).addEventListener("change", ({ target }) => {
       const files = [...target.files];
-      // The same file can be chosen again, with what it has by then.
+      // Allows choosing the same file again after it changed.
       target.value = "";
       readFiles(files, [use]);
     });
@@ -385,7 +391,7 @@ function listen() {
   byId("undo").addEventListener("click", () => step(-1));
   byId("redo").addEventListener("click", () => step(1));
   addEventListener("keydown", (event) => {
-    // Fields undo what is typed in them.
+    // Text fields have their own undo.
     const isElsewhere = byId("documents").hidden || event.target.matches("input:not([type=range])");
     if (isElsewhere || !(event.ctrlKey || event.metaKey)) return;
     const by = { z: event.shiftKey ? 1 : -1, y: 1 }[event.key.toLowerCase()];
@@ -399,7 +405,7 @@ function listen() {
     element("a", { href: url, download: `${name.replace(/\.json$/, "")}.json` }).click();
     setTimeout(() => URL.revokeObjectURL(url), 1000);
   });
-  // A patch of the graph that is clicked or reached has its inputs shown.
+  // Clicking or focusing a patch in the graph shows its inputs.
   for (const kind of ["click", "focusin"]) {
     byId("report-graph").addEventListener(kind, ({ target }) => {
       const port = target.closest(".patch")?.querySelector("[data-port]");
@@ -425,7 +431,7 @@ export async function start() {
   takeOther(await kept("other", ""));
   const before = await kept("opened", "");
   const document = (await kept("document", "animation")) ?? read(animation, "animation", "animation");
-  // Both are there before the choice between them.
+  // Both must exist before the choice between them.
   versions = [{ ...(before ?? document), name: document.name, edited: null, open: null }];
   if (before !== null) versions.push({ ...document, edited: several, open: null });
   at = versions.length - 1;

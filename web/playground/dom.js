@@ -1,4 +1,4 @@
-// What all subjects need of the page.
+// Helpers for all tabs.
 
 import { hasEnded } from "../src/native.js";
 
@@ -17,26 +17,26 @@ export function svgElement(name, attributes = {}) {
   return made;
 }
 
-/** Fills a list of choices; keys are what is kept, values what is shown. */
+/** Fills a select element; keys are the values, values the labels. */
 export function choices(select, entries) {
   select.replaceChildren(...entries.map(([value, text]) => element("option", { value }, text)));
 }
 
 let saying = 0;
 
-/** Says what was done, for a moment. */
+/** Shows a short confirmation. */
 export function say(text) {
   clearTimeout(saying);
   byId("said").textContent = text;
   saying = setTimeout(() => (byId("said").textContent = ""), 3000);
 }
 
-/** What went wrong, in one line. */
+/** A one-line message for an error. */
 export function messageOf(error) {
   return hasEnded() ? "There is not enough memory for this. Reload the page to go on." : error.message;
 }
 
-/** Calls `update`; what it throws is shown in the place for errors, and what was shown before stays. */
+/** Calls `update`. An exception is shown as an error, and the rest of the page stays unchanged. */
 export function attempt(place, update) {
   try {
     update();
@@ -46,5 +46,5 @@ export function attempt(place, update) {
   }
 }
 
-/** Six digits, which is as many as people read. */
+/** Formats with six digits. */
 export const shortly = (number) => String(Number(number.toPrecision(6)));

@@ -1,8 +1,9 @@
-// Places for the boxes of a graph, in the words of Graphviz, which browsers do not have.
+// Places the boxes of a graph with dagre and answers in Graphviz's format, since browsers have no
+// Graphviz.
 
 import dagre from "dagre";
 
-// More would take seconds, and those who wait for them see nothing else.
+// More would take seconds, during which nothing else is shown.
 const mostBoxes = 300;
 const mostLines = 1000;
 const longestMilliseconds = 2000;
@@ -30,7 +31,7 @@ function placed(boxes, lines) {
 
 const answers = new Map();
 
-/** What `dot -Tplain` would answer to the graphs that layout.cpp of the report writes, or null where it takes too long. */
+/** The output of `dot -Tplain` for the graphs that the report's layout.cpp writes, or null where it would take too long. */
 export function answerOfDot(text) {
   if (answers.has(text)) return answers.get(text);
   const started = performance.now();
@@ -49,7 +50,7 @@ export function answerOfDot(text) {
   return answer;
 }
 
-/** Lets go of the answers for a document that is no longer shown. */
+/** Discards the layouts of a document that is no longer shown. */
 export function forgetAnswers() {
   answers.clear();
 }

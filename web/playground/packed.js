@@ -1,6 +1,6 @@
-// Texts short enough for an address.
+// Compresses strings for addresses.
 
-// Nobody's document is larger, and a few letters can stand for more memory than there is.
+// The limit of unpacked strings: a few letters can stand for more memory than there is.
 const mostBytes = 1 << 24;
 
 async function through(stream, bytes) {
@@ -15,14 +15,14 @@ async function through(stream, bytes) {
   }
 }
 
-/** The text, compressed, in letters that addresses may have. */
+/** Compresses a string into characters that addresses may contain. */
 export async function packed(text) {
   const bytes = await through(new CompressionStream("deflate-raw"), new TextEncoder().encode(text));
   const letters = Array.from(bytes, (byte) => String.fromCharCode(byte)).join("");
   return btoa(letters).replaceAll("+", "-").replaceAll("/", "_").replace(/=+$/, "");
 }
 
-/** What was packed; what was not throws. */
+/** The inverse. Throws for other strings. */
 export async function unpacked(letters) {
   const bytes = Uint8Array.from(atob(letters.replaceAll("-", "+").replaceAll("_", "/")), (letter) => letter.charCodeAt(0));
   return new TextDecoder().decode(await through(new DecompressionStream("deflate-raw"), bytes));

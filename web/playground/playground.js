@@ -1,4 +1,4 @@
-// The page: its subjects, of which one is shown.
+// The page and its tabs.
 
 import createNative from "native";
 import wasmBinary from "playground.wasm";
@@ -43,7 +43,8 @@ for (const button of document.querySelectorAll("[data-copies]")) {
       await navigator.clipboard.writeText(text.textContent);
       say("Copied");
     } catch {
-      // Pages that are opened as files may not be allowed to: then it is selected, to be copied by hand.
+      // Pages opened from files may not write to the clipboard: then the link is selected, to be
+      // copied by hand.
       getSelection().selectAllChildren(text);
       say("Selected");
     }
@@ -55,7 +56,7 @@ values.start();
 curves.start();
 shapes.start();
 show(byId(`tab-${stateOf("show", "values")}`) ?? tabs[0]);
-// Elsewhere the link would go into the address.
+// Without this the link would change the address.
 document.querySelector(".skip").addEventListener("click", (event) => {
   event.preventDefault();
   byId("main").focus();

@@ -17,7 +17,7 @@
 using namespace tarn::engine;
 using emscripten::val;
 
-// In a browser JavaScript has the answer (layout.js).
+// In a browser, JavaScript computes the layout (layout.js).
 std::optional<std::string> answerOfDot(std::string const& text) {
     val const answer = val::module_property("answerOfDot")(text);
     if (answer.isNull()) return std::nullopt;
@@ -52,7 +52,7 @@ val answerOf(GraphSections const& sections) {
     return answer;
 }
 val graph(Address root) { return answerOf(graphSections(patchAt(root))); }
-// With what is not as it is `before`.
+// With the changes since `before`.
 val comparedGraph(Address root, double framesPerSecond, Address before,
                   double framesPerSecondBefore) {
     Document const from = documentOf(before, framesPerSecondBefore);
@@ -61,7 +61,7 @@ val comparedGraph(Address root, double framesPerSecond, Address before,
     return answerOf(graphSections(to.root, &marks));
 }
 
-// What the graph says of an input, as JSON; null where there is none.
+// The description of an input in the graph, as JSON; null where there is none.
 val input(Address root, unsigned low, unsigned high) {
     PatchIndex const index(patchAt(root));
     Port const* const port = index.findInputPort(idOf(low, high));

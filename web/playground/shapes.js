@@ -1,12 +1,12 @@
-// The subject of shapes: one shape with its parameters, as handles and as fields, and another to morph to.
+// The Shapes tab: a shape with its parameters as handles and fields, and another one to morph to.
 
 import { interpolate, PathBuilder, PathInstruction, svgPathData } from "../src/library.js";
 import { numberOf } from "./contents.js";
 import { attempt, byId, choices, element, shortly, svgElement } from "./dom.js";
 import { keep, keepField, stateOf } from "./state.js";
 
-// Parameters by name: a point is two numbers; `of` makes the place of a handle from the parameters, `to` the parameters from
-// the place.
+// Parameters by name; a point is two numbers. `of` computes the position of a handle from the
+// parameters, `to` the parameters from the position.
 const point = (name) => ({ names: [`${name} x`, `${name} y`], of: (p) => [p[`${name} x`], p[`${name} y`]], to: (x, y) => ({ [`${name} x`]: x, [`${name} y`]: y }) });
 const size = {
   names: ["width", "height"], of: (p) => [p["origin x"] + p.width, p["origin y"] + p.height],
@@ -67,7 +67,7 @@ const shape = () => shapes[byId("shape-kind").value];
 const namesOf = ({ handles }) => handles.flatMap(({ names }) => names);
 const pathOf = ({ draw }, numbers) => draw(new PathBuilder(), numbers).build();
 
-// What can be seen and drawn.
+// The visible part of the plane.
 const farthest = 1e6;
 
 function numbers() {
@@ -108,7 +108,7 @@ function update() {
     const other = byId("morph-kind").value;
     const t = Number(byId("morph-progress").value);
     const morphed = other === "" ? path : interpolate(path, pathOf(shapes[other], shapes[other].begin), t);
-    byId("morph-note").textContent = morphed === null ? "These two do not have the same instructions: there is nothing between them." : "";
+    byId("morph-note").textContent = morphed === null ? "These two have different instructions, so there is no shape between them." : "";
     const shownPath = morphed ?? path;
     byId("shape-outline").setAttribute("d", svgPathData(shownPath));
     byId("shape-elements").replaceChildren(...shownPath.elements.map(({ instruction, points }) =>
@@ -126,7 +126,7 @@ function update() {
   });
 }
 
-// The handle's place changes by so much.
+// Moves the handle by this much.
 function moveHandle(i, dx, dy) {
   attempt(byId("shape-error"), () => {
     const now = parameters();

@@ -1,8 +1,9 @@
-// What is set, in the address: a link shows the same. Fields have the keys of their elements' identifiers.
+// Keeps the settings in the address, so that a link shows the same. Keys are the identifiers of the
+// fields.
 
 const current = new URLSearchParams(location.hash.slice(1));
 let writing = 0;
-/** No value in the address is longer: programs that links are sent with cut them off. */
+/** The longest value in the address: programs that send links truncate long ones. */
 export const longest = 30000;
 
 export function stateOf(key, otherwise) {
@@ -15,19 +16,19 @@ function write() {
   history.replaceState(null, "", `#${current}`);
 }
 
-/** Keeps a text; null, and what is too long, takes the key away. */
+/** Stores a string; null and strings that are too long remove the key. */
 export function keep(key, value) {
   if (value === null || value.length > longest) current.delete(key);
   else current.set(key, value);
-  // Browsers refuse to be told too often.
+  // Browsers limit how often the address may change.
   if (writing === 0) writing = setTimeout(write, 250);
 }
 addEventListener("pagehide", () => writing !== 0 && write());
 
-/** Gives a field what the address has for it, or `otherwise`, and keeps what it is set to. */
+/** Sets a field from the address, or to `otherwise`, and stores its changes. */
 export function keepField(field, otherwise, changed) {
   field.value = stateOf(field.id, otherwise);
-  // A choice that is not there.
+  // The option does not exist.
   if (field.value === "" && field.options !== undefined) field.value = otherwise;
   field.addEventListener("input", () => {
     keep(field.id, field.value);

@@ -1,18 +1,18 @@
-// The subject of values: what one reads as, and what a port makes of it.
+// The Values tab: the conversions of a value, and what a port does with it.
 
 import { castValueToType, portNameForTypeInfo, Type, typeToString, Value } from "../src/library.js";
 import { cppOf, kinds, numberOf, typeNames } from "./contents.js";
 import { attempt, byId, choices, element } from "./dom.js";
 import { keepField } from "./state.js";
 
-// What to show of a value of that type: its text, or for data the data.
+// The string to show for a value of that type; for unstructured data the data.
 const shown = (value) => (value.type === Type.Unstructured ? value.asUnstructured().toText(400) : value.toString());
 
-// The least integer has no literal of its own.
+// The smallest integer has no literal.
 const cppInteger = (integer) => (integer === -(2n ** 63n) ? "-9223372036854775807LL - 1" : `${integer}LL`);
 const cppString = (string) =>
   JSON.stringify(string).replace(/\\u00([01][0-9a-f])|\u007f/g, (_, code = "7f") => `\\${parseInt(code, 16).toString(8).padStart(3, "0")}`);
-// JSON of JavaScript has no 64-bit integers.
+// JavaScript's JSON has no 64-bit integers.
 const wholeNumber = (_, content) => (typeof content === "bigint" ? Number(content) : content);
 
 function code(value) {
@@ -28,7 +28,7 @@ function code(value) {
 function update() {
   attempt(byId("value-error"), () => {
     const value = kinds[byId("value-type").value].read(byId("value-content").value);
-    const readings = typeNames.map((name) => {
+    const conversions = typeNames.map((name) => {
       const type = Type[name];
       const heading = element("th", { scope: "row", class: `t-${typeToString(type)}` }, typeToString(type));
       return element("tr", {}, heading, element("td", {}, shown(value.asType(type))));
@@ -37,8 +37,8 @@ function update() {
     const port = { type: Type[byId("port-type").value], min: bound("port-min"), max: bound("port-max") };
     const ofPort = shown(castValueToType(value, port).asType(port.type));
     const inCpp = code(value);
-    // All of it, or nothing where something cannot be read.
-    byId("value-readings").replaceChildren(...readings);
+    // Updates everything, or nothing where an input is invalid.
+    byId("value-conversions").replaceChildren(...conversions);
     byId("port-name").textContent = portNameForTypeInfo(port);
     byId("port-value").textContent = ofPort;
     byId("value-code").textContent = inCpp;

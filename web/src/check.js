@@ -1,4 +1,4 @@
-// What arguments have to be. Whatever is not what it has to be is said in a sentence.
+// Checks arguments. Invalid ones throw an error with a full sentence.
 
 export function describe(x) {
   if (x === null) return "null";
@@ -34,7 +34,7 @@ export function string(x, what) {
   return x;
 }
 
-// A BigInt of 64 bits, from one or from a number that is whole and exact.
+// A 64-bit BigInt, from a BigInt or an exact integral number.
 function wide(x, what, wanted, least, most) {
   if (typeof x === "number" && Number.isSafeInteger(x)) x = BigInt(x);
   if (typeof x !== "bigint") throw mustBe(what, wanted, x);
@@ -50,7 +50,7 @@ export function identifier(x, what = "an identifier") {
   return wide(x, what, "an unsigned integer of 64 bits", 0n, 2n ** 64n - 1n);
 }
 
-// As the two halves that the native functions take.
+// Splits it into the two halves that native functions take.
 export function halves(x, what) {
   const id = identifier(x, what);
   return [Number(id & 0xffffffffn), Number(id >> 32n)];
@@ -61,7 +61,7 @@ export function enumerator(x, names, what) {
   return x;
 }
 
-// A position in a list; none is its end.
+// A position in a list; undefined is the end.
 export function position(x) {
   if (x === undefined) return -1;
   if (!Number.isSafeInteger(x) || x < 0) throw mustBe("a position", "a whole number from 0", x);
@@ -71,12 +71,13 @@ export function position(x) {
 const typedArray = Object.getPrototypeOf(Uint8Array.prototype);
 const tagOf = Object.getOwnPropertyDescriptor(typedArray, Symbol.toStringTag).get;
 
-/** What kind of typed array it is, of this page or of another: "Float64Array"; undefined for everything else. */
+/** The kind of a typed array, from this page or another: "Float64Array"; undefined for everything else. */
 export const typedArrayKind = (x) => tagOf.call(x);
 
 export const isList = (x) => Array.isArray(x) || typedArrayKind(x) !== undefined;
 
-// The numbers of a list, or undefined for what is none; counts are those that the list may have, if not any.
+// The numbers of a list, or undefined for anything else; `counts` are the allowed lengths, if
+// limited.
 export function listOfNumbers(x, counts) {
   if (!isList(x)) return undefined;
   const numbers = Array.from(x);

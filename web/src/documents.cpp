@@ -1,4 +1,4 @@
-// Documents, and what they compute and draw.
+// Documents, their evaluation and drawing.
 
 #include "graphs.h"
 #include "native.h"
@@ -33,7 +33,7 @@ val errorOf(DocumentError const& error) {
     return object;
 }
 
-// Either {root, info} or {error}.
+// Returns {root, info} or {error}.
 val read(std::string const& text) {
     val answer = val::object();
     DocumentError error;
@@ -67,7 +67,7 @@ val kindOfName(std::string const& name) {
     return kind ? val(std::to_string(*kind)) : val::null();
 }
 
-// A document with its evaluator, which refers to it.
+// A document with its evaluator, which refers to the document.
 struct Evaluation {
     Evaluation(Patch root, DocumentInfo info)
         : document{std::move(root), std::move(info)},

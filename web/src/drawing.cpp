@@ -19,7 +19,7 @@ namespace {
 
 using Bytes = std::string;
 
-// What a PathBuilder of JavaScript was asked for; engine_base.js has the same numbers.
+// The calls of a PathBuilder in JavaScript; engine_base.js has the same numbers.
 enum class Command : unsigned char {
     MoveTo,
     LineTo,
@@ -116,7 +116,7 @@ val optionalPath(Optional<Path> const& path) {
 
 bool pathEquals(Bytes const& a, Bytes const& b) { return pathOf(a) == pathOf(b); }
 std::string svgData(Bytes const& path) { return svgPathData(pathOf(path)); }
-// The path, or where in the text it is not one.
+// Returns the path, or the position of the error in the string.
 val pathFromSvg(std::string const& data) {
     std::size_t fault = 0;
     Optional<Path> const path = pathFromSvgPathData(data, &fault);
@@ -153,8 +153,8 @@ val easeValue(unsigned char function, Bytes const& start, Bytes const& end, doub
         ease(EasingFunction(function), Reader(start).value(), Reader(end).value(), t);
     return bytesOf(Writer().value(eased).bytes);
 }
-// The components of all answers, one after another. `easeEach` has code of its own for each curve
-// and type, which is not worth its size here.
+// The components of all results. `easeEach` has separate code for each curve and type, which would
+// make the module too large.
 template <class T>
 val easedEach(EasingFunction function, T start, T end, std::vector<double> const& progress) {
     std::vector<T> eased;

@@ -1,4 +1,4 @@
-// Patches, their index, edits and changes.
+// Patches, indexes, edits and changes.
 
 #include "graphs.h"
 #include "native.h"
@@ -25,7 +25,7 @@ namespace {
 
 using Bytes = std::string;
 
-// As in graphs.js and for documents.
+// The same limit as in graphs.js and for documents.
 constexpr std::size_t kDeepest = 1000;
 
 Address addressOf(Patch const* patch) { return reinterpret_cast<Address>(patch); }
@@ -33,7 +33,7 @@ Address addressOf(Patch const* patch) { return reinterpret_cast<Address>(patch);
 Root makeRoot(Bytes const& patch) { return Root(Reader(patch).patch()); }
 Address rootAddress(Root const& root) { return addressOf(root.patch.get()); }
 
-// All of a patch but its children, then their addresses.
+// A patch without its children, followed by their addresses.
 val patchRecord(Address address) {
     Patch const& patch = patchAt(address);
     Writer out;
@@ -62,7 +62,7 @@ val outputForTag(Address patch, unsigned low, unsigned high) {
 
 PatchIndex makeIndex(Address root) { return PatchIndex(patchAt(root)); }
 void updateIndex(PatchIndex& index, Address root) { index.update(patchAt(root)); }
-// 0 for none, and 1 for the root, which is in another place there.
+// 0 for none and 1 for the root, whose address is different there.
 Address inIndex(PatchIndex const& index, Patch const* patch) {
     return patch == &index.root() ? 1 : addressOf(patch);
 }
@@ -101,8 +101,8 @@ val indexOutgoingFromPatch(PatchIndex const& index, unsigned low, unsigned high)
     return connections(index.outgoingConnectionsFromPatch(idOf(low, high)));
 }
 
-// An edit, and how deep patches are in it: browsers give less stack than systems, and a graph is
-// destroyed level by level.
+// An edit that tracks the depth of patches: destroying a graph is recursive, and browsers have
+// small stacks.
 class Edit {
 public:
     explicit Edit(PatchIndex const& index)
@@ -110,14 +110,14 @@ public:
 
     PatchEdit changes;
 
-    // Whether a patch of so many levels may stand there.
+    // Whether a patch with this many levels may be added there.
     bool fits(unsigned long long parent, std::size_t levels) const {
         return depthOf(parent) + levels <= kDeepest;
     }
     static std::size_t levelsOf(Patch const& added) {
         return levelsBelow(added.id, &added, nullptr);
     }
-    // Those of a patch in the edit. What was removed from it counts as if it were there.
+    // The levels of a patch in the edit. Removed patches still count.
     std::size_t levelsOf(unsigned long long id) const {
         return levelsBelow(id, before->findPatch(id), this);
     }
@@ -137,18 +137,18 @@ public:
     }
 
     Root commit() {
-        before = nullptr;  // An index that shares tables is updated slowly.
+        before = nullptr;  // Updating an index that shares its tables is slow.
         return Root(changes.commit());
     }
     bool isDone() const { return before == nullptr; }
 
 private:
-    // The levels of a patch as it is, or as it is in the edit. Ends with the first that is too
-    // deep: where identifiers repeat, patches that were moved may seem to be in themselves.
+    // The levels of a patch, before or in the edit. Stops at the limit: with repeated identifiers,
+    // a moved patch may seem to contain itself.
     static std::size_t levelsBelow(unsigned long long id, Patch const* patch, Edit const* edit) {
         struct Open {
             unsigned long long id;
-            Patch const* patch;  // Null for one that was added.
+            Patch const* patch;  // Null for an added patch.
             std::size_t level;
         };
         std::size_t levels = 0;
@@ -190,7 +190,7 @@ private:
     }
 
     std::unique_ptr<PatchIndex> before;
-    // Of the patches that were added or moved.
+    // For added or moved patches.
     std::unordered_map<unsigned long long, unsigned long long> parents;
     std::unordered_map<unsigned long long, std::unordered_set<unsigned long long>> children;
 };
@@ -206,7 +206,7 @@ val editPort(Edit& edit, bool isInput, unsigned low, unsigned high) {
     return optionalPort(portOf(edit, isInput, idOf(low, high)));
 }
 
-// The field of a patch that `Reader` finds in the bytes; false where there is no such patch.
+// Sets the field that `Reader` finds in the bytes; false where the patch does not exist.
 bool setPatchField(Edit& edit, unsigned low, unsigned high, std::string const& field,
                    Bytes const& content) {
     Patch* const patch = edit.changes.patch(idOf(low, high));
@@ -232,7 +232,7 @@ bool setPortField(Edit& edit, bool isInput, unsigned low, unsigned high, std::st
     return true;
 }
 
-// A negative position is the end, and so is one that no list has.
+// A negative position and one beyond the list mean the end.
 std::size_t placeOf(double position) {
     bool const isPlace = position >= 0 && position < static_cast<double>(PatchEdit::kEnd);
     return isPlace ? static_cast<std::size_t>(position) : PatchEdit::kEnd;
@@ -248,7 +248,7 @@ bool removePort(Edit& edit, bool isInput, unsigned low, unsigned high) {
     unsigned long long const id = idOf(low, high);
     return isInput ? edit.changes.removeInputPort(id) : edit.changes.removeOutputPort(id);
 }
-// What graphs.js is answered where a patch is added or moved.
+// The results for graphs.js when a patch is added or moved.
 constexpr int kRefused = 0;
 constexpr int kDone = 1;
 constexpr int kTooDeep = 2;
@@ -283,7 +283,7 @@ std::string freshPatchId(Edit& edit) { return std::to_string(edit.changes.freshP
 std::string freshPortId(Edit& edit) { return std::to_string(edit.changes.freshPortId()); }
 Root commit(Edit& edit) { return edit.commit(); }
 
-// For each change its kind, its patch's identifier, both addresses and its text.
+// For each change: its kind, its patch's identifier, both addresses and its description.
 val changes(Address before, Address after) {
     Writer out;
     std::vector<PatchChange> const list = patchChanges(patchAt(before), patchAt(after));

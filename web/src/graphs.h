@@ -1,4 +1,4 @@
-// web/src/graphs.h: what JavaScript holds of a graph.
+// web/src/graphs.h: handles that JavaScript has for graphs.
 
 #ifndef WEB_GRAPHS_H
 #define WEB_GRAPHS_H
@@ -11,13 +11,13 @@
 
 namespace web {
 
-// A patch as JavaScript knows it: that keeps the root which it lives in for as long as it has it.
+// A handle for a patch: it keeps the root that contains it alive.
 using Address = std::uintptr_t;
 inline tarn::engine::Patch const& patchAt(Address address) {
     return *reinterpret_cast<tarn::engine::Patch const*>(address);
 }
 
-// A graph in one place, whatever becomes of its owner.
+// A graph at a fixed address.
 struct Root {
     explicit Root(tarn::engine::Patch root)
         : patch(std::make_shared<tarn::engine::Patch const>(std::move(root))) {}

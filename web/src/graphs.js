@@ -1,4 +1,4 @@
-// Patches, their index, edits, changes, documents and what they compute.
+// Patches, indexes, edits, changes, documents and their evaluation.
 
 import * as check from "./check.js";
 import { native, release } from "./native.js";
@@ -8,7 +8,7 @@ import { Reader, skipData, skipValue, textOf, Writer } from "./wire.js";
 
 const inspect = Symbol.for("nodejs.util.inspect.custom");
 
-// What is in the library's memory goes with the object that has it; `free` lets go of it at once.
+// Memory of the library is released with the object that owns it; `free` releases it at once.
 const forgotten = new FinalizationRegistry(release);
 
 class Held {
@@ -96,7 +96,7 @@ function writeConnection(out, connection) {
   for (const end of ends) out.integer(check.identifier(record(connection, "a connection")[end], end));
 }
 
-// Deeper ones could not be taken apart again on the stack that browsers give.
+// Destroying a graph is recursive, and browsers have small stacks.
 const deepest = 1000;
 
 function writeList(out, items, write) {
@@ -128,7 +128,7 @@ function writePatch(out, patch, level = 1) {
 }
 
 let rootOf;
-/** Where a patch is in the library's memory, for natives. */
+/** The address of a patch in the library's memory, for native functions. */
 export let addressOf;
 let patchAt;
 
@@ -150,7 +150,7 @@ export class Patch {
   }
   static {
     rootOf = (patch) => patch.#root;
-    // Only while the graph is there.
+    // Valid while the graph is alive.
     addressOf = (patch) => (patch.#root.handle, patch.#address);
     patchAt = (root, address) => (address === 0 ? null : new Patch(fromBytes, root, address));
   }
@@ -289,7 +289,7 @@ const written = (write) => {
   return out.bytes();
 };
 
-// How the fields of a record in an edit are written.
+// Writers for the fields of a record in an edit.
 const patchFields = {
   builtin: (out, x) => out.integer(check.identifier(x, "a builtin")),
   name: (out, x) => out.text(check.string(x, "a name")),
@@ -305,7 +305,7 @@ const portFields = {
   attributes: writeAttributes,
 };
 
-// An object whose fields are those of a record in an edit, as it will be.
+// An object whose properties are the fields of a record in an edit.
 function inEdit(fields, id, read, write) {
   const object = {};
   Object.defineProperty(object, "id", { value: id, enumerable: true });
@@ -331,7 +331,7 @@ export class PatchEdit {
     const halves = check.halves(id);
     const read = () => {
       const address = native.editPatch(this.#held.handle, ...halves);
-      // The record alone: what is in its lists may change as long as the edit goes on.
+      // Only the record: its lists may change while the edit continues.
       return address === 0 ? null : recordOf(new Reader(native.patchRecord(address)));
     };
     if (read() === null) return null;
@@ -401,7 +401,7 @@ export class PatchEdit {
   }
 }
 
-// As in graphs.cpp.
+// The same numbers as in graphs.cpp.
 function isDone(answer) {
   if (answer === 2) throw new RangeError(`patches must not be nested deeper than ${deepest} levels`);
   return answer === 1;
@@ -428,7 +428,7 @@ export function patchChanges(before, after) {
   }));
 }
 
-// In one line, whatever the keys of a document are.
+// Prints one line, whatever the keys of a document are.
 const shown = (pointer) =>
   pointer.replace(/[\u0000-\u001f\u007f]/g, (c) => `\\x${c.charCodeAt(0).toString(16).padStart(2, "0")}`);
 

@@ -1,4 +1,4 @@
-// Everything that the module exports.
+// The exports of the module.
 
 export {
   DocumentError, DocumentForm, Evaluator, findPatchRecursive, inPortForTag, kindToString, outPortForTag, Patch,

@@ -1,6 +1,6 @@
-// web/src/native.h: how functions become JavaScript's. They are compiled without exceptions, which
-// a third of the module would be: what JavaScript passes was looked at there, and where memory
-// ends, so does the module.
+// web/src/native.h: exports functions to JavaScript. They are compiled without exceptions, which
+// would be a third of the module: JavaScript checks the arguments, and running out of memory ends
+// the module.
 //
 //     native<&valueText>("valueText");
 
@@ -14,8 +14,8 @@
 
 namespace web {
 
-// Bytes of an answer, as a Uint8Array of its own. Texts are answered so too: embind would take a
-// mark at their beginning away, and invent characters where bytes are none.
+// The bytes of a result as a new Uint8Array. Strings are returned so too: embind would remove a
+// byte order mark and replace invalid bytes.
 inline emscripten::val bytesOf(std::string const& bytes) {
     auto const* const first = reinterpret_cast<unsigned char const*>(bytes.data());
     return emscripten::val(emscripten::typed_memory_view(bytes.size(), first))

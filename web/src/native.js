@@ -1,4 +1,4 @@
-// The compiled part of the library, once it is there.
+// The compiled part of the library, once it is loaded.
 
 export let native;
 
@@ -10,8 +10,8 @@ function ended(cause) {
   return new RangeError("there is not enough memory or stack for this", { cause });
 }
 
-// Arguments were looked at before. What comes out of a function all the same has stopped it half-way, but for what embind
-// says of objects that were deleted before it calls anything.
+// Arguments were checked before. Exceptions from a function therefore mean that it stopped
+// half-way, except embind's errors about deleted objects, which are thrown before the call.
 function guarded(call) {
   return (...inputs) => {
     if (isEnded) throw new Error("the library ended for lack of memory or stack; load the module again");
@@ -23,7 +23,7 @@ function guarded(call) {
   };
 }
 
-/** Takes the functions over, so that none is called once one has ended for lack of memory or of stack. */
+/** Wraps the functions, so that none is called after one has ended for lack of memory or stack. */
 export function setNative(compiled) {
   native = {};
   for (const [name, call] of Object.entries(compiled)) {
@@ -31,7 +31,7 @@ export function setNative(compiled) {
   }
 }
 
-/** Lets go of what a handle stands for. After the end there is nothing to let go of. */
+/** Releases the object behind a handle. Does nothing after the module has ended. */
 export function release(handle) {
   if (isEnded) return;
   try {

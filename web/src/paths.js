@@ -86,7 +86,7 @@ export function interpolate(a, b, t) {
   return bytes === null ? null : new Path(fromBytes, bytes);
 }
 
-// As in drawing.cpp.
+// The same numbers as in drawing.cpp.
 const Command = Object.freeze({
   moveTo: 0, lineTo: 1, curveTo: 2, quadCurveTo: 3, close: 4, append: 5, arcTo: 6, ellipse: 7, circle: 8, roundRect: 9,
   hexaRect: 10,
@@ -176,7 +176,7 @@ export function stringToEasingFunction(name) {
   return curve < 0 ? null : curve;
 }
 
-// What kind of end it is: "number", "bigint", "value" or the number of a vector's components.
+// The type of an end: "number", "bigint", "value" or the number of a vector's components.
 function endOf(x) {
   if (typeof x === "number" || typeof x === "bigint") return typeof x;
   if (x instanceof Value) return "value";
@@ -205,7 +205,7 @@ export function ease(easingFunction, start, end, t) {
   return native.easeMany(curve, bytesOf(valueOf(start)), bytesOf(valueOf(end)), progress);
 }
 
-// A copy, which nobody changes or takes away while it is read.
+// A copy, which cannot change or be detached while it is read.
 function progressOf(t) {
   if (check.typedArrayKind(t) === "Float64Array") return new Float64Array(t);
   const numbers = check.listOfNumbers(t);

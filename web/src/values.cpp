@@ -1,4 +1,4 @@
-// Values, ports and data.
+// Values, ports and unstructured data.
 
 #include "native.h"
 #include "wire.h"
@@ -31,7 +31,7 @@ Unstructured dataOf(Bytes const& bytes) { return Reader(bytes).data(); }
 
 double valueNumber(Bytes const& value) { return double(valueOf(value)); }
 bool valueTruth(Bytes const& value) { return bool(valueOf(value)); }
-// As digits, which a BigInt is made from.
+// As decimal digits, from which JavaScript makes a BigInt.
 std::string valueInteger(Bytes const& value) {
     return std::to_string(static_cast<long long>(valueOf(value)));
 }

@@ -1,4 +1,4 @@
-// Values, data and ports.
+// Values, unstructured data and ports.
 
 import * as check from "./check.js";
 import { native } from "./native.js";
@@ -6,9 +6,9 @@ import { Kind, nullPayload, Reader, skipData, textOf, wellFormed, Writer } from 
 
 const inspect = Symbol.for("nodejs.util.inspect.custom");
 
-/** Makes an object of a class from bytes that the library wrote. */
+/** Makes an object of a class from bytes written by the library. */
 export const fromBytes = Symbol("from bytes");
-// The bytes of each value, data and path. Nobody else can reach them, so they never change.
+// The bytes of each value, tree and path. They are private, so they never change.
 const contents = new WeakMap();
 
 export const remember = (object, bytes) => contents.set(object, bytes);
@@ -33,16 +33,16 @@ export const typeIsResource = (type) => native.typeIsResource(typeOf(type));
 export const typeShouldCopyAcrossDeletedConnections = (type) =>
   native.typeShouldCopyAcrossDeletedConnections(typeOf(type));
 
-// Other classes that a value holds; paths.js adds its own.
+// Other classes that a value can contain; paths.js adds its own.
 export const held = { Path: undefined };
 
-// Of this page or of another.
+// From this page or another one.
 const plain = (x) => {
   const prototype = Object.getPrototypeOf(x);
   return prototype === null || Object.getPrototypeOf(prototype) === null || x instanceof Map;
 };
 
-/** Writes data from what JavaScript has for it. Of any depth; what contains itself is a TypeError. */
+/** Writes JavaScript values as unstructured data, of any depth. A TypeError for data that contains itself. */
 function writeData(out, data) {
   const open = [{ items: [data].values(), of: undefined, isMap: false }];
   const inside = new Set();
@@ -83,7 +83,7 @@ function writeData(out, data) {
       if (inside.has(value)) throw new TypeError("data must not contain itself");
       inside.add(value);
       const isMap = !Array.isArray(value);
-      // A copy: what a getter changes meanwhile does not matter.
+      // A copy, since getters may change the original.
       const items = isMap ? entriesOf(value) : Array.from(value);
       out.byte(isMap ? Kind.Map : Kind.Array).count(items.length);
       open.push({ items: items.values(), of: value, isMap });
@@ -95,7 +95,7 @@ function writeData(out, data) {
 
 function entriesOf(map) {
   const entries = (map instanceof Map ? [...map] : Object.entries(map)).filter(([, value]) => value !== undefined);
-  // Keys that become one are one; the last counts.
+  // Keys that become equal are merged; the last one counts.
   return [...new Map(entries.map(([key, value]) => [wellFormed(check.string(key, "a key of data")), value]))];
 }
 
@@ -118,7 +118,7 @@ function readData(reader) {
       const top = open[open.length - 1];
       if (isWhole) {
         if (top === undefined) return whole;
-        // Not an assignment, for which "__proto__" is no name.
+        // Not an assignment, which would treat "__proto__" specially.
         if (top.map === undefined) top.array.push(whole);
         else Object.defineProperty(top.map, top.key, { value: whole, enumerable: true, writable: true, configurable: true });
         isWhole = false;
@@ -190,7 +190,7 @@ export class Unstructured {
   asString() {
     return textOf(native.dataString(bytesOf(this)));
   }
-  /** What JavaScript has for it: integers are numbers where those are exact, else bigints. */
+  /** Converts to JavaScript values: integers become numbers where those are exact, otherwise bigints. */
   toJS() {
     return readData(new Reader(bytesOf(this)));
   }
@@ -221,19 +221,19 @@ export class Unstructured {
     return this.find(...(Array.isArray(path) ? path : [path])) ?? new Unstructured();
   }
   numberAt(path, otherwise) {
-    return native.dataNumberAt(bytesOf(this.#at(path)), check.number(otherwise, "a number to give instead"));
+    return native.dataNumberAt(bytesOf(this.#at(path)), check.number(otherwise, "the default number"));
   }
   integerAt(path, otherwise) {
-    const [low, high] = check.halves(BigInt.asUintN(64, check.signed64(otherwise, "an integer to give instead")));
+    const [low, high] = check.halves(BigInt.asUintN(64, check.signed64(otherwise, "the default integer")));
     return BigInt(native.dataIntegerAt(bytesOf(this.#at(path)), low, high));
   }
   boolAt(path, otherwise) {
-    if (typeof otherwise !== "boolean") throw check.mustBe("a truth to give instead", "a boolean", otherwise);
+    if (typeof otherwise !== "boolean") throw check.mustBe("the default boolean", "a boolean", otherwise);
     return native.dataBoolAt(bytesOf(this.#at(path)), otherwise);
   }
   stringAt(path, otherwise) {
     const found = this.#at(path);
-    return found.isString() ? found.asString() : check.string(otherwise, "a string to give instead");
+    return found.isString() ? found.asString() : check.string(otherwise, "the default string");
   }
 
   toText(maxBytes = 4096, maxDepth = 16) {
@@ -257,7 +257,7 @@ function limit(x, what) {
   return Math.min(Math.floor(x), 0xffffffff);
 }
 
-// The type of a list of so many numbers.
+// The vector type with this many components.
 const vectors = new Map([[2, Type.Vec2], [3, Type.Vec3], [4, Type.Vec4], [16, Type.Mat4]]);
 
 function valueBytes(content) {
@@ -354,7 +354,7 @@ export class Value {
 
 export const valueOf = (x) => (x instanceof Value ? x : new Value(x));
 
-/** The kind of a port, as a plain object: {type, subtype, min, max, extra}. */
+/** The type of a port as a plain object: {type, subtype, min, max, extra}. */
 export function typeInfoBytes(info, out = new Writer()) {
   if (info === null || typeof info !== "object") throw check.mustBe("a TypeInfo", "an object such as {type: Type.Float}", info);
   out.byte(typeOf(info.type ?? Type.Float)).byte(check.enumerator(info.subtype ?? 0, 256, "a subtype"));

@@ -12,7 +12,7 @@ namespace web {
 
 namespace {
 
-// A map or an array that is being written, and where.
+// A map or an array that is being written, and the position in it.
 struct OpenForWriting {
     Unstructured::Map::const_iterator atKey;
     Unstructured::Map::const_iterator lastKey;
@@ -41,10 +41,11 @@ struct OpenForReading {
     }
 };
 
-// Two identifiers, a type without bounds, a default without a payload, no name and no attributes.
+// The minimal size: two identifiers, a type without bounds, a default without a payload, no name
+// and no attributes.
 constexpr std::size_t kSmallestPort = 8 + 8 + 5 + 1 + 4 + 5;
 
-// Added to the type of a value that holds no payload, which is not what it reads as.
+// Added to the type of a value with a null payload, which differs from its default.
 constexpr unsigned char kNullPayload = 0x80;
 
 bool isNullPayload(Value const& value) {
@@ -57,7 +58,7 @@ bool isNullPayload(Value const& value) {
     }
 }
 
-// What is left of a value that was moved from.
+// A moved-from value.
 Value nullPayload(Type type) {
     Value value = Value::defaultValue(type);
     Value const taken = std::move(value);
@@ -227,7 +228,7 @@ std::size_t Reader::count() {
     return n;
 }
 
-// No more than the rest can hold, so that a list is never reserved for nothing.
+// Limited by the remaining bytes, so that reserving never wastes memory.
 std::size_t Reader::countOf(std::size_t bytesOfEach) {
     std::size_t const n = count();
     if (n > rest.size() / bytesOfEach) std::abort();
@@ -394,7 +395,7 @@ ModelLayer Reader::modelLayer() {
     return layer;
 }
 
-// Apart from the recursion, which then takes little of the stack at each level.
+// A separate function, so that the recursion needs little stack at each level.
 [[gnu::noinline]] void Reader::patchFields(Patch& patch) {
     patch.id = integer();
     patch.builtin = integer();

@@ -1,11 +1,10 @@
-// web/src/wire.h: values, data, paths and records as bytes, which is how they go between JavaScript
-// and the library.
+// web/src/wire.h: the binary format in which values, data, paths and records pass between
+// JavaScript and the library.
 //
 //     Value value = Reader(bytes).value();
 //     std::string answer = Writer().value(value.asType(Type::Vec2)).bytes;
 //
-// Numbers have eight bytes, counts four, the lowest first. engine_base.js writes and reads the
-// same.
+// Numbers have eight bytes, counts four, little-endian. engine_base.js uses the same format.
 
 #ifndef WEB_WIRE_H
 #define WEB_WIRE_H
@@ -41,7 +40,7 @@ public:
     std::string bytes;
 };
 
-// Ends the module where the bytes are not those that a Writer writes.
+// Aborts where the bytes were not written by a Writer.
 class Reader {
 public:
     explicit Reader(std::string_view bytes) : rest(bytes) {}

@@ -1,10 +1,10 @@
-// Values, data, paths and records as bytes: the other side of wire.cpp.
+// The binary format of values, data, paths and records, as in wire.cpp.
 
 const encoder = new TextEncoder();
 const decoder = new TextDecoder("utf-8", { ignoreBOM: true });
 
 export const textOf = (bytes) => decoder.decode(bytes);
-/** As the library has it: half a surrogate pair becomes U+FFFD. */
+/** As UTF-8: a lone surrogate becomes U+FFFD. */
 export const wellFormed = (text) => decoder.decode(encoder.encode(text));
 
 export class Writer {
@@ -12,7 +12,7 @@ export class Writer {
   #view = new DataView(this.#bytes.buffer);
   #end = 0;
 
-  // The place for so many bytes more.
+  // Reserves this many more bytes.
   #take(count) {
     const at = this.#end;
     this.#end += count;
@@ -40,7 +40,7 @@ export class Writer {
     this.#view.setFloat64(at, d, true);
     return this;
   }
-  // Of 64 bits, signed or not.
+  // A 64-bit integer, signed or unsigned.
   integer(i) {
     const at = this.#take(8);
     this.#view.setBigUint64(at, BigInt.asUintN(64, i), true);
@@ -96,12 +96,12 @@ export class Reader {
   text() {
     return decoder.decode(this.raw(this.count()));
   }
-  // A part of the bytes, not a copy.
+  // A view of the bytes, not a copy.
   raw(count) {
     const at = this.#take(count);
     return this.#bytes.subarray(at, at + count);
   }
-  // What `skip` passes over, as bytes of its own.
+  // A copy of the bytes that `skip` passes over.
   part(skip) {
     const begin = this.#at;
     skip(this);
@@ -111,7 +111,7 @@ export class Reader {
 
 export const Kind = Object.freeze({ Null: 0, Map: 1, Array: 2, Float: 3, Integer: 4, UnsignedInteger: 5, String: 6 });
 
-// Passes over data of any depth.
+// Skips data of any depth.
 export function skipData(reader) {
   const open = [{ isMap: false, missing: 1 }];
   while (open.length > 0) {
@@ -140,10 +140,10 @@ export function skipPath(reader) {
   }
 }
 
-// How many bytes the values of a type have; what has none is of no fixed size.
+// The size of the values of a type in bytes; undefined for types without a fixed size.
 const sizes = [8, 16, 24, 32, 128, 1, 8, 8, 8, 8, undefined, undefined, 8, undefined];
 
-/** Added to the type of a value whose matrix, path, string or data is none at all; only documents have those. */
+/** Added to the type of a value with a null payload; only documents have those. */
 export const nullPayload = 0x80;
 
 export function skipValue(reader) {

@@ -1,4 +1,4 @@
-// Graphs, edits, changes, documents and what they compute.
+// Graphs, edits, changes, documents and their evaluation.
 
 import assert from "node:assert/strict";
 import { readFileSync } from "node:fs";

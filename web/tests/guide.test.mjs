@@ -1,4 +1,4 @@
-// The programs of the guide's page print what the page says.
+// The programs in the guide's page print the documented output.
 
 import assert from "node:assert/strict";
 import { execFileSync } from "node:child_process";

@@ -1,5 +1,5 @@
-// What is made to break the module: objects that lie, change or are taken away while they are read, and graphs that no editor
-// makes. Every row leaves the library as it was.
+// Attacks on the module: objects that lie, change or are detached while they are read, and graphs
+// that no editor makes. The library must stay intact after each.
 
 import assert from "node:assert/strict";
 import { afterEach, test } from "node:test";
