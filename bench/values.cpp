@@ -272,7 +272,8 @@ void casting() {
         }
     });
     castTo("cast 10,000 to a float port with bounds", bounded, &low, &high);
-    castTo("cast 10,000 to a float port without", {Type::Float, 0, {}, {}, {}}, nullptr, nullptr);
+    castTo("cast 10,000 to a float port without bounds", {Type::Float, 0, {}, {}, {}}, nullptr,
+           nullptr);
     castTo("cast 10,000 to another port", {Type::Vec2, 0, Value(1000.0), Value(4000.0), {}},
            nullptr, nullptr);
     auto const ours = [](Loop const& loop) {
