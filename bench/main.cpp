@@ -192,6 +192,8 @@ int measure(Options const& options) {
     }
     std::fprintf(stderr, "\n");
     std::cout << bench::tableOf(rows);
+    std::string const above = bench::aboveLimit(rows);
+    if (!above.empty()) std::cout << "\nAbove the limits in bench/:\n" << above;
     if (options.kept.empty()) return 0;
     std::string const worse = bench::whatIsWorse(rows, options.kept);
     std::cout << "\n" << (worse.empty() ? "No operation is worse by more than a tenth.\n" : worse);

@@ -27,6 +27,9 @@ struct Row {
 /// Formats a Markdown table.
 std::string tableOf(std::vector<Row> const& rows);
 
+/// One line for each row whose ratio is above its target.
+std::string aboveLimit(std::vector<Row> const& rows);
+
 /// One line for each row whose ratio is worse by more than a tenth than in the table of the file
 /// `kept`. Ends the program where the file has no such table.
 std::string whatIsWorse(std::vector<Row> const& rows, std::string const& kept);
