@@ -163,7 +163,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     std::ostringstream stream;
     stream << root;
     std::string const text = textOf(root);
-    check(stream.str() == text, "debug text");
+    check(stream.str() == text, "debug output");
 
     EvalPatch const evaluated(root);
     check(samePatches(root, evaluated), "conversion");

@@ -22,9 +22,9 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     do {
         double const d = input.anyDouble();
         std::string const text = numberText(d, point);
-        check(to_string(tarn::engine::Value(d)) == text, "the text of a number");
+        check(to_string(tarn::engine::Value(d)) == text, "the string of a number");
         tarn::engine::Value const vector(tarn::engine::FloatVec2{d, -d});
-        check(to_string(vector) == text + ", " + numberText(-d, point), "the text of a vector");
+        check(to_string(vector) == text + ", " + numberText(-d, point), "the string of a vector");
     } while (!input.ended());
     return 0;
 }

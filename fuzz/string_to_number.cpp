@@ -18,11 +18,11 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
     tarn::engine::Value const value(text);
     double const number = textAsNumber(text);
     errno = 12345;
-    check(same(double(value), number), "a text as a number");
-    check(static_cast<long long>(value) == toInteger(number), "a text as an integer");
-    check(bool(value) == !text.empty(), "a text as a truth value");
-    check(static_cast<unsigned long long>(value) == 0, "a text as an identifier");
+    check(same(double(value), number), "a string as a number");
+    check(static_cast<long long>(value) == toInteger(number), "a string as an integer");
+    check(bool(value) == !text.empty(), "a string as a boolean");
+    check(static_cast<unsigned long long>(value) == 0, "a string as an identifier");
     check(errno == 12345, "errno stays as it was");
-    check(*value.ifString() == text, "a text stays as it is");
+    check(*value.ifString() == text, "the string is unchanged");
     return 0;
 }

@@ -279,7 +279,7 @@ void checkReadings(Value const& value, Model const& model) {
     check(to_string(value) == model.shown(), "text");
     std::ostringstream stream;
     stream << value;
-    check(stream.str() == model.shown(), "text in a stream");
+    check(stream.str() == model.shown(), "output to a stream");
     check(holds(value.asUnstructured(), model.asTree()), "data");
     check((value.asFloatMat4() != nullptr) == (model.type == Type::Mat4) &&
               (value.ifPath() != nullptr) == (model.type == Type::Path) &&

@@ -77,7 +77,7 @@ std::vector<Row> const kRows{
     {"value of nothing", 0, [](Inputs const&, Kept& k) { k.value = Value(); }},
     {"value of a double", 0, [](Inputs const&, Kept& k) { k.value = 2.5; }},
     {"value of an integer", 0, [](Inputs const&, Kept& k) { k.value = 7; }},
-    {"value of a truth value", 0, [](Inputs const&, Kept& k) { k.value = true; }},
+    {"value of a boolean", 0, [](Inputs const&, Kept& k) { k.value = true; }},
     {"value of two doubles", 0,
      [](Inputs const&, Kept& k) {
          k.value = FloatVec2{1, 2};
@@ -95,8 +95,8 @@ std::vector<Row> const kRows{
     {"value of a sound", 0, [](Inputs const&, Kept& k) { k.value = Value::Sound(7); }},
     {"value of a model", 0, [](Inputs const&, Kept& k) { k.value = Value::Model(7); }},
     {"value of a matrix", 1, [](Inputs const&, Kept& k) { k.value = FloatMat4(); }},
-    {"value of a short text", 1, [](Inputs const&, Kept& k) { k.value = "short"; }},
-    {"value of a long text", 2, [](Inputs const&, Kept& k) { k.value = kLongText; }},
+    {"value of a short string", 1, [](Inputs const&, Kept& k) { k.value = "short"; }},
+    {"value of a long string", 2, [](Inputs const&, Kept& k) { k.value = kLongText; }},
     {"value of an empty path", 1, [](Inputs const&, Kept& k) { k.value = Path(); }},
     {"value of a shared path", 0, [](Inputs const& in, Kept& k) { k.value = in.shared; }},
     {"value of shared data", 0,
@@ -104,7 +104,7 @@ std::vector<Row> const kRows{
     {"value of null data", 1, [](Inputs const&, Kept& k) { k.value = Unstructured(); }},
 
     {"copy of a number", 0, [](Inputs const& in, Kept& k) { k.value = in.number; }},
-    {"copy of a text", 0, [](Inputs const& in, Kept& k) { k.value = in.text; }},
+    {"copy of a string", 0, [](Inputs const& in, Kept& k) { k.value = in.text; }},
     {"copy of data", 0, [](Inputs const& in, Kept& k) { k.value = in.data; }},
     {"copy of a path value", 0, [](Inputs const& in, Kept& k) { k.value = in.path; }},
     {"copy of a matrix", 0, [](Inputs const& in, Kept& k) { k.value = in.matrix; }},
@@ -154,8 +154,8 @@ std::vector<Row> const kRows{
                      double(indexLoopCasting(in.loop, in.bounded, 17)) +
                      double(indexLoopCasting(nullLoop(), in.bounded, 17));
      }},
-    {"text of a number", 0, [](Inputs const& in, Kept& k) { k.text = to_string(in.number); }},
-    {"text of numbers, appended where there is room", 0,
+    {"string of a number", 0, [](Inputs const& in, Kept& k) { k.text = to_string(in.number); }},
+    {"strings of numbers, appended within the capacity", 0,
      [](Inputs const&, Kept& k) {
          for (Value const& value : {Value(1234.56), Value(-1e300), Value(LLONG_MIN), Value(true),
                                     Value(FloatVec4()), Value::Image(ULLONG_MAX)}) {
@@ -169,10 +169,10 @@ std::vector<Row> const kRows{
          k.patch.children = arrayOf<Patch>({});
      }},
     {"list of ports", 2, [](Inputs const&, Kept& k) { k.patch.inputs = arrayOf({Port{1}}); }},
-    {"text of a text", 1, [](Inputs const& in, Kept& k) { k.text = to_string(in.text); }},
+    {"string of a string", 1, [](Inputs const& in, Kept& k) { k.text = to_string(in.text); }},
     {"number as a number again", 0,
      [](Inputs const& in, Kept& k) { k.value = in.number.asType(Type::Vec4); }},
-    {"number as a text", 1,
+    {"number as a string", 1,
      [](Inputs const& in, Kept& k) { k.value = in.number.asType(Type::String); }},
 
     // Unstructured data: one allocation for each map, array and string, plus those of the standard
@@ -184,13 +184,13 @@ std::vector<Row> const kRows{
          k.data = 7;
          k.data = 7u;
      }},
-    {"data of a short text", 1, [](Inputs const&, Kept& k) { k.data = "short"; }},
-    {"data of a long text", 2, [](Inputs const&, Kept& k) { k.data = kLongText; }},
+    {"data of a short string", 1, [](Inputs const&, Kept& k) { k.data = "short"; }},
+    {"data of a long string", 2, [](Inputs const&, Kept& k) { k.data = kLongText; }},
     {"data of an empty map", 1, [](Inputs const&, Kept& k) { k.data = Unstructured::Map(); }},
     {"data of an empty array", 1, [](Inputs const&, Kept& k) { k.data = Unstructured::Array(); }},
     {"copy of an array of three", 2, [](Inputs const& in, Kept& k) { k.data = in.numbers; }},
     {"copy of a map of two", 3, [](Inputs const& in, Kept& k) { k.data = in.map; }},
-    {"readings of data", 0,
+    {"conversions of data", 0,
      [](Inputs const& in, Kept& k) {
          for (Unstructured const* u : {&in.numbers, &in.map, &in.word}) {
              k.number += u->asFloat() + double(u->asInteger()) + double(u->asId()) +
@@ -263,7 +263,7 @@ std::vector<Row> const kRows{
     {"copy of a patch", 0, [](Inputs const& in, Kept& k) { k.patch = in.root; }},
     {"equality of patches", 0,
      [](Inputs const& in, Kept& k) { k.number += in.root == in.root ? 1 : 0; }},
-    {"walks", 0,
+    {"queries", 0,
      [](Inputs const& in, Kept& k) {
          k.number += findPatchRecursive(in.root, 3) && findPatchRecursive(in.evaluated, 3) &&
                      findInputPort(in.evaluated, 21) && findOutputPort(in.evaluated, 22) &&

@@ -424,12 +424,12 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
             Row{"blank", " \n\t\n", "it is empty"},
             Row{"truncated", "{\"root\":\n {\"id\": 1,",
                 "line 2, column 11: /root/id: the JSON is incomplete"},
-            Row{"truncated text", "{\"root", "line 1, column 7: the JSON is incomplete"},
+            Row{"truncated string", "{\"root", "line 1, column 7: the JSON is incomplete"},
             Row{"no JSON", "{\"root\": nonsense}",
                 "line 1, column 11: /root: this is not valid JSON"},
             Row{"two documents", "{}{}", "line 1, column 3: this is not valid JSON"},
             Row{"bytes", std::string("\x80\xff\0", 3), "line 1, column 1: this is not valid JSON"},
-            Row{"bytes in a text", "{\"root\":{\"id\":1,\"name\":\"\xff\"}}",
+            Row{"invalid bytes in a string", "{\"root\":{\"id\":1,\"name\":\"\xff\"}}",
                 "line 1, column 25: /root/name: this is not valid JSON"},
             Row{"an array", "[]", "line 1, column 1: expected an object, found array"},
             Row{"a number", " 5", "line 1, column 2: expected an object, found number 5"},
@@ -444,7 +444,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
                 "line 1, column 38: /root/attributes/a/1: an integer beyond 64 bits"},
             Row{"huge double", "{\"root\":{\"id\":1,\n\"attributes\":{\"a\":[1, 1e400]}}}",
                 "line 2, column 23: /root/attributes/a/1: a number beyond the range of a double"},
-            Row{"root is a text", R"({"root":"x"})",
+            Row{"root is a string", R"({"root":"x"})",
                 "line 1, column 9: /root: expected an object, found string \"x\""},
             Row{"root is a list", R"({"root":[[1],2]})",
                 "line 1, column 9: /root: expected an object, found array"},
@@ -452,7 +452,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
                 "line 1, column 12: /version: version 2 of the format is not supported; the latest "
                 "is "
                 "1"},
-            Row{"version is a text", R"({"root":{"id":1},"version":"1"})",
+            Row{"version is a string", R"({"root":{"id":1},"version":"1"})",
                 "line 1, column 28: /version: expected an integer, found string \"1\""},
             Row{"identifiers", R"({"identifiers":"all","root":{"id":1}})",
                 "line 1, column 16: /identifiers: expected \"unique\" or \"any\", found string "
@@ -480,7 +480,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
             Row{"identifier is true", R"({"root":{"id":true}})",
                 "line 1, column 15: /root/id: expected an identifier, an integer from 0 on, found "
                 "true"},
-            Row{"identifier is a text", R"({"root":{"id":"01"}})",
+            Row{"identifier is a string", R"({"root":{"id":"01"}})",
                 "line 1, column 15: /root/id: expected an identifier, an integer from 0 on, found "
                 "string \"01\""},
             Row{"identifier is a list", R"({"root":{"id":[1]}})",
@@ -521,7 +521,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
             Row{"subtype beyond a byte", port(R"("type":"int","subtype":-1)"),
                 "line 1, column 78: /root/children/0/inputs/0/subtype: expected an integer from 0 "
                 "to 255"},
-            Row{"tag is a text", port(R"("type":"int","tag":"x")"),
+            Row{"tag is a string", port(R"("type":"int","tag":"x")"),
                 "line 1, column 74: /root/children/0/inputs/0/tag: expected an identifier, an "
                 "integer from 0 on, found string \"x\""},
             Row{"name is a number", port(R"("type":"int","name":5)"),
@@ -533,7 +533,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
             Row{"key has half an escape", R"({"root":{"id":1,"attributes":{"\u001a":0}}})",
                 "line 1, column 30: /root/attributes: U+001A must be followed by two hexadecimal "
                 "digits"},
-            Row{"children is a text", R"({"root":{"id":1,"children":"x"}})",
+            Row{"children is a string", R"({"root":{"id":1,"children":"x"}})",
                 "line 1, column 28: /root/children: expected an array, found string \"x\""},
             Row{"children is an object", R"({"root":{"id":1,"children":{}}})",
                 "line 1, column 28: /root/children: expected an array, found object"},
@@ -563,7 +563,7 @@ TEST(ReadDocument, RejectsInvalidDocuments) {
             Row{"vector element", port(R"("type":"vec2","default":[1,"2"])"),
                 "line 1, column 82: /root/children/0/inputs/0/default/1: expected a number, found "
                 "string \"2\""},
-            Row{"vector of truth", port(R"("type":"vec2","default":[1,true])"),
+            Row{"vector of booleans", port(R"("type":"vec2","default":[1,true])"),
                 "line 1, column 79: /root/children/0/inputs/0/default: true and false are for "
                 "ports "
                 "of type boolean"},

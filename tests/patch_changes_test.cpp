@@ -273,7 +273,7 @@ TEST(PatchChanges, ArePrintedForPeople) {
                  "changed patch 3 \"n3\": input 31 \"p31\" default 0.0 -> image 7; output 32 "
                  "\"p32\" "
                  "default 0.0 -> \"text\"; output 33 \"p33\" default 0.0 -> \"M1 2\"\n"},
-             Row{"a difference that no text shows",
+             Row{"a difference that prints the same",
                  [&](Model& m) { only(m, 2).inputs[0].defaultValue = std::string(); },
                  "changed patch 2 \"n2\": input 21 \"p21\" default 0.0 -> \"\"\n"},
              Row{"tag, name, type and attributes of a port",

@@ -55,7 +55,7 @@ TEST(Unstructured, StoresEverySourceAsItsKind) {
              Row{"string", Unstructured(text), Kind::String, 6},
              Row{"string, moved", Unstructured(std::string("x")), Kind::String, 6},
              Row{"literal", Unstructured("x"), Kind::String, 6},
-             Row{"null text", Unstructured(static_cast<char const*>(nullptr)), Kind::String, 6},
+             Row{"null string", Unstructured(static_cast<char const*>(nullptr)), Kind::String, 6},
              Row{"value", Unstructured(Value(2.5)), Kind::Float, 3},
          }) {
         SCOPED_TRACE(row.what);

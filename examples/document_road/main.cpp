@@ -102,7 +102,7 @@ struct Options {
         app.add_option("FILE", file, "The document; the variable can name it too")
             ->required()
             ->envname("DOCUMENT_ROAD_FILE");
-        app.add_flag("--debug", debug, "Print the graph's debug text");
+        app.add_flag("--debug", debug, "Print the graph's debug output");
         app.add_option("--patch", patchId, "Say what the patch ID is and is connected to")
             ->type_name("ID");
         app.add_option("--port", portId, "Say what the port ID is and is connected to")

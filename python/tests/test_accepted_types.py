@@ -20,7 +20,7 @@ VALUE: tarn.Value = tarn.ease(tarn.EasingFunction.LINEAR, tarn.Value(1), 2.5, ta
 COPIED = tarn.Port(attributes=tarn.Port(attributes={"a": 1}).attributes)
 
 
-def test_runs_too() -> None:
+def test_runs() -> None:
     assert [value.type.name for value in VALUES] == [
         "INT", "FLOAT", "BOOLEAN", "VEC2", "VEC3", "MAT4", "MAT4", "UNSTRUCTURED", "UNSTRUCTURED",
     ]  # fmt: skip

@@ -37,6 +37,6 @@ def test_the_version_has_three_numbers() -> None:
     assert re.fullmatch(r"\d+\.\d+\.\d+", tarn.__version__)
 
 
-def test_classes_are_named_as_programs_name_them() -> None:
+def test_classes_have_public_names() -> None:
     assert repr(tarn.Value) == "<class 'tarn_engine_base.Value'>"
     assert tarn.Type.__module__ == "tarn_engine_base"

@@ -25,7 +25,7 @@ def test_names() -> None:
 
 
 @pytest.mark.parametrize("function", list(EasingFunction), ids=lambda f: f.name)
-def test_arrays_have_the_bits_of_single_calls(function: EasingFunction) -> None:
+def test_arrays_match_single_calls_bit_for_bit(function: EasingFunction) -> None:
     progress = np.linspace(-0.5, 1.5, 97)
     numbers = ease(function, 3.0, 7.0, progress)
     assert numbers.tobytes() == np.array([ease(function, 3.0, 7.0, t) for t in progress]).tobytes()
@@ -35,7 +35,7 @@ def test_arrays_have_the_bits_of_single_calls(function: EasingFunction) -> None:
         assert vectors.tobytes() == np.array([ease(function, *ends, t) for t in progress]).tobytes()
 
 
-def test_shapes_are_kept() -> None:
+def test_shapes_are_preserved() -> None:
     for shape in ((), (0,), (5,), (2, 3), (2, 0, 4), (2, 3, 4)):
         progress = np.full(shape, 0.25)
         assert ease(EasingFunction.LINEAR, 0.0, 4.0, progress).shape == shape
@@ -47,7 +47,7 @@ def test_shapes_are_kept() -> None:
     assert ease(EasingFunction.LINEAR, 0.0, 1.0, np.zeros((3, 2)).T).shape == (2, 3)
 
 
-def test_refuses() -> None:
+def test_rejects() -> None:
     with pytest.raises(TypeError, match="as many components"):
         ease(EasingFunction.LINEAR, (1, 2), (1, 2, 3), 0.5)
     with pytest.raises(TypeError, match="as many components"):
@@ -62,7 +62,7 @@ def test_refuses() -> None:
         ease(EasingFunction.LINEAR, 0.0, 1.0, np.array(["a"]))
 
 
-def test_other_threads_run_meanwhile() -> None:
+def test_other_threads_run_concurrently() -> None:
     progress = np.linspace(0, 1, 20_000_000)
     counted = 0
     done = threading.Event()

@@ -26,7 +26,7 @@ def test_list_ports() -> None:
     ]
 
 
-def test_list_ports_goes_on_after_what_is_no_document(tmp_path: Path) -> None:
+def test_list_ports_continues_after_invalid_documents(tmp_path: Path) -> None:
     (tmp_path / "a.json").write_text("{}")
     (tmp_path / "b.json").write_text('{"root":{"id":1,"inputs":[{"id":2,"type":"float"}]}}')
     assert output("list_ports.py", tmp_path, "float") == "b.json: patch 1 '', port 2 ''\n"
@@ -66,10 +66,10 @@ PROGRAMS = re.findall(r"```python\n(.*?)```\n\n```text\n(.*?)```", PAGE, re.DOTA
 
 
 @pytest.mark.parametrize("program, text", PROGRAMS, ids=range(len(PROGRAMS)))
-def test_a_program_of_the_guide(program: str, text: str) -> None:
+def test_a_program_in_the_guide(program: str, text: str) -> None:
     done = subprocess.run([sys.executable, "-c", program], check=True, capture_output=True, text=True, cwd=ROOT)
     assert done.stdout == text
 
 
-def test_the_guide_shows_what_each_program_prints() -> None:
+def test_the_guide_shows_the_output_of_each_program() -> None:
     assert len(PROGRAMS) == PAGE.count("```python\n") >= 5

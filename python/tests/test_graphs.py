@@ -47,7 +47,7 @@ def test_records_have_their_fields() -> None:
     assert {connection, Connection(2, 20, 3, 30)} == {connection}
 
 
-def test_records_change_by_assignment_alone() -> None:
+def test_records_change_only_by_assignment() -> None:
     patch = graph()
     with pytest.raises(TypeError):
         patch.attributes["x"] = 1
@@ -66,7 +66,7 @@ def test_records_change_by_assignment_alone() -> None:
     assert [child.id for child in patch.children] == [2, 3, 9]
 
 
-def test_records_are_pickled_and_shown() -> None:
+def test_records_are_pickled_and_printed() -> None:
     patch = graph()
     for copied in (pickle.loads(pickle.dumps(patch)), copy.deepcopy(patch)):
         assert copied == patch
@@ -80,7 +80,7 @@ def test_records_are_pickled_and_shown() -> None:
     assert repr(patch) == "<Patch 1 'root': 0 inputs, 0 outputs, 2 children>"
 
 
-def test_index_answers() -> None:
+def test_index_queries() -> None:
     index = PatchIndex(graph())
     gc.collect()  # The index keeps its graph.
     assert index.root == graph()
@@ -144,7 +144,7 @@ def test_edit_and_changes() -> None:
     assert tarn.patch_changes(graph(), graph()) == []
 
 
-def test_an_index_follows_an_edit_at_the_cost_of_the_edit() -> None:
+def test_updating_an_index_costs_as_much_as_the_edit() -> None:
     groups = [Patch(id=1000 * i + 2, children=[Patch(id=1000 * i + j + 3) for j in range(500)]) for i in range(100)]
     root = Patch(id=1, children=groups)
     start = time.perf_counter()
@@ -168,7 +168,7 @@ def test_an_index_follows_an_edit_at_the_cost_of_the_edit() -> None:
     assert not edit.move_patch(5, 1)
 
 
-def test_a_part_that_is_removed_raises() -> None:
+def test_removed_parts_raise() -> None:
     edit = PatchEdit(PatchIndex(graph()))
     ring = edit.patch(3)
     assert ring is not None
@@ -178,7 +178,7 @@ def test_a_part_that_is_removed_raises() -> None:
     assert len(edit.commit().children) == 1
 
 
-def test_documents_there_and_back() -> None:
+def test_documents_round_trip() -> None:
     patch = graph()
     text = tarn.write_document(patch, 25.0)
     again, info = tarn.read_document_with_info(text)
@@ -222,7 +222,7 @@ def test_reads_the_bundled_documents() -> None:
         ('{"root":{"id":1,"inputs":[{"id":2,"type":"vec5"}]}}', 1, 42, "/root/inputs/0/type"),
     ],
 )
-def test_a_fault_has_its_place(text: str, line: int, column: int, pointer: str) -> None:
+def test_errors_have_a_position(text: str, line: int, column: int, pointer: str) -> None:
     with pytest.raises(tarn.DocumentError) as caught:
         tarn.read_document(text)
     error = caught.value
@@ -231,7 +231,7 @@ def test_a_fault_has_its_place(text: str, line: int, column: int, pointer: str) 
     assert error.message in str(error)
 
 
-def test_deep_graphs_need_no_stack_of_python() -> None:
+def test_deep_graphs_need_no_python_stack() -> None:
     def check() -> None:
         patch = Patch(id=10_000)
         for i in range(9_999, 0, -1):
@@ -254,7 +254,7 @@ def test_deep_graphs_need_no_stack_of_python() -> None:
     assert checked == [True, True]
 
 
-def test_no_graph_is_deeper_than_a_stack_allows() -> None:
+def test_graphs_cannot_exceed_the_depth_limit() -> None:
     patch, made = Patch(id=1), 1
     with pytest.raises(ValueError, match="10,000 levels"):
         while made < 20_000:
@@ -269,7 +269,7 @@ def test_no_graph_is_deeper_than_a_stack_allows() -> None:
             layer = ModelLayer(i, [layer]) if i % 2 else ModelLayer(i, [], [layer])
 
 
-def test_no_edit_makes_a_graph_that_is_too_deep() -> None:
+def test_edits_cannot_exceed_the_depth_limit() -> None:
     edit = PatchEdit(PatchIndex(Patch(id=1)))
     for i in range(1, 10_000):
         assert edit.add_patch(i, Patch(id=i + 1))
@@ -295,14 +295,14 @@ def test_no_edit_makes_a_graph_that_is_too_deep() -> None:
     assert levels == 8
 
 
-def test_lists_that_are_shared_are_looked_at_once() -> None:
+def test_shared_lists_are_visited_once() -> None:
     patch = Patch(id=1)
     for _ in range(5_000):
         patch = Patch(id=1, children=[patch, patch])
     assert len(patch.children) == 2
 
 
-def test_random_graphs_are_the_same_there_and_back() -> None:
+def test_random_graphs_round_trip() -> None:
     source = random.Random(18)
 
     def data(depth: int) -> Any:

@@ -200,7 +200,7 @@ PROGRAMS = [
 
 
 @pytest.mark.parametrize("program, printed", [row[1:] for row in PROGRAMS], ids=[row[0] for row in PROGRAMS])
-def test_ends_by_itself(program: str, printed: str) -> None:
+def test_exits_normally(program: str, printed: str) -> None:
     done = subprocess.run(
         [sys.executable, "-W", "error", "-c", PREAMBLE + program], capture_output=True, text=True, timeout=120
     )

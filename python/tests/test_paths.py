@@ -10,7 +10,7 @@ import tarn_engine_base as tarn
 from tarn_engine_base import Path, PathBuilder, PathElement, PathInstruction
 
 
-def test_builder_chains() -> None:
+def test_builder_calls_chain() -> None:
     builder = PathBuilder()
     assert builder.move_to((0, 0)) is builder
     path = builder.line_to([4, 0]).curve_to((5, 0), (6, 1), (6, 2)).quad_curve_to((6, 3), np.array([5.0, 3.0])).close().build()
@@ -47,7 +47,7 @@ def test_shapes(builder: PathBuilder, box: tuple[tuple[float, float], ...], elem
     assert hash(Path(path.elements)) == hash(path)
 
 
-def test_points_are_the_memory_of_the_path() -> None:
+def test_points_share_the_memory_of_the_path() -> None:
     path = PathBuilder().move_to((1, 2)).line_to((3, 4)).build()
     points = path.elements[1].points
     address = points.__array_interface__["data"][0]
@@ -79,7 +79,7 @@ def test_geometry() -> None:
     assert tarn.interpolate(path, Path(), 0.5) is None
 
 
-def test_refuses() -> None:
+def test_rejects() -> None:
     with pytest.raises(ValueError, match="no path instruction"):
         tarn.string_to_path_instruction("MoveTo")
     with pytest.raises(ValueError, match="no SVG path data"):

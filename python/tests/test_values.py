@@ -61,7 +61,7 @@ MADE: list[tuple[str, Any, Type, str]] = [
 
 
 @pytest.mark.parametrize("what, value, type_, text", MADE, ids=lambda item: item if isinstance(item, str) else "")
-def test_is_made_shown_and_copied(what: str, value: Value, type_: Type, text: str) -> None:
+def test_is_constructed_printed_and_copied(what: str, value: Value, type_: Type, text: str) -> None:
     assert value.type is type_
     assert repr(value) == text
     again = eval(text)
@@ -73,7 +73,7 @@ def test_is_made_shown_and_copied(what: str, value: Value, type_: Type, text: st
         assert hash(copied) == hash(value)
 
 
-def test_is_made_by_name_and_by_derived_classes() -> None:
+def test_is_constructed_by_keyword_and_by_subclasses() -> None:
     class Derived(Value):
         """A subclass with its own attribute."""
 
@@ -98,7 +98,7 @@ def test_is_made_by_name_and_by_derived_classes() -> None:
             make(1j)
 
 
-def test_values_and_types_are_given_back() -> None:
+def test_values_and_types_are_released() -> None:
     gc.collect()
     before = sys.getrefcount(Value), sys.getrefcount(Type.FLOAT)
     values = [Value(float(i)) for i in range(1000)] + [Value(i).as_type(Type.FLOAT) for i in range(1000)]
@@ -111,13 +111,13 @@ def test_values_and_types_are_given_back() -> None:
     assert (sys.getrefcount(Value), sys.getrefcount(Type.FLOAT)) == before
 
 
-def test_orders_nothing() -> None:
+def test_values_have_no_order() -> None:
     with pytest.raises(TypeError):
         sorted([Value(1), Value(2)])
     assert Value(1).__eq__(1) is NotImplemented
 
 
-def test_differs_from_every_other() -> None:
+def test_values_of_different_types_differ() -> None:
     for i, (_, a, _, _) in enumerate(MADE):
         for j, (_, b, _, _) in enumerate(MADE):
             zeros = {MADE[i][0], MADE[j][0]} == {"nothing given", "negative zero"}
@@ -157,19 +157,19 @@ def test_differs_from_every_other() -> None:
         (lambda: Unstructured({"a": {1, 2}}), TypeError),
     ],
 )
-def test_refuses(make: Callable[[], Any], error: type[Exception]) -> None:
+def test_rejects(make: Callable[[], Any], error: type[Exception]) -> None:
     with pytest.raises(error) as caught:
         make()
     assert len(str(caught.value)) > 10
 
 
-def test_becomes_every_type() -> None:
+def test_converts_to_every_type() -> None:
     for _, value, _, _ in MADE:
         for type_ in Type:
             assert value.as_type(type_).type is type_
 
 
-def test_gives_its_payload() -> None:
+def test_returns_its_payload() -> None:
     assert Value((1, 2)).data == {"X": 1.0, "Y": 2.0}
     assert Value(True).data == 1
     assert Value.image(3).data is None
@@ -224,7 +224,7 @@ DATA: list[Any] = [
 
 
 @pytest.mark.parametrize("data", DATA, ids=repr)
-def test_data_is_the_same_there_and_back(data: Any) -> None:
+def test_data_round_trips(data: Any) -> None:
     made = Unstructured(data)
     back = made.data
     assert back == data
@@ -237,7 +237,7 @@ def test_data_is_the_same_there_and_back(data: Any) -> None:
         assert eval(repr(made)) == made
 
 
-def test_data_of_other_kinds() -> None:
+def test_data_from_other_types() -> None:
     assert Unstructured(True).data == 1
     assert type(Unstructured(True).data) is int
     assert Unstructured((1, 2)).data == [1, 2]
@@ -250,7 +250,7 @@ def test_data_of_other_kinds() -> None:
     assert Unstructured({"id": Unsigned(7), "x": [1.5]}).to_text() == '{"id": 7u, "x": [1.5]}'
 
 
-def test_shared_parts_are_no_circle() -> None:
+def test_shared_parts_are_not_a_cycle() -> None:
     shared = [1]
     assert Unstructured([shared, shared]).data == [[1], [1]]
     circle: list[Any] = []
@@ -259,7 +259,7 @@ def test_shared_parts_are_no_circle() -> None:
         Unstructured(circle)
 
 
-def test_deep_data_needs_no_stack() -> None:
+def test_deep_data_needs_no_deep_stack() -> None:
     deep: Any = 1
     for _ in range(200_000):
         deep = [deep]
@@ -273,7 +273,7 @@ def test_deep_data_needs_no_stack() -> None:
     assert Unstructured(deep) == data
 
 
-def test_an_object_that_was_never_initialised_raises() -> None:
+def test_uninitialised_objects_raise() -> None:
     for name in tarn.__all__:
         cls = getattr(tarn, name)
         if not isinstance(cls, type) or type(cls).__name__ != "pybind11_type":

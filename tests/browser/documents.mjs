@@ -1,6 +1,6 @@
-// Documents that checks need.
+// Documents for the checks.
 
-// So many patches in one group, each with two inputs that others lead to.
+// This many patches in one group, each with two connected inputs.
 export function largeDocument(patches) {
     const children = [];
     const connections = [];

@@ -20,7 +20,7 @@ const FRAMES = 120;
 const SIZES = [{ width: 1400, height: 900 }, { width: 390, height: 844 }];
 const EDIT_MILLISECONDS = 200;
 const SUBJECTS = ["values", "curves", "shapes", "documents"];
-// Fewer texts than a subject has.
+// A lower bound of the number of texts in a tab.
 const FEWEST = { values: 40, curves: 15, shapes: 20, documents: 100 };
 
 const sample = (name) => path.join(documents, `${name}.json`);
@@ -88,7 +88,7 @@ async function checkValues(page) {
         checkEqual(await text(page, "value-error"), "", `${kind} ${content}`);
         checkEqual((await conversions(page))[type], wanted, `${kind} ${content} as ${type}`);
     }
-    // What cannot be read gives one line, and the conversions stay unchanged.
+    // Invalid input shows an error of one line and leaves the conversions unchanged.
     await page.selectOption("#value-type", "number");
     await page.fill("#value-content", "17");
     const before = await conversions(page);
@@ -177,7 +177,7 @@ async function checkShapes(page) {
         await page.selectOption("#shape-kind", kind);
         const before = await page.getAttribute("#shape-outline", "d");
         checkEqual(await text(page, "shape-svg"), before, "the data is that of the drawing");
-        // Every handle by the keyboard, and as far back again.
+        // Every handle by the keyboard, forth and back.
         const handles = await page.$$("#shape-handles circle");
         check(handles.length >= 2, `handles of ${kind}`);
         for (const handle of handles) {
@@ -246,7 +246,7 @@ async function checkShapes(page) {
     check(said === "Copied" || copied === await text(page, "shape-code"), "the line is copied or selected");
 }
 
-// What the program prints for each frame of a file.
+// The output of document_road for each frame of a file.
 function printedPaths(file) {
     const printed = Array.from({ length: FRAMES }, () => []);
     for (const line of execFileSync(program, [file, "--frames", String(FRAMES), "--paths"], { encoding: "utf8", maxBuffer: 1 << 28 }).split("\n")) {
@@ -312,7 +312,7 @@ async function checkDocuments(page) {
     await page.click("#redo");
     checkEqual(await drawnNow(page), last, "done again");
     checkEqual(await page.getAttribute("#redo", "aria-disabled"), "true", "there is nothing more to redo");
-    // What cannot be read stays out, and does not outlast the stay in the field.
+    // Invalid input is ignored, and is discarded when the field loses the focus.
     const number = await field.inputValue();
     await field.fill("fast");
     check((await text(page, "input-error")) !== "", "a word is no number");
@@ -325,7 +325,7 @@ async function checkDocuments(page) {
     checkEqual(await drawnNow(page), edited, "undone by the keys");
     await page.keyboard.press("Control+Shift+z");
     checkEqual(await drawnNow(page), last, "done again by the keys");
-    // The player is as it was after edits: it plays, and a key is a frame.
+    // The player still works after edits: it plays, and a key moves by one frame.
     await page.check("#show-points");
     await field.fill("2.25");
     check(await page.isChecked("#show-points"), "points stay");
@@ -358,7 +358,7 @@ async function checkDocuments(page) {
     }
     check(set > 40, "inputs of every patch");
 
-    // A patch of the graph has its inputs shown.
+    // Clicking a patch in the graph shows its inputs.
     const box = page.locator("#report-graph .patch").nth(3);
     await box.locator(".heading").focus();
     const name = (await box.locator(".heading text").first().textContent()).trim();
@@ -379,7 +379,7 @@ async function checkFiles(page) {
         checkEqual(await text(page, "document-error"), "");
     }
     check((await summary(page)).includes("3 nodes renumbered, 1 link left out"), "what was left out is said");
-    // Bad files.
+    // Invalid files.
     const shownNow = async () => [await page.locator("#report-graph").innerHTML(), await text(page, "document-name"), await drawnNow(page)];
     const before = await shownNow();
     for (const [name, content] of [["empty.json", ""], ["cut.json", '{"root": {"id": 1'], ["deep.json", "[".repeat(100000)], ["picture.png", "\u0089PNG\r\n"], ["type.json", '{"root": {"id": 1, "inputs": 3}}']]) {
@@ -389,7 +389,7 @@ async function checkFiles(page) {
         check(!line.includes("\n") && line.length < 320, `one line for ${name}`);
         checkEqual(await shownNow(), before, `${name} changes nothing`);
     }
-    // Two files that are dropped are compared.
+    // Two dropped files are compared.
     const document = JSON.parse(readFileSync(sample("small"), "utf8"));
     const content = JSON.stringify(document);
     document.root.children[0].name = "renamed <b>";
@@ -404,7 +404,7 @@ async function checkFiles(page) {
     await page.locator("#changes a").last().focus();
     await page.keyboard.press("Enter");
     checkEqual(await page.evaluate(() => document.activeElement.id), "patch-900", "a change leads to its patch");
-    // What is edited is compared too; and with the document as it was opened nothing else.
+    // Edits are compared too; with the document as it was opened, only they are.
     await page.selectOption("#compare", "opened");
     checkEqual(await page.locator("#changes").textContent().then((t) => t.includes("The documents are the same.")), true);
     await page.locator("#inputs input:not([disabled])").first().fill("0.125");
@@ -425,7 +425,7 @@ const inputs = (page) => page.$$eval("#inputs label", (all) => all.map((label) =
     return [field.value, field.disabled, label.querySelector("[type=range]") !== null];
 }));
 
-// Documents that are not as most are.
+// Unusual documents.
 async function checkOdd(browser) {
     const page = await openPage(browser, SIZES[0], {}, "#show=documents");
     await openText(page, "odd.json", { root: { id: 1, children: [{ id: 2, kind: "text", name: "odd", inputs: [
@@ -438,7 +438,7 @@ async function checkOdd(browser) {
     checkEqual(odd.map(([, isDisabled]) => isDisabled), [true, false, true, false, false, true, false, false, false], "what a field cannot hold cannot be set");
     checkEqual(odd.map(([, , hasSlider]) => hasSlider), [false, false, false, false, true, false, false, false, false], "sliders have bounds");
     checkEqual([odd[1][0], odd[3][0], odd[7][0]], ['{"b":[1.5,"c"]}', "300", "1, Infinity"]);
-    // The graph says what was set.
+    // The graph shows the new value.
     const said = () => page.locator('[data-port="14"]').getAttribute("aria-label");
     check((await said()).includes("default 3"), "the graph says the default");
     await page.locator("#inputs input").nth(4).fill("4.5");
@@ -448,7 +448,7 @@ async function checkOdd(browser) {
     await page.locator("#inputs label:last-child input").fill("__proto__");
     check((await text(page, "input-error")) !== "", "no truth is called so");
     await page.locator("#inputs label:last-child input").blur();
-    // A document is opened as one step, which can be undone; a file that is called as a sample is none.
+    // Opening a document is one undo step; a file with the name of a bundled document is a different one.
     await openText(page, "small", { root: { id: 1, name: "mine" } });
     check((await summary(page)).includes("1 patch"), "a document without children");
     await page.waitForFunction(() => location.hash.includes("document=%7E") && location.hash.includes("document-name=small"));
@@ -465,18 +465,18 @@ async function checkOdd(browser) {
     await page.keyboard.press("ArrowDown");
     checkEqual((await inputs(page)).map(([value]) => value), ["3"], "both patches can be reached");
 
-    // A bad file and a good one: the good one is not taken for the first.
+    // An invalid file and a valid one: the valid one does not become the first document.
     const before = await text(page, "document-name");
     await handTo(page, [{ name: "bad.json", content: "{" }, { name: "good.json", content: readFileSync(sample("small"), "utf8") }]);
     await page.waitForFunction(() => document.getElementById("document-error").textContent.startsWith("bad.json"));
     checkEqual([await text(page, "document-name"), await page.inputValue("#compare")], [before, ""]);
-    // The link to the content does not end what is shown.
+    // The skip link does not close the document.
     await page.evaluate(() => document.querySelector(".skip").focus());
     await page.keyboard.press("Enter");
     checkEqual([await page.evaluate(() => document.activeElement.id), await text(page, "document-name")], ["main", before]);
     await page.close();
 
-    // What takes long is cut short.
+    // Slow evaluation is cut off.
     const slow = { root: { id: 1, children: [
         { id: 2, kind: "loop", inputs: [port(20, "int", 1000)], outputs: [{ id: 21, type: "int" }, { id: 22, type: "float" }] },
         ...Array.from({ length: 300 }, (_, i) => ({ id: 10 + i, kind: "ease", inputs: [port(1000 + 10 * i, "float", 0), port(1001 + 10 * i, "float", 1), port(1002 + 10 * i, "float", 0)], outputs: [{ id: 1005 + 10 * i, type: "float" }] })),
@@ -488,7 +488,8 @@ async function checkOdd(browser) {
     await again.close();
 }
 
-// What the other checks do in one of the two ways: choices and buttons by keys, sliders and tabs by the pointer.
+// Uses controls in the way that the other checks do not: choices and buttons by keys, sliders and tabs by the
+// pointer.
 async function checkBothWays(browser) {
     const page = await openPage(browser, SIZES[0], {}, "#show=values");
     const choose = async (id, key) => {
@@ -548,7 +549,7 @@ async function checkBothWays(browser) {
     await page.close();
 }
 
-// A link shows what was set.
+// A link restores the settings.
 async function checkLinks(browser) {
     const page = await openPage(browser, SIZES[0]);
     await page.fill("#value-content", "7.25");
@@ -586,7 +587,7 @@ async function checkLinks(browser) {
     await third.close();
     await page.close();
 
-    // Addresses that nobody made here.
+    // Malformed addresses.
     for (const state of ["#document=~!!!", "#document=~AAAA", "#document=nothing", "#show=nothing&frame=-5&value-type=x&curve-progress=9&shape=a+b&shape-kind=y",
         "#frame=0.5", "#frame=1e9&input-patch=77&compare=file&port-min=x&curve-from=%00&other=~x", `#document=${"~".repeat(5000)}`]) {
         const odd = await openPage(browser, SIZES[0], {}, state);
@@ -604,7 +605,7 @@ async function checkLarge(browser) {
     await page.setInputFiles("#document-file", file);
     await page.waitForFunction(() => document.querySelectorAll("#report-graph .patch").length === 2000);
     await page.evaluate(() => new Promise((done) => requestAnimationFrame(() => setTimeout(done, 0))));
-    // From the key to the picture, in the page.
+    // Measures from the key press to the updated picture, inside the page.
     const times = await page.evaluate(async () => {
         const field = document.querySelector("#inputs input:not([disabled])");
         const all = [];
@@ -646,7 +647,7 @@ try {
         }
         const page = await openPage(browser, viewport);
         for (const checkSubject of [checkTabs, checkValues, checkCurves, checkShapes, checkDocuments, checkFiles]) await checkSubject(page);
-        // As it stands after all that.
+        // The final state.
         await checkLooks(page, "playground-used", viewport, "light", FEWEST.curves);
         await page.close();
     }

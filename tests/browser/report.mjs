@@ -27,11 +27,11 @@ function writePage(file, name) {
     return pathToFileURL(page).href;
 }
 
-// The `d` of everything that is drawn, in order.
+// The `d` of every drawn path, in order.
 const drawnNow = (page) => page.$$eval("#drawn path[d]", (paths) => paths.map((p) => p.getAttribute("d")));
 
 async function checkAnimation(page, file) {
-    // What the program prints for each frame.
+    // The program's output for each frame.
     const printed = Array.from({ length: FRAMES }, () => []);
     const lines = run(file, "--frames", String(FRAMES), "--paths").split("\n");
     for (const line of lines) {
@@ -101,7 +101,7 @@ async function checkPlots(page, file) {
             checkEqual(plot, cells[frame][i + 1], headings[i + 1]);
         }
     }
-    // Pointing at a plot reads the frame there; going away, the current one.
+    // Pointing at a plot shows that frame's value; leaving it, the current one.
     await page.fill("#frame", "0");
     for (const [i, chart] of charts.entries()) {
         await chart.scrollIntoViewIfNeeded();
@@ -135,7 +135,7 @@ async function checkGraph(page) {
         'ui: {"slider": 1, "steps": [0.1, 1, 4]}', 'unit: "times"'];
     checkEqual(await info.locator("p").allTextContents(), lines, "pointing at a port");
 
-    // The arrow keys go through every patch and port of the level, and back.
+    // The arrow keys visit every patch and port of the level, and return.
     const items = await page.$$eval("#level-1 > .scroll [tabindex]", (all) => all.map((e) => e.ariaLabel).filter(Boolean));
     await page.locator("#level-1 > .scroll .heading").first().focus();
     await page.keyboard.press("Home");
@@ -182,7 +182,7 @@ async function checkKeyboard(page) {
     checkEqual(reached.size, wanted, "the tab key reaches everything");
 }
 
-// Long names and texts, wide letters, many levels, small and large numbers.
+// Long names and strings, wide characters, many levels, small and large numbers.
 function oddDocument() {
     const long = "a name that is longer than any box could show without becoming unreadable ";
     const wide = "\u6f22\u5b57\u306e\u540d\u524d".repeat(12);
@@ -218,7 +218,7 @@ async function checkOdd(browser) {
     }
 }
 
-// Graphviz takes minutes for such a graph: it is drawn in rows.
+// Graphviz takes minutes for this graph, so it is drawn in rows.
 async function checkTangled(browser) {
     const { root } = largeDocument(2000);
     let seed = 1;
@@ -303,7 +303,7 @@ async function checkNested(browser) {
     await page.close();
 }
 
-// Browsers would tear elements apart that are nested deeper.
+// Browsers would restructure elements that are nested deeper.
 async function checkDeep(browser) {
     const levels = 900;
     let text = `{"id": ${levels}, "name": "innermost"}`;
@@ -361,7 +361,7 @@ try {
         await checkPlots(page, file);
         await checkGraph(page);
         await checkKeyboard(page);
-        // With everything open.
+        // With all groups open.
         for (const heading of await page.$$('[data-level][aria-expanded="false"]')) {
             await heading.evaluate((h) => h.dispatchEvent(new MouseEvent("click", { bubbles: true })));
         }

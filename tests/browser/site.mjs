@@ -16,10 +16,10 @@ const [site, out, executablePath] = process.argv.slice(2);
 const SIZES = [{ width: 1400, height: 900 }, { width: 390, height: 844 }];
 const urlOf = (name) => pathToFileURL(path.join(site, name)).href;
 const pages = readdirSync(site).filter((name) => /^(index|md_.*|(class|struct)tarn_1_1engine_1_1[A-Za-z]+|[a-z_]+_8h|namespacetarn_1_1engine)\.html$/.test(name));
-// Looked at in every size and scheme; the others in one of them each.
+// Checked in every size and colour scheme; the others in one combination each.
 const looked = pages.filter((name) => /^(index|md_.*|classtarn_1_1engine_1_1(Value|Patch.*|Unstructured)|path_8h)\.html$/.test(name));
 
-// Pages of files load their own files alone, and say nothing to the console.
+// Pages opened from files load only files of the site, and print nothing to the console.
 async function openSite(browser, options) {
     const page = await browser.newPage({ reducedMotion: "reduce", ...options });
     page.on("console", (message) => check(false, `console: ${message.type()}: ${message.text()}`));
@@ -37,7 +37,7 @@ async function checkPage(page, name, size, scheme) {
     checkEqual(Math.max(...paper.match(/\d+/g).map(Number)) < 128 ? "dark" : "light", scheme, `${name} is on ${paper}`);
     checkEqual(await page.evaluate(() => document.documentElement.scrollWidth <= innerWidth), true, `${name} scrolls sideways at ${size.width}`);
     await checkAccessibility(page, `${name}, ${size.width}, ${scheme}`);
-    // Lines that can be read: no paragraph is wider than some hundred characters.
+    // Readable lines: no paragraph is wider than about a hundred characters.
     const widest = await page.$$eval(".contents p", (all) => Math.max(0, ...all.map((p) => p.getBoundingClientRect().width)));
     check(widest <= 920, `the lines of ${name} are ${widest} wide`);
 }

@@ -1,4 +1,4 @@
-// What the checks of all pages share.
+// Shared by the checks of all pages.
 
 import assert from "node:assert/strict";
 import { readFileSync } from "node:fs";
@@ -17,7 +17,7 @@ export function checkEqual(actual, expected, what) {
     ++checks;
 }
 
-// Where the packages of Node.js are, and the screenshots go.
+// The folders of Node.js's packages and of the screenshots.
 let folder;
 let axe;
 
@@ -28,7 +28,7 @@ export async function launch(out, executablePath = "/usr/bin/chromium") {
     return require("playwright-core").chromium.launch({ executablePath, args: ["--no-sandbox"] });
 }
 
-// Opens the page; every console message and every error is a failure, as is anything that it loads.
+// Opens the page; a console message, an error or a request is a failure.
 export async function open(browser, url, options) {
     const page = await browser.newPage(options);
     page.on("console", (message) => assert.fail(`console: ${message.type()}: ${message.text()}`));
@@ -41,8 +41,7 @@ export async function open(browser, url, options) {
     return page;
 }
 
-// Texts that are too faint on what they stand on. axe does not know what is behind the text of a graph, and is not
-// sure of others.
+// Texts with too little contrast. axe cannot determine the background of texts in a graph and some others.
 const faintTexts = (fewest) => {
     const channels = (color) => color.match(/[\d.]+/g).map(Number);
     const luminance = (color) => channels(color).slice(0, 3)
@@ -72,7 +71,7 @@ const faintTexts = (fewest) => {
     return count > fewest ? found : [`${count} texts were looked at`];
 };
 
-// What is wrong with the places of texts: cut off, or over one another.
+// Texts that are cut off or overlap.
 const misplacedTexts = () => {
     const found = [];
     const texts = [];
@@ -84,7 +83,7 @@ const misplacedTexts = () => {
         if (!parent.checkVisibility({ checkOpacity: true })) continue;
         const range = document.createRange();
         range.selectNodeContents(node);
-        // A graph scrolls in its frame: its texts are held against one another alone.
+        // A graph scrolls in its frame, so its texts are only compared with one another.
         const graph = parent.closest(".graph");
         for (let e = parent; e !== document.body; e = e.parentElement) {
             const style = getComputedStyle(e);
@@ -134,7 +133,7 @@ export async function checkAccessibility(page, what) {
     check(result.passes.some(({ id }) => id === "color-contrast"), "contrast was looked at");
 }
 
-// What every page has to be, as it stands in that size and colour scheme, which has more texts than `fewest`; and a screenshot.
+// Checks the page in this size and colour scheme, with at least `fewest` texts, and takes a screenshot.
 export async function checkLooks(page, name, size, scheme, fewest = 50) {
     const paper = await page.evaluate(() => getComputedStyle(document.body).backgroundColor);
     const brightest = Math.max(...paper.match(/\d+/g).map(Number));

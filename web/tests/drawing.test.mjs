@@ -7,7 +7,7 @@ import * as engine from "../../build/web/engine_base.mjs";
 
 const { EasingFunction, Path, PathBuilder, PathInstruction, Value } = engine;
 
-test("builders draw", () => {
+test("builders append instructions", () => {
   for (const [draw, data] of [
     [(b) => b.moveTo([1, 2]).lineTo({ x: 3, y: 4 }).close(), "M1 2L3 4Z"],
     [(b) => b.moveTo([0, 0]).curveTo([1, 2], [3, 4], [5, 6]), "M0 0C1 2 3 4 5 6"],
@@ -50,7 +50,7 @@ test("paths have elements", () => {
   assert.equal(engine.stringToPathInstruction("Close"), null);
 });
 
-test("paths are measured, moved and mixed", () => {
+test("paths have bounds, transformations and interpolation", () => {
   const square = new PathBuilder().moveTo([0, 0]).lineTo([2, 0]).lineTo([2, 4]).build();
   assert.deepEqual(engine.bounds(square), { min: [0, 0], max: [2, 4] });
   assert.equal(engine.bounds(new Path()), null);
@@ -77,7 +77,7 @@ test("curves ease numbers, vectors, integers and values", () => {
   assert.equal(engine.ease(EasingFunction.Linear, 0, new Value(1), 0.5).number, 0.5);
 });
 
-test("many progresses are eased at once, to the bits of single calls", () => {
+test("easing many points at once matches single calls bit for bit", () => {
   const progress = Float64Array.from({ length: 1001 }, (_, i) => i / 1000);
   for (const curve of Object.values(EasingFunction)) {
     const eased = engine.ease(curve, 1, 7, progress);
@@ -91,7 +91,7 @@ test("many progresses are eased at once, to the bits of single calls", () => {
   assert.equal(engine.ease(0, 0, 2, []).length, 0);
 });
 
-test("what is no path, point or end is said", () => {
+test("invalid paths, points and ends are rejected", () => {
   const builder = new PathBuilder().moveTo([1, 1]);
   const path = builder.build();
   for (const [call, error] of [

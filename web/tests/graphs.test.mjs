@@ -23,7 +23,7 @@ const fields = {
 };
 const graph = () => new Patch(fields);
 
-test("a patch has the fields that it was made of", () => {
+test("a patch has the fields that it was constructed from", () => {
   const root = graph();
   assert.deepEqual([root.id, root.builtin, root.name, root.descriptor], [1n, 7n, "root", "d"]);
   assert.deepEqual(root.attributes.toJS(), { a: [1] });
@@ -74,7 +74,7 @@ test("patches and ports are found", () => {
   assert.deepEqual(index.outgoingConnectionsFromPatch(3), []);
 });
 
-test("edits change documents, and changes are told", () => {
+test("edits change documents, and changes are listed", () => {
   const before = graph();
   const index = new PatchIndex(before);
   const edit = new PatchEdit(index);
@@ -135,7 +135,7 @@ test("edits change documents, and changes are told", () => {
   assert.deepEqual(engine.patchChanges(after, after), []);
 });
 
-test("documents of both forms are read and written", () => {
+test("documents of both formats are read and written", () => {
   const { root, info } = engine.readDocumentWithInfo(textOf("animation.json"));
   assert.equal(root.name, "bouncing badge");
   assert.deepEqual([info.form, info.framesPerSecond, info.notes.length], [engine.DocumentForm.Own, 12, 0]);
@@ -150,7 +150,7 @@ test("documents of both forms are read and written", () => {
   assert.equal(engine.stringToKind("none such"), null);
 });
 
-test("what is no document is said with its place", () => {
+test("invalid documents are reported with their position", () => {
   for (const [text, line, column, message] of [
     ["", 0, 0, /it is empty/], ['{"root":{"id":1}', 1, 17, /./], ['{"root":\n{"id":"x"}}', 2, 7, /\/root\/id: /],
     ["\ud800", 1, 2, /./],
@@ -165,7 +165,7 @@ test("what is no document is said with its place", () => {
   }
 });
 
-test("documents as deep as they like are refused", () => {
+test("documents beyond the depth limit are rejected", () => {
   for (const levels of [1001, 5000, 300000]) {
     const open = Array.from({ length: levels - 1 }, (_, i) => `{"id":${i + 2},"children":[`).join("");
     for (const end of ["", "x"]) {
@@ -178,7 +178,7 @@ test("documents as deep as they like are refused", () => {
   assert.ok(engine.readDocument(engine.writeDocument(root)).equals(root));
 });
 
-test("documents are computed and drawn frame by frame", () => {
+test("documents are evaluated and drawn frame by frame", () => {
   const root = engine.readDocument(textOf("animation.json"));
   const evaluator = new engine.Evaluator(root);
   const paths = [];
@@ -196,7 +196,7 @@ test("documents are computed and drawn frame by frame", () => {
   assert.ok(evaluator.inputValues(input.id)[0].equals(input.defaultValue));
 });
 
-test("what was freed is said, and the rest goes on", () => {
+test("using a freed object is an error, and others still work", () => {
   const root = graph();
   const index = new PatchIndex(root);
   const [child] = root.children;
@@ -215,7 +215,7 @@ test("what was freed is said, and the rest goes on", () => {
   assert.throws(() => { patch.name = "x"; }, { message: "this edit was freed" });
 });
 
-test("what is no graph is said, and nothing changes", () => {
+test("invalid graphs are rejected, and nothing changes", () => {
   const root = graph();
   const index = new PatchIndex(root);
   const edit = new PatchEdit(index);

@@ -9,7 +9,7 @@ import { fileURLToPath } from "node:url";
 const page = readFileSync(new URL("../../docs/javascript.md", import.meta.url), "utf8");
 const programs = [...page.matchAll(/```js\n(.*?)```\n\n```text\n(.*?)```/gs)];
 
-test("the programs of the page print what it says", () => {
+test("the programs in the guide print the documented output", () => {
   assert.equal(programs.length, 3);
   assert.equal([...page.matchAll(/```js/g)].length, 3);
   for (const [i, [, program, printed]] of programs.entries()) {

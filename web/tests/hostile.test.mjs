@@ -25,7 +25,7 @@ function detached(array) {
   return array;
 }
 
-test("a builder that refused a path goes on", () => {
+test("a builder still works after rejecting a path", () => {
   const builder = new PathBuilder().moveTo([1, 2]);
   assert.throws(() => builder.append(null), TypeError);
   assert.throws(() => builder.append({}), TypeError);
@@ -39,7 +39,7 @@ test("points are read once", () => {
   assert.equal(`${builder.build()}`, "M5 0");
 });
 
-test("lists that lie are read as what they hold", () => {
+test("lists with a wrong length are read by their content", () => {
   for (const list of [new Lying(4), Object.defineProperty(new Float64Array(4), "length", { value: 2 ** 29 })]) {
     assert.throws(() => new Unstructured(new Lying(4)), TypeError);
     assert.equal(engine.ease(0, 0, 1, list).length, 4);
@@ -53,13 +53,13 @@ test("lists that lie are read as what they hold", () => {
   assert.throws(() => engine.ease(0, 0, 1, Object.create(Float64Array.prototype)), TypeError);
 });
 
-test("integers of typed arrays are kept or refused", () => {
+test("integers of typed arrays are exact or rejected", () => {
   assert.equal(new Unstructured(new Int32Array([1, 2])).toText(), "[1, 2]");
   assert.throws(() => new Unstructured(new BigUint64Array([2n ** 64n - 1n])), RangeError);
   assert.throws(() => new Value(1n << 1000000n), { name: "RangeError", message: /a very large integer/ });
 });
 
-test("values never change, and nothing of them can be reached", () => {
+test("values are immutable, and their bytes are private", () => {
   const value = new Value("abc");
   assert.deepEqual(Object.getOwnPropertySymbols(Value.prototype).map(String),
     ["Symbol(Symbol.toPrimitive)", "Symbol(nodejs.util.inspect.custom)"]);
@@ -70,7 +70,7 @@ test("values never change, and nothing of them can be reached", () => {
   }
 });
 
-test("texts keep their marks, and bytes that are none become U+FFFD", () => {
+test("strings keep byte order marks, and invalid UTF-8 becomes U+FFFD", () => {
   for (const text of ["\ufeff" + "a".repeat(30), "x\0\ufeff" + "a".repeat(40), "\ufeffa"]) {
     assert.equal(new Value(text).string, text);
     assert.equal(`${new Value(text)}`, text);
@@ -80,36 +80,36 @@ test("texts keep their marks, and bytes that are none become U+FFFD", () => {
   assert.equal(engine.readDocument(document).inputs[0].defaultValue.string, "a\ufffdb");
 });
 
-test("keys are as the library has them", () => {
+test("lone surrogates in keys become U+FFFD", () => {
   const data = new Unstructured(new Map([["\ud800", 1], ["\ud801", 2]]));
   assert.deepEqual([data.size, data.find("\ufffd").asInteger(), data.find("\ud800").asInteger()], [1, 2n, 2n]);
 });
 
-test("objects of other realms are as good", () => {
+test("objects of other realms are accepted", () => {
   assert.equal(new Unstructured(vm.runInNewContext("({a: [1, new Float64Array([2])]})")).toText(), '{"a": [1, [2.0]]}');
   assert.equal(`${new Value(vm.runInNewContext("new Float32Array([1, 2])"))}`, "1, 2");
   const bytes = vm.runInNewContext("Uint8Array.from(text, (c) => c.charCodeAt(0))", { text: '{"root":{"id":5}}' });
   assert.equal(engine.readDocument(bytes).id, 5n);
 });
 
-test("graphs whose connections lead nowhere are evaluated", () => {
+test("graphs with dangling connections are evaluated", () => {
   const text = '{"identifiers":"any","root":{"id":1,"connections":[{"from":[5,6],"to":[7,8]}]}}';
   assert.deepEqual(new engine.Evaluator(engine.readDocument(text)).evaluate(0).drawn(), []);
 });
 
-test("evaluators keep to the frames per second", () => {
+test("evaluators use the frame rate", () => {
   const root = engine.readDocument('{"root":{"id":1,"children":[{"id":2,"kind":"time","outputs":[{"id":3,"type":"float"}]}]}}');
   assert.equal(new engine.Evaluator(root, 10).evaluate(10).outputValues(3)[0].number, 1);
   assert.equal(new engine.Evaluator(root).evaluate(60).outputValues(3)[0].number, 1);
 });
 
-test("ports that hold nothing are copied", () => {
+test("ports with null payloads are copied", () => {
   const ports = Array.from({ length: 40 }, (_, i) => `{"id":${i + 1},"type":"string","defaultType":"null string"}`);
   const { inputs } = engine.readDocument(`{"root":{"id":1,"inputs":[${ports}]}}`);
   assert.equal(new Patch({ id: 1, inputs }).inputs.length, 40);
 });
 
-test("edits do not nest patches deeper than graphs may be", () => {
+test("edits cannot exceed the depth limit", () => {
   const chain = (first, levels) => {
     let patch = { id: first + levels - 1 };
     for (let i = first + levels - 2; i >= first; --i) patch = { id: i, children: [patch] };
@@ -130,7 +130,7 @@ test("edits do not nest patches deeper than graphs may be", () => {
   root.free();
 });
 
-test("moves over and over, and among repeated identifiers, come to an end", () => {
+test("repeated moves, also with repeated identifiers, terminate", () => {
   let chain = { id: 40 };
   for (let id = 39; id > 2; --id) chain = { id, children: [chain] };
   const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1, children: [{ id: 2 }, chain] })));
@@ -149,7 +149,7 @@ test("moves over and over, and among repeated identifiers, come to an end", () =
   }
 });
 
-test("positions beyond a list are its end", () => {
+test("positions beyond a list mean its end", () => {
   for (const position of [2, 2 ** 32, Number.MAX_SAFE_INTEGER]) {
     const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1, children: [{ id: 2 }, { id: 3 }] })));
     assert.ok(edit.addPatch(1, { id: 4 }, position));
@@ -157,7 +157,7 @@ test("positions beyond a list are its end", () => {
   }
 });
 
-test("what is freed while an argument is read is said", () => {
+test("freeing an object while an argument is read is an error", () => {
   const edit = new PatchEdit(new PatchIndex(new Patch({ id: 1 })));
   const connection = { get fromPatchId() { edit.free(); return 1; }, fromPortId: 1, toPatchId: 1, toPortId: 1 };
   assert.throws(() => edit.connect(connection), { message: "this edit was freed" });

@@ -94,7 +94,7 @@ test("types have names", () => {
     ["path", "model", "unstructured"]);
 });
 
-test("ports bound values and have names", () => {
+test("ports clamp values and have names", () => {
   const info = { type: Type.Float, min: 0, max: new Value(10) };
   for (const [value, bounded] of [[-1, 0], [5, 5], [11, 10]]) {
     assert.equal(engine.castValueToType(value, info).number, bounded);
@@ -105,7 +105,7 @@ test("ports bound values and have names", () => {
   assert.equal(engine.portNameForTypeInfo({ type: Type.Unstructured, subtype: 1 }), "Layer");
 });
 
-test("data is made of plain objects and becomes them again", () => {
+test("unstructured data converts from and to plain objects", () => {
   const plain = {
     text: "x", integer: 3, number: 2.5, negative: -1, zero: 0, nothing: null, list: [1, [2, { deep: [] }], "é\u0000"],
     empty: {}, __proto__x: 1, large: 2n ** 60n,
@@ -123,7 +123,7 @@ test("data is made of plain objects and becomes them again", () => {
   assert.equal(JSON.stringify({ data: new Unstructured([1, "a"]) }), '{"data":[1,"a"]}');
 });
 
-test("data is found by paths and read with a default", () => {
+test("lookups take paths and defaults", () => {
   const data = new Unstructured({ a: { b: [1, 2.5, "x", 0] }, id: Unstructured.identifier(9) });
   assert.equal(data.find("a", "b", 1).asFloat(), 2.5);
   assert.equal(data.find("a", "b").size, 4);
@@ -150,7 +150,7 @@ test("data is found by paths and read with a default", () => {
   assert.equal(data.toText(20), data.toText().slice(0, 17) + "...");
 });
 
-test("data may be as deep as memory goes", () => {
+test("unstructured data may be of any depth", () => {
   let nested = [];
   for (let i = 0; i < 200000; ++i) nested = [nested];
   const data = new Unstructured(nested);
@@ -161,7 +161,7 @@ test("data may be as deep as memory goes", () => {
   assert.equal(levels, 200000);
 });
 
-test("what is no value, data or type is said, and nothing changes", () => {
+test("invalid values, data and types are rejected, and nothing changes", () => {
   const cyclic = { a: [] };
   cyclic.a.push(cyclic);
   const value = new Value(1);

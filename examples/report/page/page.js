@@ -1,9 +1,9 @@
-// What the sections of the page do. Each function is called when its section is in the document, and again when that was
-// replaced.
+// The behaviour of the page's sections. Each function is called when its section is in the document, and again when
+// the section was replaced.
 
 const byId = (id) => document.getElementById(id);
 
-// The points of a path and what belongs to them, from the text of its `d`.
+// Parses the points of a path, with their control points, from its `d`.
 function handlesOf(d) {
     let lines = "", points = "", controls = "";
     let start = "0 0";  // Of the outline: where a close goes back to.
@@ -44,7 +44,7 @@ function showHandles(group, d) {
 let film;
 let frame = 0;
 let playing = 0;
-// The elements of the film that is shown.
+// The elements of the animation.
 let drawn, slider, play, charts;
 let frameChanged;
 
@@ -115,7 +115,7 @@ function setPlaying(on) {
     playing = requestAnimationFrame(step);
 }
 
-// By how many frames a key goes on, or nothing for other keys.
+// The number of frames that a key moves by, or nothing for other keys.
 function keyStep(key) {
     const steps = { ArrowLeft: -1, ArrowDown: -1, ArrowRight: 1, ArrowUp: 1, PageDown: -10, PageUp: 10, Home: -Infinity, End: Infinity };
     return steps[key];
@@ -126,7 +126,7 @@ function goTo(next) {
     showFrame(next);
 }
 
-// What listens already.
+// Elements that already have listeners.
 const bound = new WeakSet();
 
 function isNew(element) {
@@ -168,13 +168,14 @@ function bindChart(chart) {
     });
 }
 
-// The film of the sections Animation and Outputs, from the frame `first` on; `changed` is told every frame that is shown.
+// The animation for the sections Animation and Outputs, from the frame `first`; `changed` is called with every frame
+// shown.
 export function showFilm(next, first = 0, changed = () => {}) {
     const isPlaying = playing !== 0;
     film = next;
     frameChanged = changed;
     drawn = byId("drawn");
-    // Where nothing is drawn there is no player; plots keep the frame all the same.
+    // Without a drawing there is no player, but the plots still show the frame.
     slider = byId("frame") ?? document.createElement("input");
     play = byId("play") ?? document.createElement("button");
     charts = [...document.querySelectorAll(".chart")];
@@ -186,7 +187,7 @@ export function showFilm(next, first = 0, changed = () => {}) {
 
 // Graph
 
-// The patch or port that each place for information is about.
+// The patch or port that each info element describes.
 const shownIn = new WeakMap();
 
 function showInfo(item) {
@@ -218,7 +219,7 @@ function toggle(heading) {
     if (isOpen(heading)) byId(heading.dataset.level).scrollIntoView({ block: "nearest" });
 }
 
-// One stop of the tab key for each graph; the arrow keys go on from there.
+// One tab stop for each graph; the arrow keys move inside it.
 function bindGraph(graph) {
     const items = [...graph.querySelectorAll("[tabindex]")];
     for (const item of items) item.setAttribute("aria-label", JSON.parse(item.dataset.parts).join("; "));
@@ -244,7 +245,7 @@ function bindGraph(graph) {
     let pointedAt = null;
     graph.addEventListener("pointermove", (event) => {
         const item = itemOf(event);
-        // A pointer at rest, beneath which the graph scrolls, points at nothing new.
+        // Scrolling under a resting pointer selects nothing.
         const rests = event.movementX === 0 && event.movementY === 0;
         if (item === pointedAt || rests) return;
         pointedAt = item;
@@ -276,7 +277,7 @@ function bindGraph(graph) {
     });
 }
 
-// Says something else of an input, if it is drawn.
+// Updates the description of an input, if it is drawn.
 export function showParts(portId, parts) {
     const isInput = (item) => JSON.parse(item.dataset.parts)[0] === parts?.[0];
     const item = [...document.querySelectorAll(`[data-port="${portId}"]`)].find(isInput);
@@ -288,7 +289,7 @@ export function showParts(portId, parts) {
 
 export const openLevels = () => [...document.querySelectorAll("[data-level]")].filter(isOpen).map((heading) => heading.dataset.level);
 
-// The section Graph. The levels that are named are open, as far as they are there.
+// The section Graph. Opens the given levels, if they exist.
 export function showGraphs(open = []) {
     for (const graph of document.querySelectorAll(".graph")) bindGraph(graph);
     for (const close of document.querySelectorAll(".close")) {
@@ -312,7 +313,7 @@ export function showGraphs(open = []) {
     }
 }
 
-// Changes: each leads to its patch, or to the level that it is in, and opens the groups around it.
+// Changes: each links to its patch or its level, and opens the groups around it.
 
 export function showChanges() {
     for (const link of document.querySelectorAll("#changes a")) {
