@@ -99,13 +99,11 @@ struct Options {
     std::optional<unsigned long long> portId;
 
     explicit Options(CLI::App& app) {
-        app.add_option("FILE", file, "The document; the variable can name it too")
-            ->required()
-            ->envname("DOCUMENT_ROAD_FILE");
+        app.add_option("FILE", file, "The document")->required()->envname("DOCUMENT_ROAD_FILE");
         app.add_flag("--debug", debug, "Print the graph's debug output");
-        app.add_option("--patch", patchId, "Say what the patch ID is and is connected to")
+        app.add_option("--patch", patchId, "Describe the patch ID and its connections")
             ->type_name("ID");
-        app.add_option("--port", portId, "Say what the port ID is and is connected to")
+        app.add_option("--port", portId, "Describe the port ID and its connections")
             ->type_name("ID");
         addFrames(app);
         addFiles(app);
@@ -113,7 +111,7 @@ struct Options {
 
 private:
     void addFrames(CLI::App& app) {
-        app.add_option("--frames", frames, "How many frames to evaluate; 0 for none")
+        app.add_option("--frames", frames, "The number of frames to evaluate")
             ->type_name("N")
             ->check(CLI::Range(0LL, 10000000LL))
             ->capture_default_str();
@@ -121,7 +119,7 @@ private:
             ->type_name("K")
             ->check(CLI::Range(1LL, 10000000LL))
             ->capture_default_str();
-        app.add_flag("--paths", paths, "Print the SVG path data of what is drawn in those frames");
+        app.add_flag("--paths", paths, "Print the drawing in those frames as SVG path data");
     }
 
     void addFiles(CLI::App& app) {
@@ -129,21 +127,20 @@ private:
                        "Write a page with the graph, the animation and its plots (needs Graphviz)")
             ->type_name("HTML")
             ->take_last();
-        app.add_option("--report-frames", reportFrames, "How many frames the page plays")
+        app.add_option("--report-frames", reportFrames, "The number of frames of the page")
             ->type_name("N")
             ->check(CLI::Range(1LL, 10000LL))
             ->capture_default_str();
-        app.add_option(
-               "--picture", picture,
-               "Write a picture of the graph and of the last of the frames (needs Graphviz)")
+        app.add_option("--picture", picture,
+                       "Write a picture of the graph and of the last frame (needs Graphviz)")
             ->type_name("SVG");
         app.add_option("--write", copy,
-                       "Save what was read, in the form of documents; may be FILE itself")
+                       "Save the graph as a document in our own format; may be FILE itself")
             ->type_name("JSON");
         app.add_option(
                "--compare", other,
-               "Print what is changed in the document FILE2, a line each, and nothing else; "
-               "ends with 1 where they differ. The page marks the changes")
+               "Print only the changes to the document FILE2, one per line; exit with 1 where "
+               "there are any. The page marks the changes")
             ->type_name("FILE2");
     }
 };

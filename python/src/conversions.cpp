@@ -78,7 +78,7 @@ py::object toIndex(py::handle object) {
 std::string toString(py::handle object) {
     if (PyBytes_Check(object.ptr())) return object.cast<std::string>();
     if (!PyUnicode_Check(object.ptr())) {
-        raise(PyExc_TypeError, "a string is wanted here, not " + nameOfType(object));
+        raise(PyExc_TypeError, "expected a string, not " + nameOfType(object));
     }
     py::object const bytes = py::reinterpret_steal<py::object>(
         PyUnicode_AsEncodedString(object.ptr(), "utf-8", "surrogateescape"));
@@ -112,7 +112,7 @@ Optional<std::vector<double>> ifVector(py::handle object) {
 FloatVec2 toVec2(py::handle object) {
     Optional<std::vector<double>> const numbers = ifVector(object);
     if (!numbers || numbers->size() != 2) {
-        raise(PyExc_TypeError, "a point is two numbers, as in (1.0, 2.0)");
+        raise(PyExc_TypeError, "expected two numbers, as in (1.0, 2.0)");
     }
     return {(*numbers)[0], (*numbers)[1]};
 }
@@ -134,7 +134,7 @@ void guardInit(py::handle type) {
         [init](py::object const& self, py::args const& arguments, py::kwargs const& named) {
             static std::unordered_set<PyObject*> running;
             if (!running.insert(self.ptr()).second) {
-                throw py::type_error("__init__ is called by what it is called with");
+                throw py::type_error("__init__ was called again by its argument");
             }
             struct Done {
                 PyObject* object;
@@ -147,7 +147,7 @@ void guardInit(py::handle type) {
 }
 
 unsigned long long toUnsigned(py::handle object) {
-    std::string const wanted = "an integer from 0 to 2**64 - 1 is wanted here";
+    std::string const wanted = "expected an integer from 0 to 2**64 - 1";
     if (!isInteger(object)) raise(PyExc_TypeError, wanted + ", not " + nameOfType(object));
     py::object const index = toIndex(object);
     unsigned long long const number = PyLong_AsUnsignedLongLong(index.ptr());
@@ -211,10 +211,11 @@ Value toValue(py::handle object) {
         return fromNumbers(*numbers);
     if (Optional<FloatMat4> const matrix = ifMatrix(object)) return *matrix;
     if (isSequence(object)) {
-        raise(PyExc_TypeError, "a sequence becomes a value if it has 2, 3 or 4 numbers, or 4 rows "
-                               "of 4; for data write Value(Unstructured([...]))");
+        raise(PyExc_TypeError,
+              "a sequence converts to Value if it has 2, 3 or 4 numbers, or 4 rows "
+              "of 4; for data write Value(Unstructured([...]))");
     }
-    raise(PyExc_TypeError, "there is no value of a " + nameOfType(object));
+    raise(PyExc_TypeError, "expected an object that converts to Value, not " + nameOfType(object));
 }
 
 py::object payloadOf(Value const& value) {

@@ -62,7 +62,7 @@ Open opened(py::handle object) {
     if (open.isMap) {
         for (auto const& [key, member] : copiedDict(object)) {
             if (!py::isinstance<py::str>(key)) {
-                raise(PyExc_TypeError, "the keys of data are strings, not " + nameOfType(key));
+                raise(PyExc_TypeError, "keys of data must be strings, not " + nameOfType(key));
             }
             open.members.emplace_back(toString(key), py::reinterpret_borrow<py::object>(member));
         }
@@ -134,7 +134,7 @@ Unstructured toData(py::handle object) {
         }
         if (!scalarData(current, data)) {
             if (!isMapping(current) && !isSequence(current)) {
-                raise(PyExc_TypeError, "data is None, a number, a string, a list or a dict, not " +
+                raise(PyExc_TypeError, "expected None, a number, a string, a list or a dict, not " +
                                            nameOfType(current));
             }
             if (!entered.insert(current.ptr()).second) {

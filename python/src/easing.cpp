@@ -41,7 +41,7 @@ Optional<Progress> toProgress(py::object const& t) {
     py::object const array = asArray(t);
     std::string const kind = toString(py::str(array.attr("dtype").attr("kind")));
     if (kind != "f" && kind != "i" && kind != "u" && kind != "b") {
-        throw py::type_error("the progress is a number or an array of numbers");
+        throw py::type_error("the progress must be a number or an array of numbers");
     }
     return Progress(asArray(array, "float64"));
 }
@@ -67,7 +67,7 @@ py::object easeAny(EasingFunction function, py::object const& start, py::object 
     Optional<std::vector<double>> const ends = ifVector(end);
     if (!starts && !ends) return easeVector(function, toDouble(start), toDouble(end), t);
     if (!starts || !ends || starts->size() != ends->size()) {
-        throw py::type_error("both ends are numbers, or vectors of as many components");
+        throw py::type_error("both ends must be numbers, or vectors of the same size");
     }
     std::vector<double> const& a = *starts;
     std::vector<double> const& b = *ends;

@@ -124,7 +124,7 @@ std::string textOf(T const& object) {
 // Pickled as documents: exact, at any depth.
 Patch readBack(py::bytes const& document) {
     Optional<Patch> patch = readDocument(static_cast<std::string>(document));
-    if (!patch) throw py::value_error("this is no pickled patch");
+    if (!patch) throw py::value_error("invalid pickled patch");
     return *std::move(patch);
 }
 

@@ -14,7 +14,7 @@ PyObject* makeDerived(PyTypeObject* type, PyObject* arguments, PyObject* named) 
     if (!pybind11::detail::all_type_info(type).empty()) {
         return makeInstance(type, arguments, named);
     }
-    PyErr_Format(PyExc_TypeError, "%s has no objects of its own", type->tp_name);
+    PyErr_Format(PyExc_TypeError, "%s cannot be instantiated", type->tp_name);
     return nullptr;
 }
 
@@ -29,7 +29,7 @@ PYBIND11_MODULE(_native, module) {
         try {
             std::rethrow_exception(thrown);
         } catch (pybind11::cast_error const&) {
-            PyErr_SetString(PyExc_TypeError, "an object of another type is wanted here");
+            PyErr_SetString(PyExc_TypeError, "expected an object of another type");
         }
     });
     auto* const base =

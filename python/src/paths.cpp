@@ -102,7 +102,7 @@ void defineElements(py::module_& module) {
         [](std::string const& name) {
             Optional<I> const instruction = parsePathInstruction(name);
             if (!instruction) {
-                raise(PyExc_ValueError, "there is no path instruction \"" + name + "\"");
+                raise(PyExc_ValueError, "unknown path instruction \"" + name + "\"");
             }
             return *instruction;
         },
@@ -185,7 +185,7 @@ void definePath(py::module_& module) {
         "path_from_svg_path_data",
         [](std::string const& data) {
             Optional<Path> path = pathFromSvgPathData(data);
-            if (!path) throw py::value_error("this is no SVG path data");
+            if (!path) throw py::value_error("invalid SVG path data");
             return std::make_shared<Path>(*std::move(path));
         },
         py::arg("data"), "The path of such data. Raises ValueError for anything else.");

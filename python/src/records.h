@@ -43,7 +43,7 @@ std::vector<T> toList(py::handle iterable) {
     std::vector<T> list;
     for (py::handle const element : copiedTuple(iterable)) {
         if (!py::isinstance<T>(element)) {
-            throw py::type_error("the elements are of the type " +
+            throw py::type_error("expected elements of type " +
                                  py::cast<std::string>(py::type::of<T>().attr("__name__")) +
                                  ", not " + nameOfType(element));
         }

@@ -61,7 +61,7 @@ def test_records_change_only_by_assignment() -> None:
     patch.attributes = {"a": None}
     assert before == graph()
     assert [child.id for child in patch.children] == [2, 3, 9]
-    with pytest.raises(TypeError, match="of the type Patch, not int"):
+    with pytest.raises(TypeError, match="elements of type Patch, not int"):
         patch.children = [1]
     assert [child.id for child in patch.children] == [2, 3, 9]
 

@@ -80,9 +80,9 @@ def test_geometry() -> None:
 
 
 def test_rejects() -> None:
-    with pytest.raises(ValueError, match="no path instruction"):
+    with pytest.raises(ValueError, match="unknown path instruction"):
         tarn.string_to_path_instruction("MoveTo")
-    with pytest.raises(ValueError, match="no SVG path data"):
+    with pytest.raises(ValueError, match="invalid SVG path data"):
         tarn.path_from_svg_path_data("M")
     for point in (5, (1,), (1, 2, 3), "ab", None):
         with pytest.raises(TypeError, match="two numbers"):

@@ -73,7 +73,7 @@ export const typeNames = Object.keys(Type);
 
 function pathOf(text) {
   const path = pathFromSvgPathData(text);
-  if (path === null) throw new SyntaxError(`"${text}" is no SVG path data`);
+  if (path === null) throw new SyntaxError(`"${text}" is not valid SVG path data`);
   return new Value(path);
 }
 

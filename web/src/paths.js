@@ -70,7 +70,7 @@ const pathOf = (x, what = "a path") => check.instance(x, Path, what);
 export const svgPathData = (path) => native.svgPathData(bytesOf(pathOf(path)));
 export function pathFromSvgPathData(data) {
   const answer = native.pathFromSvgPathData(check.string(data, "SVG path data"));
-  if (typeof answer === "number") throw new SyntaxError(`this is no SVG path data from byte ${answer} on`);
+  if (typeof answer === "number") throw new SyntaxError(`invalid SVG path data at byte ${answer}`);
   return new Path(fromBytes, answer);
 }
 export function bounds(path) {
@@ -200,7 +200,7 @@ export function ease(easingFunction, start, end, t) {
   }
   const progress = progressOf(t);
   if (kind === "bigint" || kind === "value" || other === "value") {
-    throw new TypeError("a list of progress is for numbers and vectors of numbers");
+    throw new TypeError("a list of progress needs numbers or vectors as ends");
   }
   return native.easeMany(curve, bytesOf(valueOf(start)), bytesOf(valueOf(end)), progress);
 }

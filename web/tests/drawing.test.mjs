@@ -59,7 +59,7 @@ test("paths have bounds, transformations and interpolation", () => {
   assert.equal(`${engine.interpolate(square, engine.translated(square, [2, 2]), 0.5)}`, "M1 1L3 1L3 5");
   assert.equal(engine.interpolate(square, new Path(), 0.5), null);
   assert.equal(`${engine.pathFromSvgPathData("m1 1 h2 v3 z")}`, "M1 1L3 1L3 4Z");
-  assert.throws(() => engine.pathFromSvgPathData("M 1 x"), { name: "SyntaxError", message: /from byte 4 on/ });
+  assert.throws(() => engine.pathFromSvgPathData("M 1 x"), { name: "SyntaxError", message: "invalid SVG path data at byte 4" });
 });
 
 test("curves ease numbers, vectors, integers and values", () => {
