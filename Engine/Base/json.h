@@ -29,7 +29,7 @@ inline Unstructured fromJson(nlohmann::json const& json);
 /// them as null. Strings may hold any bytes: `dump` throws for those that are not UTF-8, unless it
 /// is given another `nlohmann::json::error_handler_t`, such as `replace`.
 ///
-/// Linear, and not recursive itself; `dump` is recursive, and nlohmann-json destroys the document.
+/// Linear, and not recursive itself; `dump` is, and so may be the destructor of a deep document.
 /// Throws only `std::bad_alloc`.
 inline nlohmann::json toJson(Unstructured const& data);
 

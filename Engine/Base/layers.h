@@ -72,7 +72,7 @@ struct StrokeSettings {
 
     /// Whether the stroke is drawn at all: the opacity is not 0.0001 or less, the width is not 0.01
     /// or less, and either `forceVisible` is set or `start` and `end` differ by at least the
-    /// machine epsilon. A NaN counts as visible.
+    /// machine epsilon. A NaN passes each of these tests.
     TARN_API bool isVisible() const;
 
     /// Field by field, without a tolerance.

@@ -77,8 +77,8 @@ typename Pointer::element_type& elementsOf(Pointer const& list, char const* cond
 
 }  // namespace detail
 
-/// A list of these elements, in one allocation. Empty lists of ports, connections and patches
-/// allocate nothing: they are the lists that new records share.
+/// A list of these elements: one allocation, in addition to those of the vector. Empty lists of
+/// ports, connections and patches allocate nothing: they are the lists that new records share.
 template <class T>
 Array<T> arrayOf(std::vector<T> elements) {
     if (elements.empty()) return detail::emptyArray<T>();
@@ -161,7 +161,7 @@ struct EvalPort {
     /// Copied from the port.
     unsigned long long id = 0;
     unsigned long long tag = 0;
-    /// For the evaluator: zero and false at first, and never read by this library.
+    /// For the evaluator: zero and false at first; this library only copies and compares them.
     unsigned long long evaluatorState = 0;
     bool evaluatorFlag = false;
     TypeInfo typeInfo;
@@ -209,8 +209,8 @@ static_assert(std::is_nothrow_move_constructible_v<EvalPatch>, "lists of patches
 TARN_API EvalPort toEvalPort(Port const& port);
 TARN_API EvalPatch toEvalPatch(Patch const& patch);
 
-/// A new list with the result of `std::invoke(function, element)` for each element, in order; one
-/// allocation. Never null. `map(&Port::id, list)` is a list of identifiers.
+/// A new list with the result of `std::invoke(function, element)` for each element, in order. The
+/// elements are allocated once. Never null. `map(&Port::id, list)` is a list of identifiers.
 template <class Function, class T>
 MutableArray<std::decay_t<std::invoke_result_t<Function&, T const&>>> map(Function function,
                                                                           Array<T> const& list);
@@ -236,16 +236,16 @@ TARN_API EvalPort const* findOutputPort(EvalPatch const& patch, unsigned long lo
 TARN_API Optional<Connection> findIncomingConnectionToPort(Patch const& patch,
                                                            unsigned long long portId);
 
-/// All of the patch's own connections to (from) its child `patchId`; an empty set where there are
+/// All of the patch's own connections to (from) the patch `patchId`; an empty set where there are
 /// none. Linear.
 TARN_API std::unordered_set<Connection> findIncomingConnectionsToPatch(Patch const& patch,
                                                                        unsigned long long patchId);
 TARN_API std::unordered_set<Connection>
 findOutgoingConnectionsFromPatch(Patch const& patch, unsigned long long patchId);
 
-/// The connections from the port. They are those of the first patch in the subtree, depth first
-/// from `root`, with a child that has the port among its outputs. Empty where that patch has none,
-/// and for ports of `root` itself. Linear in the size of the subtree.
+/// The connections from the port, out of those of the first patch in the subtree (depth first from
+/// `root`) with a child that has the port among its outputs. Empty where that patch has none, and
+/// for ports of `root` itself. Linear in the size of the subtree.
 TARN_API std::unordered_set<Connection> findOutgoingConnectionsFromPort(Patch const& root,
                                                                         unsigned long long portId);
 

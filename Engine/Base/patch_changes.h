@@ -87,7 +87,7 @@ struct PatchChange {
 ///
 /// Lists that are the same object are skipped: comparing a document with its edited copy costs what
 /// the edit copied; otherwise it is linear. (Where patches are added while others are removed,
-/// everything in the removed ones is compared.) Not recursive.
+/// everything in the removed ones is searched.) Not recursive.
 TARN_API std::vector<PatchChange> patchChanges(Patch const& before, Patch const& after);
 
 /// One line for people, without a line end: what happened to which patch, with names and values.

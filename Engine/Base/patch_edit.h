@@ -37,7 +37,8 @@ public:
     /// A position after all others.
     static constexpr std::size_t kEnd = std::numeric_limits<std::size_t>::max();
 
-    /// Shares the tables of the index until `commit`; the index may be destroyed before.
+    /// Shares the tables of the index until `commit`; the index may be updated, assigned to or
+    /// destroyed before.
     TARN_API explicit PatchEdit(PatchIndex const& index);
     /// A moved-from edit may only be assigned to or destroyed.
     TARN_API PatchEdit(PatchEdit&& other) noexcept;
@@ -78,12 +79,12 @@ public:
     /// its ends are not an output and an input of children of the same patch. (Both may belong to
     /// one child.)
     TARN_API bool connect(Connection connection);
-    /// Removes every occurrence of the connection from the parent of its ends. False where there is
-    /// none.
+    /// Removes every occurrence of the connection from the parent of one of its ends; the other end
+    /// need not exist. False where there is none.
     TARN_API bool disconnect(Connection connection);
 
-    /// An identifier that is used neither in the old document nor in this edit; each call returns
-    /// another one. 0 where there is none left.
+    /// An identifier that never occurred in the old document or in this edit, also not in what was
+    /// removed; each call returns another one. 0 where there is none left.
     TARN_API unsigned long long freshPatchId();
     TARN_API unsigned long long freshPortId();
 

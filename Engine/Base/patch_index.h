@@ -123,10 +123,11 @@ public:
     /// skipped. It costs as much as a new index where copies share this index's tables, where
     /// identifiers repeat or a connection leads to an output, and occasionally after many updates.
     ///
-    /// Invalidates views, and moves `root()`. Pointers to patches, ports and connections live as
-    /// long as the lists that they point into: those of the former root as long as someone holds
-    /// it, and those that the new root shares with it. A failing allocation leaves the index
-    /// unchanged. Must not run concurrently with any other use of this index.
+    /// Invalidates views and references to the root, which is another patch afterwards. Pointers to
+    /// other patches, ports and connections live as long as the lists that they point into: those
+    /// of the former root as long as someone holds it, and those that the new root shares with it.
+    /// A failing allocation leaves the index unchanged. Must not run concurrently with any other
+    /// use of this index.
     TARN_API void update(Patch root);
 
 private:

@@ -111,18 +111,18 @@ public:
 
     // Closed outlines.
 
-    /// `radii` are half the width and half the height, `radius` is both; not checked, negative ones
-    /// reverse the direction. Starts at the largest x and continues towards the largest y. Sets the
-    /// current point to that start.
+    /// `radii` are half the width and half the height, `radius` is both; not checked, a negative
+    /// one mirrors the outline on its axis. Starts at the largest x and continues towards the
+    /// largest y (for positive radii). Sets the current point to that start.
     TARN_API PathBuilder& ellipse(FloatVec2 center, FloatVec2 radii);
     TARN_API PathBuilder& circle(FloatVec2 center, double radius);
     /// `origin` is the corner with the smallest x and y. `size` is not checked; a negative one
-    /// reverses the direction. `radius` is limited to half the width and half the height; a NaN is
-    /// the largest. Sets the current point to (origin.x + radius, origin.y).
+    /// mirrors the outline on its axis. `radius` is limited to half the width and half the height;
+    /// a NaN is the largest. Sets the current point to (origin.x + radius, origin.y).
     TARN_API PathBuilder& roundRect(FloatVec2 origin, FloatVec2 size, double radius);
     /// A rectangle whose corners are cut off: `cut` is the length along either edge, not limited.
-    /// `size` is not checked; a negative one reverses the direction. Sets the current point to
-    /// (origin.x, origin.y + cut), where its last line ends.
+    /// `size` is not checked; a negative one mirrors the outline on its axis. Sets the current
+    /// point to (origin.x, origin.y + cut), where its last line ends.
     TARN_API PathBuilder& hexaRect(FloatVec2 origin, FloatVec2 size, double cut);
 
     /// A path with all elements so far. The builder keeps them and can go on.

@@ -27,10 +27,10 @@ struct Bounds {
 };
 
 /// The smallest box around what the path draws, to within rounding: curves count by their extrema,
-/// not by their control points. Every `moveTo` counts as a point; a path without one begins at (0,
-/// 0). Empty for a path without a point that has numbers as coordinates. Where a control point is
-/// infinite, the box is infinite. Elements with fewer points than their instruction needs are
-/// skipped, and so is a coordinate that is a NaN. Linear.
+/// not by their control points. Every `moveTo` counts as a point; a path that does not begin with
+/// one begins at (0, 0). Empty for a path without a point that has numbers as coordinates. Where a
+/// control point is infinite, the box is infinite. Elements with fewer points than their
+/// instruction needs are skipped, and so is a coordinate that is a NaN. Linear.
 TARN_API Optional<Bounds> bounds(Path const& path);
 
 /// The path with `offset` added to every point.

@@ -26,7 +26,8 @@ TARN_API std::string svgPathData(Path const& path);
 /// Parses such a string with all commands of SVG 2: M, L, H, V, C, S, Q, T, A, Z, absolute or
 /// relative. The path consists of `moveTo`, `lineTo`, `curveTo`, `quadCurveTo` and `close` alone:
 /// an arc becomes up to four cubic curves, as accurate as those of `PathBuilder::arcTo`, and a
-/// `moveTo` is added after a close where drawing goes on. An empty string is the empty path.
+/// `moveTo` is added after a close where drawing goes on. A string without commands is the empty
+/// path.
 ///
 /// Empty where the data is invalid: also where it is incomplete, does not begin with M, or has a
 /// number beyond the range of a double. `*fault` is then the position of the first byte that cannot

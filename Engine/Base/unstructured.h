@@ -40,9 +40,8 @@ using EnableIfDataSource = std::enable_if_t<
 /// null. Conversions never fail: those without a sensible result return zero, false or an empty
 /// value. A tree may be of any depth: nothing here uses more stack for a deep one. Copies and
 /// comparisons of trees of more than 256 levels allocate a work list; destruction never allocates.
-/// To know which algorithm is needed, a map or an array caches its depth when it is constructed:
-/// from then on, no element may be changed through an older reference.
-/// may be changed through a reference from before.
+/// To know which algorithm is needed, an `Unstructured` caches its depth when it is constructed
+/// from a map or an array: from then on, no element may be changed through an older reference.
 ///
 /// In braces, an `Array` is an element: `Array{array}` has one element, `Array(array)` is a copy.
 class Unstructured {
@@ -152,8 +151,9 @@ public:
     TARN_API Array asArray() const;
     TARN_API std::string asString() const;
 
-    /// The signed integer, or the double (truncated towards zero and clamped; a NaN is 0).
-    /// Deliberate: an unsigned integer is an identifier and converts to 0 in both.
+    /// The signed integer or the double, else 0. `asInteger` truncates a double towards zero and
+    /// clamps it; a NaN is 0. Deliberate: an unsigned integer is an identifier and converts to 0 in
+    /// both.
     TARN_API long long asInteger() const;
     TARN_API_INLINE double asFloat() const {
         if (double const* number = boost::get<double>(&storage)) return *number;

@@ -129,7 +129,8 @@ TARN_API bool typeShouldCopyAcrossDeletedConnections(Type type);
 ///
 /// Conversions never fail: those without a sensible result return zero, false, the identity matrix
 /// or the empty path. A value that was moved from, or made from a null pointer, may hold a null
-/// payload. It converts to zero and equals only another null of its type.
+/// payload. It converts like the identity matrix, an empty path, null data or an empty string, and
+/// equals only another null of its type.
 ///
 /// Thread-safe as the types of the standard library are: copies that share a payload may be used in
 /// different threads.
@@ -381,8 +382,8 @@ namespace tarn::engine {
 
 /// The string that an editor shows; not meant to be parsed. Numbers have two decimals, or one from
 /// 1000 on, without trailing zeros: 2.5, 1234.6, 3. Non-finite ones are "nan" or "inf", with "-"
-/// where the sign is set. The rounding mode of the process applies; numbers are cut after 127
-/// characters. Components of a vector are joined by ", ", and a matrix is four lines of four. A
+/// where the sign is set. The rounding mode of the calling thread applies; numbers are cut after
+/// 127 characters. Components of a vector are joined by ", ", and a matrix is four lines of four. A
 /// boolean is "1" or "0", an identifier its number, a path "Path" or "Empty Path", unstructured
 /// data "unstructured" unless it is a string. The decimal point that is trimmed is that of
 /// `std::cout`'s locale at the time of the call; no other thread may change that locale meanwhile.
@@ -461,9 +462,9 @@ struct TypeInfo {
 /// `subtype` matter. An undefined enumerator is an assertion failure.
 TARN_API std::string portNameForTypeInfo(TypeInfo typeInfo, bool plural);
 
-/// `value`, clamped to the bounds of a `Float` port. `min` is tested first, a NaN passes, and a
-/// bound is returned with its own type. Copies nothing: the result refers to one of the arguments
-/// and must not outlive them.
+/// `value`, or the bound that it exceeds, where the port is a `Float` port. `min` is tested first,
+/// and a NaN passes. Nothing is converted: the value or the bound is returned with its own type.
+/// Copies nothing: the result refers to one of the arguments and must not outlive them.
 TARN_API_INLINE inline Value const& castValueToType(Value const& value,
                                                     TypeInfo const& typeInfo) noexcept;
 

@@ -26,8 +26,9 @@ struct DocumentError {
     /// The JSON pointer (RFC 6901) of the value that is wrong; where the string is not JSON, of the
     /// value around that place. Empty for the document as a whole.
     std::string pointer = {};
-    /// The position of that value in the string: both count from 1, columns in bytes. 0 where no
-    /// place in a string is wrong.
+    /// The position of that value in the string; where that is not JSON, of the first place that
+    /// cannot be parsed. Both count from 1, columns in bytes. 0 where no place in a string is
+    /// wrong.
     std::size_t line = 0;
     std::size_t column = 0;
 };
@@ -67,14 +68,14 @@ struct DocumentInfo {
 /// `*error`, where given, says why and where. Otherwise `*info`, where given, is filled in.
 ///
 /// Our own format is read exactly: what `writeDocument` wrote becomes an equal graph, bit for bit,
-/// and unknown fields are an error. A node graph is read as far as possible. Nodes get other
+/// and anything unknown is an error. A node graph is read as far as possible. Nodes get other
 /// identifiers where theirs are 0, negative, strings or repeated, and keep the given one as the
 /// attribute "id". What does not fit into the records becomes attributes. Each use of a shared
 /// definition becomes a group with a copy of its content.
 ///
-/// Patches and model layers may nest 10,000 levels, groups of a node graph 1,000, and data as deep
-/// as memory allows. Linear in a document of our own format, and in a node graph plus its copies of
-/// shared definitions. Throws only `std::bad_alloc`.
+/// Patches and model layers nest at most 10,000 levels, groups of a node graph at most 1,000, and
+/// data as deep as memory allows. Linear in a document of our own format, and in a node graph plus
+/// its copies of shared definitions. Throws only `std::bad_alloc`.
 TARN_DOCUMENT_API Optional<Patch>
 readDocument(std::string_view text, DocumentError* error = nullptr, DocumentInfo* info = nullptr);
 

@@ -60,7 +60,8 @@ public:
         group.place(begin);
     }
 
-    /// Stores the members, after every group was laid out. Throws where `end` is not countable.
+    /// Stores the members, after every group was laid out, up to `end`, which must be countable.
+    /// Allocates nothing where `reserveFor` made room.
     void fill(std::vector<Member> const& members, std::size_t end) {
         numbers.resize(end);
         for (std::size_t i = 0; i < members.size(); ++i) {

@@ -11,7 +11,7 @@
 namespace tarn::engine::detail {
 
 /// Holds a value without ever destroying it, so that destructors of other statics can still use it.
-/// Leak checkers still find what it allocated.
+/// What it allocated stays reachable, so leak checkers do not report it.
 template <class T>
 union Immortal {
     Immortal() : value() {}

@@ -185,8 +185,8 @@ struct PatchTables {
     Graph<Patch, Port> graph;
     ConnectionGroups groups;
     std::vector<std::uint32_t> freeRecords;
-    /// Whether all patches except the root, and all ports, have distinct identifiers, and none is 0
-    /// for a patch. Then no result depends on the search order.
+    /// Whether no two patches except the root have the same identifier, none has 0, and no two
+    /// ports have the same. Then no result depends on the search order.
     bool hasUniqueIds = false;
     /// An upper bound of the patches' identifiers.
     unsigned long long largestPatchId = 0;

@@ -15,8 +15,9 @@
 
 namespace tarn::engine::detail {
 
-/// A copy of the C locale's decimal point, made when this is constructed. Not thread-safe while the
-/// locale is changed. (`localeconv` would not be thread-safe at all.)
+/// The decimal point of the C library's current locale. `text` is valid until the locale is
+/// changed, which no other thread may do meanwhile. (`localeconv` must not be called on two threads
+/// at once.)
 #if __has_include(<langinfo.h>)
 struct RadixPoint {
     char const* const text = nl_langinfo(RADIXCHAR);

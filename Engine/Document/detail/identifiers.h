@@ -9,9 +9,9 @@
 
 namespace tarn::engine::detail {
 
-/// Patches and ports must have distinct identifiers that are not 0. Connections must lead from an
-/// output of one child to an input of another (or the same). Empty where the graph is valid, else
-/// the first error with its JSON pointer. Nearly linear, not recursive.
+/// Patches must have distinct identifiers, and so must ports; none may be 0. Connections must lead
+/// from an output of one child to an input of another (or the same). Empty where the graph is
+/// valid, else the first error with its JSON pointer. Nearly linear, not recursive.
 Optional<DocumentError> findWrongIdentifier(Patch const& root);
 
 }  // namespace tarn::engine::detail

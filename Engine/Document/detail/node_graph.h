@@ -47,7 +47,7 @@ struct GraphNode {
 };
 
 struct GraphLink {
-    std::size_t position = 0;  // In the list of nodes.
+    std::size_t position = 0;  // In the list of links.
     long long id = 0;
     NodeName from;
     long long fromSlot = 0;

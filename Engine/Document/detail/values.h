@@ -14,7 +14,7 @@ namespace tarn::engine::detail {
 struct Pending {
     Scalar content = {};
     bool isGiven = false;
-    /// The explicit type, where it is not that of the port, and whether the payload is null.
+    /// The explicit type, where it is not the usual one, and whether the payload is null.
     Optional<Type> type = {};
     bool isNullPayload = false;
 };
