@@ -123,7 +123,7 @@ void agreement(std::function<void()> check) { agreements().push_back(std::move(c
 
 void agree(bool same, char const* what) {
     if (same) return;
-    std::cerr << "the results differ: " << what << "\n";
+    std::cerr << "check failed: " << what << "\n";
     std::exit(1);
 }
 

@@ -157,8 +157,8 @@ int kindOf(Boost const& v) { return v.which(); }
 int kindOf(Std const& v) { return static_cast<int>(v.index()); }
 int kindOf(QVariant const& v) { return static_cast<int>(v.type()); }
 
-// Converting strings to numbers costs everyone the C library's parser, so the mixed values have no
-// strings.
+// Converting strings to numbers costs everyone the C library's parser, so these mixed values have
+// none.
 template <class T>
 std::vector<T> mixedWithoutTexts() {
     std::vector<T> loop = mixedValues<T>();

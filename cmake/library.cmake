@@ -38,7 +38,7 @@ function(tarn_add_library name exports)
         endif()
     endif()
     if(UNIX AND NOT APPLE AND NOT EMSCRIPTEN)
-        # Calls are direct, without the procedure linkage table.
+        # Calls inside the library are direct; those to other libraries need no PLT stub.
         target_compile_options(${library} PRIVATE -fno-semantic-interposition -fno-plt)
         # Instantiated templates of the standard library are visible unless the linker hides them.
         target_link_options(${library} PRIVATE "LINKER:--version-script=${exports}"
@@ -46,7 +46,7 @@ function(tarn_add_library name exports)
         set_property(TARGET ${library} APPEND PROPERTY LINK_DEPENDS "${exports}")
     endif()
     if(TARN_ENGINE_BASE_TOP)
-        # Compiled in, not linked: a static library's dependencies would be exported with it.
+        # The options are copied: a static library exports what it links to.
         target_compile_options(${library} PRIVATE
             $<TARGET_PROPERTY:tarn_warnings,INTERFACE_COMPILE_OPTIONS>)
     endif()

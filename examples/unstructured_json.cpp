@@ -29,7 +29,7 @@ int main() {
     std::cout << data.stringAt({"author"}, "nobody", &lookup) << ", "
               << (lookup == Unstructured::Lookup::WrongKind ? "not a string\n" : "\n");
 
-    // Vectors are read from members or elements.
+    // Vectors are read from the members X, Y, Z and W, or from elements by position.
     FloatVec2 const size = *data.find("size");
     std::cout << "size: " << size.x << " by " << size.y << "\n";
 

@@ -18,7 +18,8 @@ constexpr std::array<char const*, 13> kNames{
     "Sinusoidal In", "Sinusoidal Out", "Sinusoidal In-Out"};
 static_assert(kNames.size() == std::size_t(EasingFunction::SinusoidalInOut) + 1);
 
-// The unscaled exponential curve starts at 2^-10; the other constants rescale it to start at 0.
+// The unscaled rising half starts at 2^-10, and the falling half ends at 1 - 2^-10; these rescale
+// them to 0 and 1.
 constexpr double kExponentialOffset = 0.0009765625;       // 2^-10
 constexpr double kExponentialRange = 0.9990234375;        // 1 - 2^-10
 constexpr double kExponentialScale = 1.0009775171065494;  // 1024 / 1023
@@ -28,7 +29,8 @@ constexpr double kPi = 3.141592653589793;
 
 double cube(double x) { return std::pow(x, 3.0); }
 
-// The rising half of the exponential curve as a factor, and the exponent of the falling half.
+// Factors of the exponential curve: of its rising half, and of its falling half, which still has to
+// be scaled by `kExponentialScale`.
 double exponentialIn(double t) {
     return (std::exp2((t - 1.0) * kExponent) - kExponentialOffset) / kExponentialRange;
 }
@@ -40,7 +42,7 @@ double quadraticFalling(double v) { return (v - 2.0) * v - 1.0; }
 double sinusoidalIn(double t) { return std::cos(t * kHalfPi); }
 double sinusoidalInOut(double t) { return std::cos(t * kPi) - 1.0; }
 
-// The factor times the distance.
+// The start plus the factor times the distance.
 auto part(double factor) {
     return [=](double a, double delta) { return a + factor * delta; };
 }

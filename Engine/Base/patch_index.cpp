@@ -62,7 +62,8 @@ void PatchTables::lookAtIds() {
     for (auto const& slot : graph.outputs) {
         largestPortId = std::max<unsigned long long>(largestPortId, slot.key);
     }
-    // Both tables have the same seed, so they are in the same order.
+    // Both tables have the same seed and nearly the same order, so the lookups go through memory in
+    // order.
     for (auto const& slot : graph.inputs) {
         if (slot.isFree()) continue;
         largestPortId = std::max<unsigned long long>(largestPortId, slot.key);

@@ -18,7 +18,7 @@ struct PortPlan {
         std::uint32_t owner;
     };
     std::vector<Insertion> inserted;
-    // Ports that are in a new list although they are not new.
+    // Ports of a new list that has the same identifiers in the same order.
     std::vector<Port const*> refreshed;
 };
 

@@ -183,7 +183,7 @@ private:
     std::vector<Level> open;
 };
 
-// Writes a value in the format of its port's type.
+// Writes a value in the format of its own type.
 class ValueWriter {
 public:
     explicit ValueWriter(JsonWriter& target) : json(target) {}
@@ -456,7 +456,7 @@ private:
             key(name);
             written.visit(ValueWriter(json));
         }
-        // Only null can be left out.
+        // Without a type, null is read as a missing field: null payloads and null data need theirs.
         Unstructured const* const data = written.ifUnstructured();
         bool const isNullData = data != nullptr && data->isNull();
         if (isNull || isNullData || written.type() != usualType) {

@@ -29,7 +29,8 @@ void Evaluator::evaluate(long long frame) { run(*top, frame); }
 
 // The lists of the evaluation form never change their size here: pointers into them stay valid.
 std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch& evaluated) {
-    // Of repeated identifiers the first counts, as in the queries.
+    // The first connection to a port counts, and the first port with an identifier, as in the
+    // queries.
     std::unordered_map<unsigned long long, unsigned long long> incoming;
     for (Connection const& c : *patch.connections) incoming.emplace(c.toPortId, c.fromPortId);
     std::unordered_map<unsigned long long, EvalPort const*> outputs;
@@ -48,7 +49,7 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
         Patch const& child = patch.children->at(i);
         EvalPatch& evaluatedChild = evaluated.children->at(i);
         Step step{&evaluatedChild, {}, nullptr};
-        // A patch of unknown kind passes its inputs' defaults on unchanged.
+        // A patch of unknown kind passes on its inputs' defaults: connections to it are ignored.
         for (Port const& input : *child.inputs) {
             if (child.builtin == kUnknownKind) break;
             step.sources.push_back(sourceOf(input));
@@ -59,8 +60,8 @@ std::shared_ptr<Evaluator::Level> Evaluator::plan(Patch const& patch, EvalPatch&
     return level;
 }
 
-// The positions of the children in topological order; those in a cycle come last, in their own
-// order. Connections whose ends are not children are ignored.
+// The positions of the children in topological order; those in a cycle or after one come last, in
+// their own order. Connections whose ends are not children are ignored.
 std::vector<std::size_t> Evaluator::order(Patch const& patch) {
     std::vector<Patch> const& children = *patch.children;
     std::unordered_map<unsigned long long, std::size_t> positions;

@@ -16,7 +16,7 @@
 #include <vector>
 
 // Evaluates all patches of a document, frame by frame. Within each group, patches are evaluated in
-// topological order; in a cycle, one connection carries the value of the previous frame.
+// topological order; in a cycle, at least one connection carries the value of the previous frame.
 class Evaluator {
 public:
     // `document` must outlive the evaluator.

@@ -46,7 +46,8 @@ struct Kind {
     char const* ports;
 };
 
-// The kinds that the evaluator handles itself.
+// The kinds that other code refers to: those that the evaluator handles itself, and layers, which
+// the scene draws.
 constexpr unsigned long long kUnknownKind = 0;
 constexpr unsigned long long kGroupKind = 1;
 constexpr unsigned long long kGroupInputKind = 2;

@@ -111,7 +111,7 @@ struct Options {
 
 private:
     void addFrames(CLI::App& app) {
-        app.add_option("--frames", frames, "The number of frames to evaluate")
+        app.add_option("--frames", frames, "The number of frames to evaluate; 0 for none")
             ->type_name("N")
             ->check(CLI::Range(0LL, 10000000LL))
             ->capture_default_str();

@@ -17,7 +17,7 @@ class AllocationCounter {
 public:
     AllocationCounter();
     std::size_t count() const;
-    /// The number of allocations since construction that were not freed.
+    /// The number of allocated blocks, relative to construction.
     std::size_t held() const;
     /// The largest number of allocated bytes since construction, relative to then; only for the
     /// counter that was constructed last.

@@ -26,7 +26,7 @@
 
 namespace tests {
 
-// Not inlined, so that the compiler does not warn of unreachable code.
+// A function and not a constant, so that the compiler does not warn of unreachable code.
 inline bool hasNoDeathTests() { return true; }
 
 /// Matches exactly that output. Each platform has its own regular expressions, and an emulator of

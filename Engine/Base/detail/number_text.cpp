@@ -39,8 +39,9 @@ bool roundsToNearest() {
 // From here on doubles have no fraction; below, one decimal still fits into 64 bits.
 constexpr double kTwo52 = 4503599627370496.0;
 
-// The magnitude of `d` times `scale` as an integer, rounded half to even as the C library does.
-// Exact for |d| < 2^52 and a scale of at most 100: the mantissa times the scale fits into 64 bits.
+// The magnitude of `d` times `scale` as an integer, rounded like the C library: in the current
+// rounding mode, ties to even when it is to nearest. Exact for |d| < 2^52 and a scale of at most
+// 100: the mantissa times the scale fits into 64 bits.
 std::uint64_t roundedMultiple(double d, std::uint64_t scale) {
     std::uint64_t bits = 0;
     std::memcpy(&bits, &d, sizeof bits);

@@ -185,8 +185,8 @@ struct PatchTables {
     Graph<Patch, Port> graph;
     ConnectionGroups groups;
     std::vector<std::uint32_t> freeRecords;
-    /// Whether no two patches except the root have the same identifier, none has 0, and no two
-    /// ports have the same. Then no result depends on the search order.
+    /// Whether no two patches have the same identifier, none but the root has 0, and no two ports
+    /// have the same. Then no result depends on the search order.
     bool hasUniqueIds = false;
     /// An upper bound of the patches' identifiers.
     unsigned long long largestPatchId = 0;
@@ -194,7 +194,7 @@ struct PatchTables {
     /// The mark of the latest update.
     std::uint32_t lastMark = 0;
 
-    /// Both are only used where ports of two kinds have the same identifier.
+    /// For graphs with repeated identifiers, or with connections that lead to outputs.
     std::unordered_map<unsigned long long, std::uint32_t, SeededHash> innerOwners;
     std::unordered_map<unsigned long long, std::uint32_t, SeededHash> incomingToOutputs;
 

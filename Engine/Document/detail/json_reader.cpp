@@ -20,7 +20,7 @@ void setPlace(std::string_view text, std::size_t offset, DocumentError& error) {
     error.column = before.size() - (lineEnd == std::string_view::npos ? 0 : lineEnd + 1) + 1;
 }
 
-// Scans a valid JSON string up to a given place.
+// Scans a document, which must be valid JSON up to the place that is looked for.
 class Scanner {
 public:
     explicit Scanner(std::string_view scanned) : text(scanned) {

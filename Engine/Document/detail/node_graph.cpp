@@ -53,7 +53,8 @@ TypeInfo typeInfoOf(Unstructured const& type) {
     return info;
 }
 
-// Converts a setting to the type of a port where nothing is lost: "5" becomes 5 for a number.
+// Converts a setting to the type of a port; a string converts as a string value, so "5" becomes 5
+// for a number.
 Value asDefault(Unstructured const& setting, Type type) {
     if (std::string const* const text = setting.ifString()) return Value(*text).asType(type);
     return Value(setting).asType(type);
@@ -270,8 +271,9 @@ private:
     // The positions of the nodes of a name in the list of patches.
     using Places = std::vector<std::pair<NodeName, std::size_t>>;
 
-    // Fills `patch` with the patches and connections of `graph`. At the last use of a definition
-    // its content is moved instead of copied.
+    // Fills `patch` with the patches and connections of `graph`, whose content is moved for
+    // `isLastUse`: so for the document and its inline subgraphs. Definitions are copied at every
+    // use.
     void fill(Patch& patch, NodeGraph& graph, Definition const* definition, bool isLastUse) {
         Places places;
         std::size_t const count = graph.nodes.size();
@@ -367,8 +369,8 @@ private:
         return patch;
     }
 
-    // Members of an inline subgraph become members of its node, under other keys where the node has
-    // them.
+    // Members of an inline subgraph become members of its node. Its `id`, and members that the node
+    // has too, are stored as one map in the attribute "subgraph".
     static void addMembers(Patch& patch, std::map<std::string, Unstructured> members) {
         auto const id = members.find("id");
         Unstructured::Map apart;
@@ -440,7 +442,8 @@ private:
         fill(patch, definition.graph, &definition, false);
     }
 
-    // Whether that end of the definition is used.
+    // Whether nothing of that end would be lost: the document has nothing about it, or a patch made
+    // by `addEnd` keeps it.
     static bool hasEnd(Unstructured const& node, std::vector<Port> const& ports) {
         return node.isNull() || (node.isMap() && !ports.empty());
     }
