@@ -32,7 +32,7 @@ FACTS = [
         ("docs/platforms.md", r"Linux with g\+\+ ([\d.]+) or later"),
     ]),
     ("levels of patches", "Engine/Document/detail/own_reader.cpp", r"kDeepest = (\d+)", [
-        ("Engine/Document/document.h", r"may nest ([\d,]+) levels"),
+        ("Engine/Document/document.h", r"nest at most ([\d,]+) levels"),
         ("docs/documents.md", r"a list of patches, ([\d,]+) levels"),
         ("docs/pitfalls.md", r"refuses more than ([\d,]+) levels"),
         ("docs/python.md", r"nest ([\d,]+) levels at most"),
@@ -42,7 +42,7 @@ FACTS = [
         ("docs/pitfalls.md", r"\(([\d,]+) on WebAssembly\)"),
     ]),
     ("levels of groups", "Engine/Document/detail/node_graph.h", r"kDeepestGroups = (\d+)", [
-        ("Engine/Document/document.h", r"groups of a node graph ([\d,]+\d)"),
+        ("Engine/Document/document.h", r"groups of a node graph at most ([\d,]+\d)"),
     ]),
     ("levels handled recursively", "Engine/Base/unstructured.cpp", r"kDeepestRecursion = (\d+)", [
         ("Engine/Base/unstructured.h", r"more than (\d+) levels"),
