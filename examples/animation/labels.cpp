@@ -136,7 +136,7 @@ std::string countsText(Document const& document) {
         text << "\n";
     }
     if (!unknown.empty()) {
-        text << "not implemented, inputs' defaults handed on:";
+        text << "kinds without an implementation (outputs are the defaults of inputs):";
         for (std::string const& name : unknown) text << " " << name;
         text << "\n";
     }

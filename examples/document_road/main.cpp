@@ -139,8 +139,9 @@ private:
             ->type_name("JSON");
         app.add_option(
                "--compare", other,
-               "Print only the changes to the document FILE2, one per line; exit with 1 where "
-               "there are any. The page marks the changes")
+               "Print the changes from FILE to FILE2, one per line. Exit with 0 if they are equal, "
+               "1 "
+               "if not, 2 on an error. With --report, the page shows FILE2 and marks the changes")
             ->type_name("FILE2");
     }
 };
@@ -218,8 +219,8 @@ std::string answer(Document const& document, Options const& options) {
 }  // namespace
 
 int main(int argc, char** argv) {
-    CLI::App app("Reads a document of patches, or a node graph exported by a browser's node "
-                 "editor (JSON), and animates it.",
+    CLI::App app("Reads a document of patches, or a node graph exported by a browser-based "
+                 "node editor (JSON), and animates it.",
                  "document_road");
     Options options(app);
     try {

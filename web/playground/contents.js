@@ -7,19 +7,19 @@ const colour = /^#([0-9a-f]{2})([0-9a-f]{2})([0-9a-f]{2})([0-9a-f]{2})?$/i;
 function numbersOf(text, count) {
   const parts = text.split(/[\s,;]+/).filter((part) => part !== "");
   const numbers = parts.map(numberOf);
-  if (count !== undefined && numbers.length !== count) throw new SyntaxError(`${count} numbers are wanted, not ${numbers.length}`);
+  if (count !== undefined && numbers.length !== count) throw new SyntaxError(`expected ${count} numbers, not ${numbers.length}`);
   return numbers;
 }
 
 export function numberOf(text) {
   const trimmed = text.trim();
   const number = /^[+-]?inf(inity)?$/i.test(trimmed) ? (trimmed[0] === "-" ? -Infinity : Infinity) : Number(trimmed);
-  if (trimmed === "" || (Number.isNaN(number) && !/^[+-]?nan$/i.test(trimmed))) throw new SyntaxError(`"${text}" is no number`);
+  if (trimmed === "" || (Number.isNaN(number) && !/^[+-]?nan$/i.test(trimmed))) throw new SyntaxError(`"${text}" is not a number`);
   return number;
 }
 
 function integerOf(text) {
-  if (!/^\s*[+-]?\d+\s*$/.test(text)) throw new SyntaxError(`"${text}" is no whole number`);
+  if (!/^\s*[+-]?\d+\s*$/.test(text)) throw new SyntaxError(`"${text}" is not an integer`);
   return BigInt(text.trim().replace(/^\+/, ""));
 }
 
@@ -45,7 +45,7 @@ export const kinds = {
 
 function booleanOf(text) {
   const found = new Map([["true", true], ["false", false], ["1", true], ["0", false]]).get(text.trim().toLowerCase());
-  if (found === undefined) throw new SyntaxError(`"${text}" is neither true nor false`);
+  if (found === undefined) throw new SyntaxError(`expected true, false, 1 or 0, not "${text}"`);
   return new Value(found);
 }
 
@@ -55,7 +55,7 @@ export function endOf(text) {
   const numbers = numbersOf(text);
   if (numbers.length === 1) return numbers[0];
   if (numbers.length >= 2 && numbers.length <= 4) return numbers;
-  throw new SyntaxError("one to four numbers are wanted, or a colour");
+  throw new SyntaxError("expected one to four numbers, or a colour");
 }
 
 const cppNumber = (number) =>

@@ -113,14 +113,15 @@ function fieldOf(port) {
   label.append(field);
   const connection = index.incomingConnection(port.id);
   const value = port.defaultValue;
+  const notText = "not editable as text";
   let note = "";
   try {
     field.value = show(value);
     if (connection !== null) note = `from ${nameOf(index.ownerOfPort(connection.fromPortId) ?? { name: "" })}`;
-    else if (repeated.has(port.id)) note = "another input has its identifier";
-    else if (String(bytesOf(read(field.value))) !== String(bytesOf(value))) note = "a field cannot hold it";
+    else if (repeated.has(port.id)) note = "not editable: another input has the same identifier";
+    else if (String(bytesOf(read(field.value))) !== String(bytesOf(value))) note = notText;
   } catch {
-    note = "a field cannot hold it";
+    note = notText;
   }
   if (note !== "") {
     field.disabled = true;
@@ -250,7 +251,7 @@ function step(by) {
     choosePatch(String(index.ownerOfPort(edited)?.id ?? ""));
     showInputs();
   }
-  say(by < 0 ? "Undone" : "Done again");
+  say(by < 0 ? "Undone" : "Redone");
 }
 
 // Keeping
@@ -368,7 +369,7 @@ async function kept(key, otherwise) {
   try {
     return read(await unpacked(text.slice(1)), stateOf(`${key}-name`, "a document"));
   } catch {
-    byId("document-error").textContent = "The address has no document that can be read.";
+    byId("document-error").textContent = "The link contains no readable document.";
     return null;
   }
 }

@@ -10,7 +10,7 @@ async function through(stream, bytes) {
     const { done, value } = await reader.read();
     if (done) return new Uint8Array(await new Blob(parts).arrayBuffer());
     size += value.length;
-    if (size > mostBytes) throw new RangeError("there is too much in the address");
+    if (size > mostBytes) throw new RangeError("the document in the link is larger than 16 MiB");
     parts.push(value);
   }
 }

@@ -48,7 +48,7 @@ function update() {
 export function start() {
   const kind = byId("value-type");
   choices(kind, Object.entries(kinds).map(([key, { name }]) => [key, name]));
-  choices(byId("port-type"), typeNames.map((name) => [name, portNameForTypeInfo({ type: Type[name] })]));
+  choices(byId("port-type"), typeNames.map((name) => [name, `${portNameForTypeInfo({ type: Type[name] })} (${typeToString(Type[name])})`]));
   keepField(kind, "number", () => {
     byId("value-content").value = kinds[kind.value].begin;
     byId("value-content").dispatchEvent(new Event("input"));

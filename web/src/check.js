@@ -64,7 +64,7 @@ export function enumerator(x, names, what) {
 // A position in a list; undefined is the end.
 export function position(x) {
   if (x === undefined) return -1;
-  if (!Number.isSafeInteger(x) || x < 0) throw mustBe("a position", "a whole number from 0", x);
+  if (!Number.isSafeInteger(x) || x < 0) throw mustBe("a position", "an integer from 0", x);
   return x;
 }
 

@@ -473,7 +473,7 @@ export class Evaluator {
     this.#held = new Held(native.makeEvaluator(addressOf(root), rate), "evaluator");
   }
   evaluate(frame) {
-    if (!Number.isSafeInteger(frame)) throw check.mustBe("a frame", "a whole number", frame);
+    if (!Number.isSafeInteger(frame)) throw check.mustBe("a frame", "an integer", frame);
     native.evaluate(this.#held.handle, frame);
     return this;
   }
