@@ -113,19 +113,23 @@ void memory() {
                 return (bench::heapBytes() - before) / static_cast<double>(patches);
             }));
     }
-    bench::operation("memory of an undo step, 100,000 patches in groups")
-        .inBytes()
-        .ours(bench::bytes([] {
-            PatchIndex index(bench::documentOf(kPatches, kGroup));
-            std::vector<Patch> history;
-            history.reserve(1001);
-            double const before = bench::heapBytes();
-            for (unsigned long long i = 0; i < 1000; ++i) {
-                history.push_back(index.root());
-                index.update(edited(index, i * 97 + 7, 0.5));
-            }
-            return (bench::heapBytes() - before) / 1000;
-        }));
+    for (std::size_t const groupSize : {kGroup, kPatches}) {
+        bool const isFlat = groupSize == kPatches;
+        bench::operation(std::string("memory of an undo step, 100,000 patches ") +
+                         (isFlat ? "in one list" : "in groups"))
+            .inBytes()
+            .ours(bench::bytes([groupSize, steps = isFlat ? 10ULL : 1000ULL] {
+                PatchIndex index(bench::documentOf(kPatches, groupSize));
+                std::vector<Patch> history;
+                history.reserve(steps);
+                double const before = bench::heapBytes();
+                for (unsigned long long i = 0; i < steps; ++i) {
+                    history.push_back(index.root());
+                    index.update(edited(index, i * 97 + 7, 0.5));
+                }
+                return (bench::heapBytes() - before) / static_cast<double>(steps);
+            }));
+    }
 }
 
 }  // namespace

@@ -29,7 +29,7 @@ FACTS = [
     ]),
     ("g++", "docs/platforms.md", r"\| g\+\+ \| ([\d.]+) \|", [
         ("README.md", r"g\+\+ ([\d.]+) or clang"),
-        ("docs/platforms.md", r"Linux with g\+\+ ([\d.]+) or later"),
+        ("docs/platforms.md", r"s390x with g\+\+ ([\d.]+) or later"),
     ]),
     ("levels of patches", "Engine/Document/detail/own_reader.cpp", r"kDeepest = (\d+)", [
         ("Engine/Document/document.h", r"nest at most ([\d,]+) levels"),
@@ -65,6 +65,32 @@ FACTS = [
     ]),
 ]
 
+# Rows of the full benchmark table, and the file, row and column that repeat the first figure of each.
+FIGURES = [
+    ("copy 10,000 mixed values", "docs/benchmark.md", "copy 10,000 mixed values", 1),
+    ("double(v) of 10,000 numbers", "docs/benchmark.md", "convert 10,000 numbers to `double`", 1),
+    ("== of 10,000 mixed values, shared", "docs/benchmark.md", "`==` of 10,000 mixed values, shared", 1),
+    ("copy and destroy a catalogue", "docs/benchmark.md", "copy and destroy unstructured data, a catalogue", 1),
+    ("easeEach of 4,000 doubles, linear and quadratic", "docs/benchmark.md",
+     "ease 4,000 numbers in one call (`easeEach`)", 1),
+    ("build an index, 100,000 patches", "docs/benchmark.md", "build an index of 100,000 patches", 1),
+    ("edit a port, 100,000 patches in groups", "docs/benchmark.md",
+     "edit one port among 100,000 patches, in groups of 100", 1),
+    ("edit a port, 100,000 patches in groups", "docs/editing.md",
+     "an edit of one port's default value, deep inside", 1),
+    ("edit a port, 100,000 patches in one list", "docs/editing.md",
+     "an edit of one port's default value, deep inside", 2),
+    ("update the index after the edit, 100,000 patches in groups", "docs/editing.md", "`PatchIndex::update` after it", 1),
+    ("update the index after the edit, 100,000 patches in one list", "docs/editing.md", "`PatchIndex::update` after it",
+     2),
+    ("patchChanges of the edit, 100,000 patches in groups", "docs/editing.md", "`patchChanges` of both", 1),
+    ("patchChanges of the edit, 100,000 patches in one list", "docs/editing.md", "`patchChanges` of both", 2),
+    ("memory of an undo step, 100,000 patches in groups", "docs/editing.md",
+     "memory that the former root adds to a history", 1),
+    ("memory of an undo step, 100,000 patches in one list", "docs/editing.md",
+     "memory that the former root adds to a history", 2),
+]
+
 
 def main() -> int:
     root = Path(sys.argv[1])
@@ -74,6 +100,11 @@ def main() -> int:
         text = re.sub(r"\n\s*//+", "\n", (root / file).read_text())
         pattern = pattern.replace(" ", r"\s+")
         return [figure.replace(",", "") for figure in re.findall(pattern, text, re.DOTALL)]
+
+    def cell(file: str, row: str, column: int) -> str:
+        rows = [line.strip("| ").split(" | ") for line in (root / file).read_text().split("\n") if line.startswith("|")]
+        cells = [cells[column] for cells in rows if cells[0] == row]
+        return cells[0] if len(cells) == 1 else f"{len(cells)} rows of that name"
 
     faults = []
     compared = 0
@@ -87,6 +118,11 @@ def main() -> int:
             compared += len(figures)
             if set(figures) != set(defined):
                 faults.append(f"{name}: {source} says {defined[0]}, {file} says {figures}")
+    for name, file, row, column in FIGURES:
+        figure, repeated = cell("docs/benchmark_table.md", name, 1), cell(file, row, column)
+        compared += 1
+        if figure != repeated or figure.endswith("name"):
+            faults.append(f"{name}: docs/benchmark_table.md says {figure}, {file} says {repeated}")
     print("\n".join(faults) if faults else f"{compared} figures agree with the sources")
     return 1 if faults else 0
 
