@@ -46,11 +46,12 @@ public:
     TARN_API ~PatchEdit();
 
     /// The patch (the port) after the changes so far, to be changed in place; null where it does
-    /// not exist or is removed. Valid until `commit`, whatever else is changed. The `id` cannot be
-    /// changed: what is written there is ignored. A list that is assigned to the patch replaces the
-    /// former one and all changes made to it; the edit does not look into it. (All empty lists of
-    /// new records and of `arrayOf` are the same object: assigning it where it was changes
-    /// nothing.)
+    /// not exist or is removed. The lists of the patch are those from before the edit, without what
+    /// the functions below changed in them. Valid until `commit`, whatever else is changed. The
+    /// `id` cannot be changed: what is written there is ignored. A list that is assigned to the
+    /// patch replaces the former one and all changes made to it; the edit does not look into it.
+    /// (All empty lists of new records and of `arrayOf` are the same object: assigning it where it
+    /// was changes nothing.)
     TARN_API Patch* patch(unsigned long long id);
     TARN_API Port* inputPort(unsigned long long portId);
     TARN_API Port* outputPort(unsigned long long portId);

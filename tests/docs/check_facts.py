@@ -26,10 +26,12 @@ FACTS = [
         ("README.md", r"Boost ([\d.]+) to"),
         ("docs/platforms.md", r"\| Boost \(headers\) \| ([\d.]+) \|"),
         ("docs/platforms.md", r"any Boost from ([\d.]+) to"),
+        ("docs/platforms.md", r"and Boost ([\d.]+\d)\.\n"),
     ]),
     ("g++", "docs/platforms.md", r"\| g\+\+ \| ([\d.]+) \|", [
         ("README.md", r"g\+\+ ([\d.]+) or clang"),
-        ("docs/platforms.md", r"s390x with g\+\+ ([\d.]+) or later"),
+        ("docs/platforms.md", r"smallest versions are g\+\+ ([\d.]+\d),"),
+        ("docs/platforms.md", r"from g\+\+ ([\d.]+) and clang"),
     ]),
     ("levels of patches", "Engine/Document/detail/own_reader.cpp", r"kDeepest = (\d+)", [
         ("Engine/Document/document.h", r"nest at most ([\d,]+) levels"),
