@@ -140,8 +140,7 @@ private:
         app.add_option(
                "--compare", other,
                "Print the changes from FILE to FILE2, one per line. Exit with 0 if they are equal, "
-               "1 "
-               "if not, 2 on an error. With --report, the page shows FILE2 and marks the changes")
+               "1 if not, 2 on an error. With --report, the page shows FILE2 and marks the changes")
             ->type_name("FILE2");
     }
 };
