@@ -158,7 +158,7 @@ void bench::data() {
         operation("build " + kind).atMost(1.3, "nlohmann");
         operation("copy " + kind).atMost(1.4, "nlohmann");
         operation("copy and destroy " + kind).atMost(flat ? 0.6 : 1.0, "nlohmann");
-        operation("== of " + kind).atMost(1.15, "nlohmann");
+        operation("== of " + kind).atMost(flat ? 0.9 : 1.1, "nlohmann");
         operation("destroy " + kind).atMost(1.0, "nlohmann");
         operation("heap memory of " + kind).atMost(1.05, "nlohmann");
     }

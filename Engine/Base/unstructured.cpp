@@ -40,23 +40,6 @@ double component(Unstructured const& tree, std::size_t i) {
     return tree.asFloat();
 }
 
-// Numbers, the most frequent elements, are compared without a function call.
-bool elementsEqual(Unstructured const& a, Unstructured const& b) {
-    bool const numbers = a.type() == Unstructured::Type::Float && b.type() == a.type();
-    return numbers ? a.asFloat() == b.asFloat() : a == b;
-}
-
-bool mapsEqual(Unstructured::Map const& a, Unstructured::Map const& b) {
-    return a.size() == b.size() &&
-           std::equal(a.begin(), a.end(), b.begin(), [](auto const& x, auto const& y) {
-               return x.first == y.first && elementsEqual(x.second, y.second);
-           });
-}
-
-bool arraysEqual(Unstructured::Array const& a, Unstructured::Array const& b) {
-    return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin(), elementsEqual);
-}
-
 bool isEmptyContainer(Unstructured const& tree) {
     if (auto const* map = tree.ifMap()) return map->empty();
     if (auto const* array = tree.ifArray()) return array->empty();
@@ -162,6 +145,25 @@ void Unstructured::copyDeep(Unstructured const& from, Unstructured& to) {
             }
         }
     }
+}
+
+// Doubles, the most frequent elements, are compared without a function call. Not by `type()` and
+// `asFloat()`: each of them would test the variant's index again.
+inline bool Unstructured::equalElements(Unstructured const& a, Unstructured const& b) {
+    double const* const x = boost::get<double>(&a.storage);
+    double const* const y = boost::get<double>(&b.storage);
+    return x != nullptr && y != nullptr ? *x == *y : a == b;
+}
+
+inline bool Unstructured::equalMaps(Map const& a, Map const& b) {
+    return a.size() == b.size() &&
+           std::equal(a.begin(), a.end(), b.begin(), [](auto const& x, auto const& y) {
+               return x.first == y.first && equalElements(x.second, y.second);
+           });
+}
+
+inline bool Unstructured::equalArrays(Array const& a, Array const& b) {
+    return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin(), equalElements);
 }
 
 // For two containers of the same kind, at least one of them deep.
@@ -370,21 +372,33 @@ Unstructured::operator FloatVec4() const {
 }
 
 bool Unstructured::operator==(Unstructured const& other) const {
-    if (type() != other.type()) return false;
-    switch (type()) {
-        case Type::Null: return true;
-        case Type::Map:
-            if (isDeep() && other.isDeep()) return equalDeep(*this, other);
-            return mapsEqual(*ifMap(), *other.ifMap());
-        case Type::Array:
-            if (isDeep() && other.isDeep()) return equalDeep(*this, other);
-            return arraysEqual(*ifArray(), *other.ifArray());
-        case Type::Float: return asFloat() == other.asFloat();
-        case Type::Integer:
-        case Type::UnsignedInteger: return asId() == other.asId();
-        case Type::String: return *ifString() == *other.ifString();
+    // Not by `type()`, which is narrower: from equal indices the compiler knows the alternative
+    // that it reads from `other`.
+    if (storage.which() != other.storage.which()) return false;
+    if (auto const* text = ifString()) return *text == *other.ifString();
+    if (auto const* integer = boost::get<long long>(&storage)) {
+        return *integer == *boost::get<long long>(&other.storage);
     }
-    return false;
+    if (auto const* integer = boost::get<unsigned long long>(&storage)) {
+        return *integer == *boost::get<unsigned long long>(&other.storage);
+    }
+    if (auto const* number = boost::get<double>(&storage)) {
+        return *number == *boost::get<double>(&other.storage);
+    }
+    auto const areDeep = [](auto const& a, auto const& b) {
+        return a.height > kDeepestRecursion && b.height > kDeepestRecursion;
+    };
+    if (Node<Map> const* map = node<Map>()) {
+        Node<Map> const& otherMap = *other.node<Map>();
+        return areDeep(*map, otherMap) ? equalDeep(*this, other)
+                                       : equalMaps(map->content, otherMap.content);
+    }
+    if (Node<Array> const* array = node<Array>()) {
+        Node<Array> const& otherArray = *other.node<Array>();
+        return areDeep(*array, otherArray) ? equalDeep(*this, other)
+                                           : equalArrays(array->content, otherArray.content);
+    }
+    return true;  // Both are null.
 }
 bool Unstructured::operator!=(Unstructured const& other) const { return !(*this == other); }
 
