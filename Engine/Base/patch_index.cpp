@@ -36,13 +36,15 @@ void appendOnce(std::vector<Connection> const& list, std::uint32_t parent,
     for (std::uint32_t i = 0; i < list.size(); ++i) {
         bool isFirst = true;
         if (slots.empty()) {
-            auto const place = list.begin() + static_cast<std::ptrdiff_t>(i);
-            isFirst = std::find(list.begin(), place, list[i]) == place;
+            // Mostly the first identifier already differs, without a function call.
+            for (std::uint32_t j = 0; j < i && isFirst; ++j) {
+                isFirst = list[j].toPortId != list[i].toPortId || list[j] != list[i];
+            }
         } else if (std::uint32_t const first = firstOfHash.slotFor(slots[i].key).position;
                    first != i) {
             isFirst = list[first] != list[i] && others.insert(list[i]).second;
         }
-        if (isFirst) places.push_back({&list[i], parent, i});
+        if (isFirst) places.emplace_back(list[i], parent, i);
     }
 }
 
@@ -74,7 +76,6 @@ void PatchTables::lookAtIds() {
 void PatchTables::groupConnections() {
     std::vector<Member> members;
     findMembers(placesOfConnections(), members);
-    ConnectionGroups::count(members);
     std::size_t end = 0;
     for (auto& record : graph.records) {
         ConnectionGroups::layOut(record.incoming, end);
@@ -117,7 +118,10 @@ void PatchTables::addMembers(ConnectionPlace const& place, std::vector<Member>& 
     auto const isChild = [&](std::uint32_t record) {
         return record != kNone && graph.records[record].parent == place.parent;
     };
-    auto const add = [&](ConnectionGroup& group) { members.push_back({&group, place.position}); };
+    auto const add = [&](ConnectionGroup& group) {
+        group.grow();
+        members.emplace_back(group, place.position);
+    };
 
     std::uint32_t const from = graph.recordOf(connection.fromPatchId);
     if (isChild(from)) add(graph.records[from].outgoing);

@@ -261,7 +261,7 @@ private:
     void applyInsertions(HashTable<Slot>& table, PortPlan const& plan) noexcept {
         for (Port const* const port : plan.refreshed) table.slotFor(port->id).port = port;
         for (auto const& [port, owner] : plan.inserted) {
-            table.insert({port->id, port, owner});
+            table.insert({*port, owner});
             tables.largestPortId = std::max(tables.largestPortId, port->id);
         }
     }
@@ -271,7 +271,7 @@ private:
         tables.freeRecords.resize(tables.freeRecords.size() - reused);
         graph.records.resize(graph.records.size() + added.size() - reused);
         for (Refresh const& now : added) {
-            graph.records[now.record] = {now.patch, now.parent};
+            graph.records[now.record] = {*now.patch, now.parent};
             graph.patches.insert({now.patch->id, now.record});
             tables.largestPatchId = std::max(tables.largestPatchId, now.patch->id);
         }
@@ -309,7 +309,6 @@ private:
             }
         });
         for (ConnectionPlace const& place : places) tables.addMembers(place, members);
-        ConnectionGroups::count(members);
         std::size_t end = tables.groups.end();
         forEachRegrouped([this, &end](PatchRecord<Patch>& record, Patch const& child) {
             ConnectionGroups::layOut(record.incoming, end);

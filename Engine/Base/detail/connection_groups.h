@@ -1,7 +1,7 @@
 // Engine/Base/detail/connection_groups.h: a compact table of the connections of each patch and
 // output.
 //
-//     groups.count(members);           // how large each group is,
+//     group.grow();                    // how large each group is,
 //     groups.layOut(group, end);       // where it begins (for each group),
 //     groups.fill(members);            // and what is in it
 
@@ -41,16 +41,11 @@ class ConnectionGroups {
 public:
     /// The membership of a connection in a group.
     struct Member {
+        Member(ConnectionGroup& of, std::uint32_t at) : group(&of), position(at) {}
+
         ConnectionGroup* group;
         std::uint32_t position;
     };
-
-    static void count(std::vector<Member> const& members) {
-        for (std::size_t i = 0; i < members.size(); ++i) {
-            if (i + 4 * kAhead < members.size()) prefetch(members[i + 4 * kAhead].group);
-            members[i].group->grow();
-        }
-    }
 
     /// Gives a group that has connections the position `end`, and moves `end` behind it.
     static void layOut(ConnectionGroup& group, std::size_t& end) noexcept {

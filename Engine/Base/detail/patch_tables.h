@@ -15,7 +15,13 @@
 
 namespace tarn::engine::detail {
 
+// The records below are constructed in their lists with `emplace_back`: of a temporary, `push_back`
+// would load several fields at once right after they were stored one by one, which stalls.
+
 struct PatchSlot {
+    PatchSlot() = default;
+    PatchSlot(std::uint64_t id, std::uint32_t number) : key(id), record(number) {}
+
     std::uint64_t key = 0;
     std::uint32_t record = kNone;
     bool isFree() const { return record == kNone; }
@@ -23,6 +29,10 @@ struct PatchSlot {
 
 template <class AnyPort>
 struct InputSlot {
+    InputSlot() = default;
+    InputSlot(AnyPort const& input, std::uint32_t record)
+        : key(input.id), port(&input), owner(record) {}
+
     std::uint64_t key = 0;
     AnyPort const* port = nullptr;
     std::uint32_t owner = kNone;
@@ -33,6 +43,10 @@ struct InputSlot {
 
 template <class AnyPort>
 struct OutputSlot {
+    OutputSlot() = default;
+    OutputSlot(AnyPort const& output, std::uint32_t record)
+        : key(output.id), port(&output), owner(record) {}
+
     std::uint64_t key = 0;
     AnyPort const* port = nullptr;
     std::uint32_t owner = kNone;
@@ -42,6 +56,10 @@ struct OutputSlot {
 
 template <class AnyPatch>
 struct PatchRecord {
+    PatchRecord() = default;
+    PatchRecord(AnyPatch const& recorded, std::uint32_t parentRecord)
+        : patch(&recorded), parent(parentRecord) {}
+
     /// Null for a free record.
     AnyPatch const* patch = nullptr;
     std::uint32_t parent = kNone;
@@ -76,7 +94,7 @@ struct Graph {
 
     static std::vector<PatchRecord<AnyPatch>> inSearchOrder(AnyPatch const& root) {
         requireLists(root);
-        std::vector<PatchRecord<AnyPatch>> found{{&root, kNone}};
+        std::vector<PatchRecord<AnyPatch>> found{{root, kNone}};
         std::vector<std::uint32_t> toEnter{0};
         while (!toEnter.empty()) {
             std::uint32_t const parent = toEnter.back();
@@ -84,7 +102,7 @@ struct Graph {
             auto const first = static_cast<std::uint32_t>(found.size());
             for (AnyPatch const& child : *found[parent].patch->children) {
                 requireLists(child);
-                found.push_back({&child, parent});
+                found.emplace_back(child, parent);
             }
             requireCountable(found.size());
             for (auto i = static_cast<std::uint32_t>(found.size()); i > first; --i) {
@@ -99,7 +117,7 @@ struct Graph {
         std::vector<PatchSlot> slots;
         slots.reserve(records.size());
         for (std::uint32_t i = 0; i < records.size(); ++i) {
-            if (records[i].patch->id != 0) slots.push_back({records[i].patch->id, i});
+            if (records[i].patch->id != 0) slots.emplace_back(records[i].patch->id, i);
         }
         return slots;
     }
@@ -112,7 +130,7 @@ struct Graph {
         for (std::uint32_t i = 0; i < records.size(); ++i) {
             if (i + 2 * kAhead < records.size()) detail::prefetch(listOf(i + 2 * kAhead));
             if (i + kAhead < records.size()) detail::prefetch(listOf(i + kAhead)->data());
-            for (AnyPort const& port : *listOf(i)) slots.push_back({port.id, &port, i});
+            for (AnyPort const& port : *listOf(i)) slots.emplace_back(port, i);
         }
         portCount += slots.size();
         return slots;
@@ -148,6 +166,9 @@ struct Graph {
 
 /// A connection and its position.
 struct ConnectionPlace {
+    ConnectionPlace(Connection const& placed, std::uint32_t record, std::uint32_t number)
+        : connection(&placed), parent(record), position(number) {}
+
     Connection const* connection;
     std::uint32_t parent;
     std::uint32_t position;
