@@ -204,7 +204,7 @@ public:
     TARN_API static Value defaultValue(Type type, unsigned char qualifier);
 
     /// The type of the value. Constant time, a few instructions.
-    TARN_API_INLINE Type type() const noexcept { return kTypes[storage.which()]; }
+    TARN_API_INLINE Type type() const noexcept { return kTypes[unsigned(storage.which())]; }
 
     /// Conversions to scalars; none allocates. A vector converts to its x, and to true when a
     /// component is not zero. An identifier is 1, or 0 for identifier 0. A path is whether it has
