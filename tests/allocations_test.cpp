@@ -56,6 +56,8 @@ struct Kept {
     PathBuilder builder;
     Patch patch;
     std::vector<Value> values;
+    TypeInfo info;
+    TypeInfo bounded{Type::Float, 0, Value(3.0), Value(4.0), {}};
     std::string text;
     std::string roomy = withRoom(1000);
     double number = 0.0;
@@ -154,6 +156,13 @@ std::vector<Row> const kRows{
                      double(indexLoopCasting(in.loop, in.bounded, 17)) +
                      double(indexLoopCasting(nullLoop(), in.bounded, 17));
      }},
+    // A bound is an allocation of its own, which is assigned to in place.
+    {"type of a port without bounds", 0,
+     [](Inputs const&, Kept& k) { k.info = TypeInfo{Type::Vec2}; }},
+    {"type of a port with two bounds", 2, [](Inputs const& in, Kept& k) { k.info = in.bounded; }},
+    {"type of a port with bounds, assigned to one with bounds", 0,
+     [](Inputs const& in, Kept& k) { k.bounded = in.bounded; }},
+    {"bound of a port", 1, [](Inputs const& in, Kept& k) { k.info.extra = in.text; }},
     {"string of a number", 0, [](Inputs const& in, Kept& k) { k.text = to_string(in.number); }},
     {"strings of numbers, appended within the capacity", 0,
      [](Inputs const&, Kept& k) {

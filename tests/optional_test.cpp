@@ -1,6 +1,7 @@
 #include <Engine/Base/optional.h>
 #include <Engine/Base/value.h>
 
+#include "support/allocations.h"
 #include "support/death.h"
 #include "support/print.h"
 
@@ -11,6 +12,8 @@
 #include <string>
 
 using tarn::engine::Optional;
+using tarn::engine::Type;
+using tarn::engine::TypeInfo;
 using tarn::engine::Value;
 
 TEST(Optional, IsInitiallyEmpty) {
@@ -117,6 +120,119 @@ TEST(Optional, ConvertsToAndFromStdOptional) {
     static_assert(!std::is_constructible_v<Optional<Value>, std::optional<double>>);
 }
 
+// The value of an `Optional<Value>` is a block of its own. That shows in its size and in the
+// address of a value that was moved; otherwise it is a value like that of every other optional.
+TEST(Optional, OfAValueHasTheSizeOfAPointer) {
+    static_assert(sizeof(Optional<Value>) == sizeof(void*));
+    static_assert(sizeof(TypeInfo) == 4 * sizeof(void*));
+    static_assert(std::is_nothrow_move_constructible_v<Optional<Value>>);
+    static_assert(std::is_nothrow_move_assignable_v<Optional<Value>>);
+
+    Optional<Value> const text(Value("a text that is too long to be held in place"));
+    Optional<Value> copy = text;
+    EXPECT_NE(&*copy, &*text);
+    EXPECT_EQ(copy, text);
+    EXPECT_EQ(copy->ifString(), text->ifString()) << "the payload is shared, as by all values";
+    *copy = 2.5;
+    EXPECT_EQ(*copy, Value(2.5));
+    EXPECT_EQ(text->type(), Type::String);
+
+    Value const* const place = &*copy;
+    Optional<Value> moved = std::move(copy);
+    EXPECT_EQ(&*moved, place);
+    EXPECT_FALSE(copy.hasValue()) << "moved from";  // NOLINT(bugprone-use-after-move)
+    copy = std::move(moved);
+    EXPECT_EQ(&*copy, place);
+    EXPECT_FALSE(moved.hasValue()) << "moved from";  // NOLINT(bugprone-use-after-move)
+}
+
+TEST(Optional, OfAValueIsAssignedInPlace) {
+    Optional<Value> const empty;
+    Optional<Value> const five(Value(5));
+    struct Row {
+        char const* what;
+        void (*assign)(Optional<Value>& target, Optional<Value> const& five);
+    };
+    for (Row const &row : {
+             Row{"a copy", [](auto&target, auto const&source) { target = source; }},
+             Row{"a temporary",
+                 [](auto&target, auto const&source) { target = Optional<Value>(source); }},
+             Row{"a value", [](auto&target, auto const&source) { target = *source; }},
+             Row{"a std::optional",
+                 [](auto&target, auto const&source) { target = std::optional<Value>(*source); }},
+             Row{"itself",
+                 [](auto&target, auto const&source) {
+                     target = source;
+                     target = *&target;
+                 }},
+         }) {
+        SCOPED_TRACE(row.what);
+        Optional<Value> target(Value("before"));
+        Value const& before = *target;
+        row.assign(target, five);
+        EXPECT_EQ(before, Value(5));
+        EXPECT_EQ(&*target, &before) << "references to the value stay valid";
+
+        Optional<Value> other;
+        row.assign(other, five);
+        EXPECT_EQ(other, five);
+        EXPECT_NE(&*other, &*five);
+        other = empty;
+        EXPECT_FALSE(other.hasValue());
+    }
+}
+
+TEST(Optional, OfAValueConvertsEmplacesAndSwaps) {
+    Optional<Value> const seven(Value(7));
+    auto const standard = static_cast<std::optional<Value>>(seven);
+    ASSERT_TRUE(standard.has_value());
+    EXPECT_EQ(*standard, Value(7));
+    EXPECT_FALSE(static_cast<std::optional<Value>>(Optional<Value>()).has_value());
+    EXPECT_FALSE(Optional<Value>(std::optional<Value>()).hasValue());
+    EXPECT_EQ(static_cast<std::optional<Value>>(Optional<Value>(standard)), standard);
+    EXPECT_EQ(seven.value_or(Value(1)), Value(7));
+    EXPECT_EQ(Optional<Value>().value_or(Value(1)), Value(1));
+
+    Optional<Value> image;
+    Value& made = image.emplace(4ull, Type::Image);
+    EXPECT_EQ(&made, &*image);
+    EXPECT_EQ(made, Value::Image(4));
+    image.emplace(2.5);
+    EXPECT_EQ(*image, Value(2.5));
+    Optional<Value> swapped;
+    swap(image, swapped);
+    EXPECT_FALSE(image.hasValue());
+    EXPECT_EQ(*swapped, Value(2.5));
+    EXPECT_EQ(*std::move(swapped), Value(2.5));
+    swapped.reset();
+    EXPECT_FALSE(swapped.hasValue());
+}
+
+TEST(Optional, OfAValueKeepsItsValueWhenAnAllocationFails) {
+    Optional<Value> const five(Value(5));
+    Optional<Value> target;
+    EXPECT_EQ(
+        tests::failEachAllocation([&] { target = five; }, [&] { EXPECT_FALSE(target.hasValue()); }),
+        1u);
+    EXPECT_EQ(target, five);
+    target = Value(6);
+    EXPECT_EQ(tests::failEachAllocation([&] { target = Value(7); },
+                                        [&] { EXPECT_EQ(*target, Value(6)); }),
+              1u);
+    EXPECT_EQ(*target, Value(7));
+    EXPECT_EQ(tests::failEachAllocation([&] { target.emplace(8.0); },
+                                        [&] { EXPECT_FALSE(target.hasValue()); }),
+              1u);
+    EXPECT_EQ(*target, Value(8.0));
+
+    TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), Value(3.0)};
+    TypeInfo copy;
+    EXPECT_EQ(tests::failEachAllocation([&] { copy = TypeInfo(bounded); },
+                                        [&] { EXPECT_EQ(copy, TypeInfo()); }),
+              3u);
+    EXPECT_EQ(copy, bounded);
+}
+
 TEST(OptionalDeathTest, ReadingAnEmptyOneAborts) {
     Optional<std::string> empty;
     Optional<std::string> const constant;
@@ -129,4 +245,8 @@ TEST(OptionalDeathTest, ReadingAnEmptyOneAborts) {
     EXPECT_ENDS(static_cast<void>(constant->size()), line);
     EXPECT_ENDS(Optional<std::string>().value(), line);
     EXPECT_ENDS(*Optional<std::string>(), line);
+    Optional<Value> noValue;
+    EXPECT_ENDS(noValue.value(), line);
+    EXPECT_ENDS(*std::as_const(noValue), line);
+    EXPECT_ENDS(static_cast<void>(noValue->type()), line);
 }

@@ -36,8 +36,9 @@
 
 /// `TARN_FLATTEN` inlines everything that a function calls: a `boost::variant` that is read in
 /// several steps is a switch in each step until the compiler sees all of them at once.
-/// `TARN_LIKELY` marks a condition that is usually true. Both expand to nothing for compilers
-/// without such attributes; `TARN_FLATTEN` also where code is optimised for size.
+/// `TARN_LIKELY` marks a condition that is usually true, `TARN_NOINLINE` a function for rare cases.
+/// All expand to nothing for compilers without such attributes; `TARN_FLATTEN` also where code is
+/// optimised for size.
 #if defined(__GNUC__) && !defined(__OPTIMIZE_SIZE__)
 #define TARN_FLATTEN __attribute__((flatten))
 #else
@@ -45,7 +46,9 @@
 #endif
 #if defined(__GNUC__)
 #define TARN_LIKELY(condition) __builtin_expect(!!(condition), 1)
+#define TARN_NOINLINE __attribute__((noinline))
 #else
+#define TARN_NOINLINE
 #define TARN_LIKELY(condition) (condition)
 #endif
 

@@ -447,7 +447,8 @@ struct TypeInfo {
     Type type = Type::Float;
     /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
     unsigned char subtype = 0;
-    /// Inclusive bounds of a `Float` port; values of other ports are never clamped.
+    /// Inclusive bounds of a `Float` port; values of other ports are never clamped. Setting or
+    /// copying one is an allocation.
     Optional<Value> min = {};
     Optional<Value> max = {};
     /// Carried, copied and compared; this library does not interpret it.

@@ -196,7 +196,11 @@ class DataPrinter(Printer):
 
 class OptionalPrinter(Printer):
     def inside(self):
-        payload = self.value["storage"]["_M_payload"]
+        storage = self.value["storage"]
+        if "HeapOptional" in str(storage.type.strip_typedefs()):
+            pointer = storage["pointer"]
+            return pointer.dereference() if int(pointer) != 0 else None
+        payload = storage["_M_payload"]
         return payload["_M_payload"]["_M_value"] if payload["_M_engaged"] else None
 
     def to_string(self):

@@ -184,10 +184,17 @@ def data_text(data):
 
 
 def optional_text(value):
-    payload = member(value, "storage", "_M_payload")
-    if not member(payload, "_M_engaged").GetValueAsUnsigned():
-        return "none"
-    inside = member(payload, "_M_payload", "_M_value")
+    storage = member(value, "storage")
+    if "HeapOptional" in storage.GetType().GetCanonicalType().GetName():
+        pointer = member(storage, "pointer")
+        if not pointer.GetValueAsUnsigned():
+            return "none"
+        inside = pointer.Dereference()
+    else:
+        payload = member(storage, "_M_payload")
+        if not member(payload, "_M_engaged").GetValueAsUnsigned():
+            return "none"
+        inside = member(payload, "_M_payload", "_M_value")
     is_value = inside.GetType().GetUnqualifiedType().GetName() == NAMESPACE + "Value"
     return value_text(inside) if is_value else inside.GetSummary() or inside.GetValue() or "some"
 

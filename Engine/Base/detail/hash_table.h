@@ -129,9 +129,9 @@ public:
     typename std::vector<Slot>::const_iterator end() const { return slots.end(); }
 
 private:
-    // Load factor of at most 1/2: the first probe mostly hits, and one slot is always free.
+    // Little more than half full: probes stay short, and one slot is always free.
     static std::size_t sizeFor(std::size_t keys) {
-        std::size_t const wanted = 2 * keys + 1;
+        std::size_t const wanted = keys + keys * 15 / 16 + 1;
         requireCountable(wanted);
         return wanted;
     }
