@@ -116,12 +116,15 @@ TEST(Optional, ConvertsToAndFromStdOptional) {
     EXPECT_EQ(*fromSet, 5);
     EXPECT_EQ(static_cast<std::optional<int>>(fromSet), std::optional<int>(5));
     EXPECT_EQ(static_cast<std::optional<int>>(Optional<int>()), std::nullopt);
+    struct Constant {
+        int const number;
+    };
+    EXPECT_EQ(Optional<Constant>(std::optional<Constant>(Constant{5}))->number, 5);
     static_assert(!std::is_convertible_v<Optional<int>, std::optional<int>>);
     static_assert(!std::is_constructible_v<Optional<Value>, std::optional<double>>);
 }
 
-// The value of an `Optional<Value>` is a block of its own. That shows in its size and in the
-// address of a value that was moved; otherwise it is a value like that of every other optional.
+// The value of an `Optional<Value>` is an allocation of its own, which a move hands over.
 TEST(Optional, OfAValueHasTheSizeOfAPointer) {
     static_assert(sizeof(Optional<Value>) == sizeof(void*));
     static_assert(sizeof(TypeInfo) == 4 * sizeof(void*));
@@ -198,6 +201,9 @@ TEST(Optional, OfAValueConvertsEmplacesAndSwaps) {
     EXPECT_EQ(&made, &*image);
     EXPECT_EQ(made, Value::Image(4));
     image.emplace(2.5);
+    EXPECT_EQ(made, Value(2.5)) << "references to the value stay valid";
+    EXPECT_EQ(&*image, &made);
+    image.emplace(*image);
     EXPECT_EQ(*image, Value(2.5));
     Optional<Value> swapped;
     swap(image, swapped);
@@ -220,10 +226,18 @@ TEST(Optional, OfAValueKeepsItsValueWhenAnAllocationFails) {
                                         [&] { EXPECT_EQ(*target, Value(6)); }),
               1u);
     EXPECT_EQ(*target, Value(7));
-    EXPECT_EQ(tests::failEachAllocation([&] { target.emplace(8.0); },
+    EXPECT_EQ(tests::failEachAllocation([&] { target.emplace(8.0); }, [] {}), 0u);
+    EXPECT_EQ(*target, Value(8.0));
+    std::string const text(100, 'x');
+    EXPECT_GT(tests::failEachAllocation([&] { target.emplace(text); },
+                                        [&] { EXPECT_EQ(*target, Value(8.0)); }),
+              0u);
+    EXPECT_EQ(*target, Value(text));
+    target.reset();
+    EXPECT_EQ(tests::failEachAllocation([&] { target.emplace(9.0); },
                                         [&] { EXPECT_FALSE(target.hasValue()); }),
               1u);
-    EXPECT_EQ(*target, Value(8.0));
+    EXPECT_EQ(*target, Value(9.0));
 
     TypeInfo const bounded{Type::Float, 0, Value(1.0), Value(2.0), Value(3.0)};
     TypeInfo copy;
@@ -231,6 +245,16 @@ TEST(Optional, OfAValueKeepsItsValueWhenAnAllocationFails) {
                                         [&] { EXPECT_EQ(copy, TypeInfo()); }),
               3u);
     EXPECT_EQ(copy, bounded);
+
+    // Field by field, and after a failure the assignment can be repeated.
+    TypeInfo assigned{Type::Vec2};
+    EXPECT_EQ(tests::failEachAllocation([&] { assigned = bounded; },
+                                        [&] {
+                                            EXPECT_EQ(assigned.type, Type::Float);
+                                            EXPECT_FALSE(assigned.extra.hasValue());
+                                        }),
+              2u);
+    EXPECT_EQ(assigned, bounded);
 }
 
 TEST(OptionalDeathTest, ReadingAnEmptyOneAborts) {

@@ -58,8 +58,11 @@ public:
 
     template <class... Arguments>
     T& emplace(Arguments&&... arguments) {
-        reset();
-        pointer = new T(std::forward<Arguments>(arguments)...);
+        if (pointer) {
+            *pointer = T(std::forward<Arguments>(arguments)...);
+        } else {
+            pointer = new T(std::forward<Arguments>(arguments)...);
+        }
         return *pointer;
     }
     void reset() noexcept { HeapOptional().swap(*this); }
@@ -68,7 +71,10 @@ public:
 private:
     // Not inlined: ports are copied and destroyed in many places, and few have bounds.
     TARN_NOINLINE static T* copyOf(T const& value) { return new T(value); }
-    TARN_NOINLINE static void destroy(T* value) noexcept { delete value; }
+    TARN_NOINLINE static void destroy(T* value) noexcept {
+        static_assert(sizeof(T) != 0, "include value.h");
+        delete value;
+    }
 
     T* pointer = nullptr;
 };
@@ -89,8 +95,8 @@ struct OptionalStorage<Value> {
 /// `hasValue()`) in every build type. The `T` is stored in place, without an allocation beyond its
 /// own, and only what its own operations throw is thrown. But an `Optional<Value>` has the size of
 /// a pointer: its value is an allocation of its own. Copying it allocates and may throw
-/// `std::bad_alloc`; assigning to one that has a value keeps that value's address; one that was
-/// moved from may be empty.
+/// `std::bad_alloc`; assigning to one that has a value keeps that value's address, swapping does
+/// not; one that was moved from may be empty.
 template <class T>
 class Optional {
 public:
@@ -107,7 +113,7 @@ public:
     /// would take `hasValue()` for the value. Write `o ? std::optional<bool>(*o) : std::nullopt`.)
     template <class U, std::enable_if_t<std::is_same_v<U, std::optional<T>>, int> = 0>
     Optional(U other) {
-        if (other) storage = typename detail::OptionalStorage<T>::type(*std::move(other));
+        if (other) storage.emplace(*std::move(other));
     }
     explicit operator std::optional<T>() const& {
         return hasValue() ? std::optional<T>(*storage) : std::nullopt;
@@ -148,7 +154,8 @@ public:
     T value_or(T other) const& { return hasValue() ? *storage : std::move(other); }
     T value_or(T other) && { return hasValue() ? *std::move(storage) : std::move(other); }
 
-    /// Constructs `T(arguments...)` in place of the value. Empty where that throws.
+    /// Constructs `T(arguments...)` in place of the value. Empty where that throws; an
+    /// `Optional<Value>` then keeps its value.
     template <class... Arguments>
     T& emplace(Arguments&&... arguments) {
         return storage.emplace(std::forward<Arguments>(arguments)...);

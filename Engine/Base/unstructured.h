@@ -281,9 +281,9 @@ private:
     template <class T>
     static Storage copyStorage(Node<T> const& node);
     static void copyDeep(Unstructured const& from, Unstructured& to);
-    static bool equalElements(Unstructured const& a, Unstructured const& b);
-    static bool equalMaps(Map const& a, Map const& b);
-    static bool equalArrays(Array const& a, Array const& b);
+    inline static bool equalElements(Unstructured const& a, Unstructured const& b);
+    inline static bool equalMaps(Map const& a, Map const& b);
+    inline static bool equalArrays(Array const& a, Array const& b);
     static bool equalDeep(Unstructured const& a, Unstructured const& b);
     Unstructured* lastElement() const;
     void dropLastElement();

@@ -448,7 +448,8 @@ struct TypeInfo {
     /// 1 marks a `Boolean` port as a pulse and an `Unstructured` port as a layer.
     unsigned char subtype = 0;
     /// Inclusive bounds of a `Float` port; values of other ports are never clamped. Setting or
-    /// copying one is an allocation.
+    /// copying one allocates. A copy assignment that runs out of memory has assigned the fields
+    /// before that one; `info = TypeInfo(other)` assigns all or nothing.
     Optional<Value> min = {};
     Optional<Value> max = {};
     /// Carried, copied and compared; this library does not interpret it.

@@ -129,7 +129,7 @@ public:
     typename std::vector<Slot>::const_iterator end() const { return slots.end(); }
 
 private:
-    // Little more than half full: probes stay short, and one slot is always free.
+    // At most a little over half full: probes stay short, and one slot is always free.
     static std::size_t sizeFor(std::size_t keys) {
         std::size_t const wanted = keys + keys * 15 / 16 + 1;
         requireCountable(wanted);
