@@ -46,7 +46,8 @@ public:
         if (pointer && other.pointer) {
             *pointer = std::move(*other.pointer);
         } else {
-            HeapOptional(std::move(other)).swap(*this);
+            swap(other);
+            other.reset();
         }
         return *this;
     }
@@ -58,12 +59,8 @@ public:
 
     template <class... Arguments>
     T& emplace(Arguments&&... arguments) {
-        if (pointer) {
-            *pointer = T(std::forward<Arguments>(arguments)...);
-        } else {
-            pointer = new T(std::forward<Arguments>(arguments)...);
-        }
-        return *pointer;
+        if (!pointer) return *(pointer = new T(std::forward<Arguments>(arguments)...));
+        return *pointer = T(std::forward<Arguments>(arguments)...);
     }
     void reset() noexcept { HeapOptional().swap(*this); }
     void swap(HeapOptional& other) noexcept { std::swap(pointer, other.pointer); }
