@@ -35,6 +35,7 @@ public:
 
     // Assigned in place where both have a value, so that references to it stay valid.
     HeapOptional& operator=(HeapOptional const& other) {
+        if (this == &other) return *this;
         if (pointer && other.pointer) {
             *pointer = *other.pointer;
         } else {
