@@ -269,7 +269,7 @@ void indexes(Inputs const& in) {
         });
     };
     auto const build = [](Patch const& root) { return PatchIndex(root); };
-    in.operation("build an index").ours(in.graph(build)).peer(maps, in.graph(mapsOf)).atMost(0.55);
+    in.operation("build an index").ours(in.graph(build)).peer(maps, in.graph(mapsOf)).atMost(0.5);
     in.operation("memory of an index")
         .inBytes()
         .ours(bytes(build))
